@@ -1,0 +1,15 @@
+# Options that every target of ours is built with, as the interface library zkfpga_options.
+add_library(zkfpga_options INTERFACE)
+target_compile_options(zkfpga_options INTERFACE
+  -Wall -Wextra -Wpedantic -Werror -Wconversion -Wsign-conversion -Wshadow
+  -Wnon-virtual-dtor -Woverloaded-virtual -Wcast-align -Wformat=2 -Wundef)
+
+if(ZKFPGA_SANITIZE)
+  target_compile_options(zkfpga_options INTERFACE
+    -fsanitize=address,undefined -fno-sanitize-recover=all -fno-omit-frame-pointer)
+  target_link_options(zkfpga_options INTERFACE -fsanitize=address,undefined)
+endif()
+if(ZKFPGA_COVERAGE)
+  target_compile_options(zkfpga_options INTERFACE --coverage -fprofile-update=atomic)
+  target_link_options(zkfpga_options INTERFACE --coverage)
+endif()
