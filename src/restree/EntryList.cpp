@@ -1,0 +1,208 @@
+#include "restree/EntryList.h"
+
+#include <algorithm>
+#include <memory>
+#include <new>
+
+#include "qn/dsc/osdep/Compare.h"
+#include "qn/dsc/osdep/TaskMemory.h"
+#include "restree/OrderedKeyIndex.h"
+
+namespace zkhw {
+
+using qn::dsc::osdep::Compare;
+using qn::dsc::osdep::TaskMemFree;
+using qn::dsc::osdep::TaskMemRealloc;
+
+struct EntryList::LongForm {
+    EntryPieces pieces{true};
+    std::unique_ptr<OrderedKeyIndex> index;  // Ordered lists only; null until the first search.
+};
+
+EntryList::~EntryList() {
+    for (EntryPosition position = Begin(); !position.IsEnd(); position = Next(position)) {
+        NodeEntry::Release(At(position));
+    }
+    ReleaseContainer();
+}
+
+void EntryList::ReleaseContainer() noexcept {
+    if (isLong) {
+        delete longForm;
+    } else {
+        TaskMemFree(items);
+    }
+    items = nullptr;
+    count = 0;
+    capacity = 0;
+    isLong = false;
+}
+
+void EntryList::Reset(bool newOrdered) noexcept {
+    ReleaseContainer();
+    ordered = newOrdered;
+}
+
+EntryPosition EntryList::Last() const {
+    if (isLong) {
+        return longForm->pieces.Last();
+    }
+    return count == 0 ? EntryPosition{} : EntryPosition{0, count - 1};
+}
+
+EntryPosition EntryList::NextInPieces(EntryPosition position) const {
+    return longForm->pieces.Next(position);
+}
+
+NodeEntry* EntryList::AtInPieces(EntryPosition position) const {
+    return longForm->pieces.At(position);
+}
+
+uint32_t EntryList::IndexOf(EntryPosition position) const {
+    if (position.IsEnd()) {
+        return count;
+    }
+    return isLong ? longForm->pieces.IndexOf(position) : position.slot;
+}
+
+EntryPosition EntryList::AtIndex(uint32_t index) const {
+    if (isLong) {
+        return longForm->pieces.AtIndex(index);
+    }
+    return index < count ? EntryPosition{0, index} : EntryPosition{};
+}
+
+EntryPosition EntryList::Locate(const NodeEntry* entry) const {
+    if (isLong) {
+        return longForm->pieces.Locate(entry);
+    }
+    return {0, static_cast<uint32_t>(std::find(items, items + count, entry) - items)};
+}
+
+NodeEntry* EntryList::Find(std::u16string_view key) const {
+    if (!ordered) {
+        return FindPlace(key).entry;
+    }
+    if (isLong) {
+        return FindInIndex(key);
+    }
+    for (uint32_t i = 0; i < count; ++i) {
+        if (Compare(items[i]->Key().View(), key) == 0) {
+            return items[i];
+        }
+    }
+    return nullptr;
+}
+
+NodeEntry* EntryList::FindInIndex(std::u16string_view key) const {
+    if (!longForm->index) {
+        longForm->index = std::make_unique<OrderedKeyIndex>(longForm->pieces);
+    }
+    return longForm->index->Find(key);
+}
+
+EntryList::Place EntryList::FindPlace(std::u16string_view key) const {
+    if (isLong) {
+        const EntryPieces& pieces = longForm->pieces;
+        const EntryPosition position =
+            pieces.PartitionPoint([&](const NodeEntry& entry) { return Compare(entry.Key().View(), key) < 0; });
+        const bool found = !position.IsEnd() && Compare(pieces.At(position)->Key().View(), key) == 0;
+        return {position, found ? pieces.At(position) : nullptr};
+    }
+    uint32_t low = 0;
+    uint32_t high = count;
+    while (low < high) {
+        const uint32_t middle = low + (high - low) / 2;
+        const int order = Compare(items[middle]->Key().View(), key);
+        if (order == 0) {
+            return {{0, middle}, items[middle]};
+        }
+        if (order < 0) {
+            low = middle + 1;
+        } else {
+            high = middle;
+        }
+    }
+    return {low < count ? EntryPosition{0, low} : EntryPosition{}, nullptr};
+}
+
+void EntryList::InsertInArray(uint32_t slot, NodeEntry* entry) {
+    if (count == capacity) {
+        // Two entries fill the smallest block of the node memory.
+        const uint32_t grown = capacity == 0 ? 2 : capacity < 8 ? capacity * 2U : capacity + 8U;
+        void* memory = TaskMemRealloc(static_cast<void*>(items), grown * sizeof(NodeEntry*));
+        if (memory == nullptr) {
+            throw std::bad_alloc();
+        }
+        items = static_cast<NodeEntry**>(memory);
+        capacity = static_cast<uint16_t>(grown);
+    }
+    std::copy_backward(items + slot, items + count, items + count + 1);
+    items[slot] = entry;
+    ++count;
+}
+
+void EntryList::MakeLong() {
+    auto grown = std::make_unique<LongForm>();
+    for (uint32_t i = 0; i < count; ++i) {
+        grown->pieces.Insert({}, items[i]);
+    }
+    TaskMemFree(static_cast<void*>(items));
+    longForm = grown.release();
+    capacity = 0;
+    isLong = true;
+}
+
+EntryPosition EntryList::Insert(EntryPosition position, NodeEntry* entry) {
+    if (!isLong) {
+        const uint32_t slot = position.IsEnd() ? count : position.slot;
+        if (count < shortLimit) {
+            InsertInArray(slot, entry);
+            return {0, slot};
+        }
+        MakeLong();
+        position = slot == count ? EntryPosition{} : longForm->pieces.AtIndex(slot);
+    }
+    const bool atEnd = position.IsEnd();
+    const EntryPosition place = longForm->pieces.Insert(position, entry);
+    if (longForm->index) {
+        try {
+            longForm->index->Add(entry, atEnd);
+        } catch (...) {
+            longForm->index.reset();  // It is built anew when next asked for.
+        }
+    }
+    ++count;
+    return place;
+}
+
+EntryPosition EntryList::Detach(EntryPosition position) noexcept {
+    if (!isLong) {
+        std::copy(items + position.slot + 1, items + count, items + position.slot);
+        --count;
+        return position.slot < count ? position : EntryPosition{};
+    }
+    if (longForm->index) {
+        longForm->index->Remove(longForm->pieces.At(position));
+    }
+    --count;
+    const EntryPosition next = longForm->pieces.Erase(position);
+    if (count == 0) {
+        ReleaseContainer();
+    }
+    return next;
+}
+
+void EntryList::AssignKey(NodeEntry* entry, const String& key) {
+    String copy(key);
+    DropIndex();
+    entry->key.Swap(copy);
+}
+
+void EntryList::DropIndex() noexcept {
+    if (isLong) {
+        longForm->index.reset();
+    }
+}
+
+}  // namespace zkhw

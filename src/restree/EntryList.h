@@ -1,0 +1,99 @@
+#pragma once
+
+// The one collection of a node's entries, in either form: in order of insertion, equal keys allowed, or sorted by
+// key with each key once. Keys are compared with Compare, so blind to letter case.
+//
+// A short list is one array. A long one stands in pieces; if it is ordered, a sorted index of its keys is built at
+// the first search and kept from then on, so that no search is linear in a long list.
+//
+// The list owns its entries. Positions are invalidated by any insertion or removal; entries stay where they are.
+
+#include <cstdint>
+#include <string_view>
+
+#include "restree/EntryPieces.h"
+#include "restree/NodeEntry.h"
+
+namespace zkhw {
+
+class EntryList {
+  public:
+    explicit EntryList(bool ordered) noexcept : ordered(ordered) {}
+    ~EntryList();  // Releases texts and containers. Child entries must be gone.
+    EntryList(const EntryList&) = delete;
+    EntryList& operator=(const EntryList&) = delete;
+
+    bool IsOrdered() const { return ordered; }
+
+    // Drops the container and makes an empty one of the given form. Entries that are left are forgotten.
+    void Reset(bool newOrdered) noexcept;
+
+    uint32_t Size() const { return count; }
+    bool IsEmpty() const { return count == 0; }
+
+    EntryPosition Begin() const { return count == 0 ? EntryPosition{} : EntryPosition{0, 0}; }
+    static EntryPosition End() { return {}; }
+    EntryPosition Last() const;
+    EntryPosition Next(EntryPosition position) const {
+        if (!isLong) {
+            return ++position.slot < count ? position : EntryPosition{};
+        }
+        return NextInPieces(position);
+    }
+    NodeEntry* At(EntryPosition position) const { return isLong ? AtInPieces(position) : items[position.slot]; }
+
+    // The entry's place counted from the front; the end counts as Size().
+    uint32_t IndexOf(EntryPosition position) const;
+    EntryPosition AtIndex(uint32_t index) const;
+
+    // Where an entry of this list stands.
+    EntryPosition Locate(const NodeEntry* entry) const;
+
+    // The entry with this key, the first one in an ordered list; null if there is none. Throws bad_alloc when the
+    // index of a long ordered list can't be built.
+    NodeEntry* Find(std::u16string_view key) const;
+
+    // In a sorted list, where an entry with this key stands or would have to stand.
+    struct Place {
+        EntryPosition position;
+        NodeEntry* entry;  // The entry that has the key already, or null.
+    };
+    Place FindPlace(std::u16string_view key) const;
+
+    // Stores `entry` in front of `position`. A sorted list takes the position as it stands: it must be what FindPlace
+    // gave. Throws bad_alloc; then nothing has changed and `entry` is still the caller's.
+    EntryPosition Insert(EntryPosition position, NodeEntry* entry);
+
+    // Takes an entry out without releasing it; gives the position of the one that followed it.
+    EntryPosition Detach(EntryPosition position) noexcept;
+
+    // Assigns the key of an entry of an ordered list. Throws bad_alloc; then nothing has changed.
+    void AssignKey(NodeEntry* entry, const String& key);
+
+    // Forgets the index of the keys. Worth doing ahead of a removal of very many entries.
+    void DropIndex() noexcept;
+
+  private:
+    struct LongForm;
+
+    // Up to this many entries the list is one array, searched in place.
+    static constexpr uint32_t shortLimit = 32;
+
+    EntryPosition NextInPieces(EntryPosition position) const;
+    NodeEntry* AtInPieces(EntryPosition position) const;
+    NodeEntry* FindInIndex(std::u16string_view key) const;
+    void InsertInArray(uint32_t slot, NodeEntry* entry);
+    void MakeLong();
+    void ReleaseContainer() noexcept;
+
+    union {
+        NodeEntry** items = nullptr;
+        LongForm* longForm;
+    };
+    uint32_t count = 0;
+    uint16_t capacity = 0;  // Of `items`; 0 in the long form.
+    bool isLong = false;
+    bool ordered;
+};
+
+}  // namespace zkhw

@@ -1,0 +1,135 @@
+#include "restree/EntryPieces.h"
+
+#include <algorithm>
+#include <cstring>
+#include <new>
+
+#include "qn/dsc/osdep/TaskMemory.h"
+
+namespace zkhw {
+
+EntryPieces::~EntryPieces() {
+    for (EntryPiece* piece : pieces) {
+        qn::dsc::osdep::TaskMemFree(piece);
+    }
+}
+
+EntryPosition EntryPieces::Last() const {
+    if (pieces.empty()) {
+        return {};
+    }
+    return {static_cast<uint32_t>(pieces.size() - 1), pieces.back()->count - 1};
+}
+
+EntryPosition EntryPieces::Next(EntryPosition position) const {
+    if (++position.slot < pieces[position.piece]->count) {
+        return position;
+    }
+    if (++position.piece < pieces.size()) {
+        return {position.piece, 0};
+    }
+    return {};
+}
+
+uint32_t EntryPieces::IndexOf(EntryPosition position) const {
+    uint32_t index = 0;
+    const size_t whole = std::min<size_t>(position.piece, pieces.size());
+    for (size_t i = 0; i < whole; ++i) {
+        index += pieces[i]->count;
+    }
+    return index + position.slot;
+}
+
+EntryPosition EntryPieces::AtIndex(uint32_t index) const {
+    for (const EntryPiece* piece : pieces) {
+        if (index < piece->count) {
+            return {piece->ordinal, index};
+        }
+        index -= piece->count;
+    }
+    return {};
+}
+
+EntryPosition EntryPieces::Locate(const NodeEntry* entry) const {
+    const EntryPiece& piece = *entry->piece;
+    const auto* found = std::find(piece.items, piece.items + piece.count, entry);
+    return {piece.ordinal, static_cast<uint32_t>(found - piece.items)};
+}
+
+EntryPiece* EntryPieces::AddPiece(uint32_t ordinal) {
+    pieces.reserve(pieces.size() + 1 > pieces.capacity() ? pieces.capacity() * 2 + 8 : 0);
+    void* memory = qn::dsc::osdep::TaskMemAlloc(sizeof(EntryPiece));
+    if (memory == nullptr) {
+        throw std::bad_alloc();
+    }
+    EntryPiece* piece = new (memory) EntryPiece;
+    pieces.insert(pieces.begin() + ordinal, piece);
+    Renumber(ordinal);
+    return piece;
+}
+
+void EntryPieces::Renumber(uint32_t from) noexcept {
+    for (uint32_t i = from; i < pieces.size(); ++i) {
+        pieces[i]->ordinal = i;
+    }
+}
+
+void EntryPieces::Mark(EntryPiece& piece, uint32_t from) noexcept {
+    if (marksEntries) {
+        for (uint32_t i = from; i < piece.count; ++i) {
+            piece.items[i]->piece = &piece;
+        }
+    }
+}
+
+EntryPosition EntryPieces::Insert(EntryPosition position, NodeEntry* entry) {
+    if (position.IsEnd()) {
+        // Growth at the end fills each piece to the brim; only insertions in the midst split one.
+        const bool room = !pieces.empty() && pieces.back()->count < EntryPiece::capacity;
+        EntryPiece* piece = room ? pieces.back() : AddPiece(static_cast<uint32_t>(pieces.size()));
+        piece->items[piece->count++] = entry;
+        Mark(*piece, piece->count - 1);
+        return {piece->ordinal, piece->count - 1};
+    }
+    EntryPiece* piece = pieces[position.piece];
+    if (piece->count == EntryPiece::capacity) {
+        constexpr uint32_t half = EntryPiece::capacity / 2;
+        EntryPiece* upper = AddPiece(position.piece + 1);
+        std::copy(piece->items + half, piece->items + piece->count, upper->items);
+        upper->count = piece->count - half;
+        piece->count = half;
+        Mark(*upper, 0);
+        if (position.slot > half) {
+            position = {position.piece + 1, position.slot - half};
+            piece = upper;
+        }
+    }
+    std::copy_backward(piece->items + position.slot, piece->items + piece->count, piece->items + piece->count + 1);
+    piece->items[position.slot] = entry;
+    ++piece->count;
+    if (marksEntries) {
+        entry->piece = piece;
+    }
+    return position;
+}
+
+EntryPosition EntryPieces::Erase(EntryPosition position) noexcept {
+    EntryPiece* piece = pieces[position.piece];
+    if (marksEntries) {
+        piece->items[position.slot]->piece = nullptr;
+    }
+    std::copy(piece->items + position.slot + 1, piece->items + piece->count, piece->items + position.slot);
+    --piece->count;
+    if (piece->count == 0) {
+        qn::dsc::osdep::TaskMemFree(piece);
+        pieces.erase(pieces.begin() + position.piece);
+        Renumber(position.piece);
+        return position.piece < pieces.size() ? EntryPosition{position.piece, 0} : EntryPosition{};
+    }
+    if (position.slot < piece->count) {
+        return position;
+    }
+    return position.piece + 1 < pieces.size() ? EntryPosition{position.piece + 1, 0} : EntryPosition{};
+}
+
+}  // namespace zkhw

@@ -1,0 +1,106 @@
+#pragma once
+
+// One named entry of a node: a text, a child node or a link. A NodeEntry lives on the heap, at one place from
+// its making to its release, so a pointer to it or to its text stays good while its neighbours come and go.
+// The entry owns its payload.
+
+#include <cstddef>
+#include <cstdint>
+
+#include "qn/dsc/StringBase.h"
+
+namespace zkhw {
+
+using qn::dsc::String;
+
+class ResTreeNode;
+struct EntryPiece;
+
+enum EntryKind : uint32_t {
+    EmptyEntry = 0,          // The payload has been released.
+    TextEntry = 1,           // A plain property value.
+    ChildEntry = 2,          // An owned child node.
+    LinkEntry = 3,           // A path, looked up whenever the link is followed; the target is not owned.
+    LocalizedTextEntry = 4,  // A property value; may hold a NUL and behind it the whole list of languages.
+};
+
+class NodeEntry {
+  public:
+    // A text or link entry. Both strings are moved from. Throws bad_alloc; then both are as they were.
+    static NodeEntry* MakeText(String&& key, EntryKind kind, String&& text);
+
+    // A child entry that takes `child`. Throws bad_alloc; then `key` is as it was and `child` still the caller's.
+    static NodeEntry* MakeChild(String&& key, ResTreeNode* child);
+
+    // Frees the entry. A child must have been taken out with TakeChild.
+    static void Release(NodeEntry* entry) noexcept;
+
+    NodeEntry(const NodeEntry&) = delete;
+    NodeEntry& operator=(const NodeEntry&) = delete;
+
+    const String& Key() const { return key; }
+    EntryKind Kind() const { return kind; }
+    bool IsText() const { return kind == TextEntry || kind == LocalizedTextEntry; }
+
+    // The value of a text entry of either kind; null for any other.
+    String* Text() { return IsText() ? &Payload() : nullptr; }
+    const String* Text() const { return IsText() ? &Payload() : nullptr; }
+
+    // The path of a link; null for any other kind.
+    const String* LinkPath() const { return kind == LinkEntry ? &Payload() : nullptr; }
+
+    // The node of a child entry; null for any other kind. Owned by the entry.
+    ResTreeNode* Child() const { return kind == ChildEntry ? ChildPayload() : nullptr; }
+
+    // Turns a text entry into one of the other text kind.
+    void SetTextKind(EntryKind textKind) { kind = textKind; }
+
+    // Gives the child to the caller and leaves the entry empty.
+    ResTreeNode* TakeChild();
+
+    // Frees the text of a text or link entry and leaves the entry empty.
+    void ReleaseText();
+
+  private:
+    friend class EntryList;
+    friend class OrderedKeyIndex;
+
+    // The two shapes differ behind the common head only, so that a child entry doesn't carry room for a text.
+    struct TextShape;
+    struct ChildShape;
+
+    NodeEntry(String&& key, EntryKind kind, bool textShape) : key(static_cast<String&&>(key)), kind(kind), textShape(textShape) {}
+    ~NodeEntry() = default;
+
+    inline String& Payload();
+    inline const String& Payload() const;
+    inline ResTreeNode* ChildPayload() const;
+
+    String key;
+    EntryPiece* piece = nullptr;  // The piece of a long list that holds the entry; null in a short list.
+    EntryKind kind;
+    bool textShape;  // Which shape was allocated; the kind may have become EmptyEntry since.
+};
+
+struct NodeEntry::TextShape : NodeEntry {
+    TextShape(String&& key, EntryKind kind, String&& text)
+        : NodeEntry(static_cast<String&&>(key), kind, true), text(static_cast<String&&>(text)) {}
+    String text;
+};
+
+struct NodeEntry::ChildShape : NodeEntry {
+    ChildShape(String&& key, ResTreeNode* child) : NodeEntry(static_cast<String&&>(key), ChildEntry, false), child(child) {}
+    ResTreeNode* child;
+};
+
+inline String& NodeEntry::Payload() {
+    return static_cast<TextShape*>(this)->text;
+}
+inline const String& NodeEntry::Payload() const {
+    return static_cast<const TextShape*>(this)->text;
+}
+inline ResTreeNode* NodeEntry::ChildPayload() const {
+    return static_cast<const ChildShape*>(this)->child;
+}
+
+}  // namespace zkhw

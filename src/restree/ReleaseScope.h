@@ -1,0 +1,31 @@
+#pragma once
+
+// While a ReleaseScope stands, what leaves a tree on this thread keeps its memory until the outermost scope ends:
+// code further up the stack (a load, a merge, a walk, a change notice under way) may still hold it. A removed node
+// that nobody observes even stays whole, so that it can go on serving as the source of a copy.
+
+#include <cstdint>
+
+namespace zkhw {
+
+class NodeEntry;
+class ResTreeNode;
+
+class ReleaseScope {
+  public:
+    ReleaseScope() noexcept;
+    ~ReleaseScope();
+    ReleaseScope(const ReleaseScope&) = delete;
+    ReleaseScope& operator=(const ReleaseScope&) = delete;
+
+    static bool IsActive() noexcept;
+
+    // Make sure that the next Keep can't fail. Throws bad_alloc.
+    static void Reserve();
+
+    // Takes over what has left a tree; only while a scope is active, and after Reserve.
+    static void Keep(ResTreeNode* node) noexcept;
+    static void Keep(NodeEntry* entry) noexcept;
+};
+
+}  // namespace zkhw

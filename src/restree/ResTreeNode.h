@@ -1,0 +1,314 @@
+#pragma once
+
+// A node of a resource tree. It has one collection of named entries that holds everything: texts, child nodes and
+// links to other nodes. A node lives on the heap; a child lives as long as its entry in the parent, a root and a
+// detached clone belong to whoever made them. A tree is used by one thread at a time.
+//
+// Names are compared with Compare (blind to letter case) throughout. Nothing here recurses over the depth of a tree.
+// All operations that make something may throw bad_alloc.
+
+#include <cstdint>
+#include <map>
+#include <memory>
+#include <string_view>
+#include <vector>
+
+#include "qn/dsc/StringBase.h"
+#include "restree/ChangeFlags.h"
+#include "restree/EntryIterator.h"
+#include "restree/EntryList.h"
+#include "restree/NodeEntry.h"
+#include "restree/ResTreeNodeChangeObserver.h"
+#include "restree/TypeTable.h"
+
+namespace zkhw {
+
+using qn::dsc::NarrowString;
+
+class ParseStack;
+struct LoadChain;
+
+// Parameters for "#{name}": from name to value, blind to letter case.
+using ParameterMap = std::map<String, String>;
+
+struct ObserverRecord {
+    enum State : uint8_t {
+        Active = 0,
+        Removed = 1,  // Removed during a dispatch: skipped, and erased at the end of that dispatch.
+        Added = 2,    // Added during a dispatch: skipped by it, and active from its end on.
+    };
+
+    ResTreeNodeChangeObserver* observer;  // Not owned, but see DeleteWithNode.
+    int32_t context;                      // Handed back at each call.
+    uint32_t mask;                        // ChangeFlags that make a call.
+    State state;
+    ResTreeNode* chained;  // The observer itself if it is a node that watches this one, else null.
+};
+
+class ResTreeNode : public ResTreeNodeChangeObserver {
+  public:
+    // What an operation that adds an entry gives.
+    struct Added {
+        NodeEntry* entry;  // The new entry, or the one that has the key already.
+        bool isNew;
+    };
+
+    // A root, with the table of the built-in type relations.
+    ResTreeNode(std::u16string_view name, std::u16string_view type, bool ordered);
+
+    // A child of `parent`, which doesn't hold it yet.
+    ResTreeNode(String&& name, String&& type, bool ordered, ResTreeNode* parent);
+
+    // A detached node with a copy of `sourceTable`, or with no table if that is null.
+    ResTreeNode(std::u16string_view name, std::u16string_view type, bool ordered, const TypeTable* sourceTable);
+
+    // Removes the entries one by one from the first, with the notices that go with it, then ends all watching.
+    ~ResTreeNode() override;
+
+    // Nodes come from the same allocator as their texts.
+    static void* operator new(size_t size);
+    static void* operator new(size_t size, const std::nothrow_t&) noexcept;
+    static void operator delete(void* memory) noexcept;
+    static void operator delete(void* memory, const std::nothrow_t&) noexcept;
+
+    // --- Reading ---
+
+    const String& GetName() const { return name; }
+    const String& GetType() const { return type; }
+    ResTreeNode* GetParent() const { return parent; }
+    bool IsOrdered() const { return entries.IsOrdered(); }
+
+    // The entries as they stand.
+    EntryIterator Begin() { return {entries, entries.Begin()}; }
+    EntryIterator End() { return {entries, EntryList::End()}; }
+    ConstEntryIterator Begin() const { return {entries, entries.Begin()}; }
+    ConstEntryIterator End() const { return {entries, EntryList::End()}; }
+
+    // The same after a deferred load, if one is pending. Such a walk ends at End().
+    EntryIterator BeginLoaded();
+
+    // The entry `key` as things stand; the first one in an ordered node. The end position, or null, on a miss.
+    // Logarithmic. Find... gives the entry itself, which stays where it is until it is removed.
+    EntryIterator FindEntryRaw(std::u16string_view key);
+    NodeEntry* FindRaw(std::u16string_view key) const { return entries.Find(key); }
+
+    // The same; a miss on a node whose contents are deferred loads them first and looks once more.
+    EntryIterator FindEntry(std::u16string_view key);
+    NodeEntry* Find(std::u16string_view key);
+
+    // The position of an entry of this node.
+    EntryIterator PositionOf(const NodeEntry* entry) { return {entries, entries.Locate(entry)}; }
+
+    // The value of the text entry `key`; null if there is none or the entry is of another kind. May load (FindEntry).
+    // The result lives in the node until the entry is changed or removed.
+    const String* GetProperty(std::u16string_view key);
+
+    // As GetProperty, with one shared empty String in place of null.
+    const String& GetPropertyOrEmpty(std::u16string_view key);
+
+    // The node that the entry stands for: a child, or where a link leads. Null at the end, for a text and for a link
+    // that leads nowhere. Following a link may load.
+    ResTreeNode* ResolveEntry(EntryIterator iterator);
+    ResTreeNode* ResolveEntry(NodeEntry* entry);
+
+    // --- Changing ---
+
+    // Assigns the text entry `key`, or makes one at the end. False, and nothing changes, if the entry is no text.
+    bool SetProperty(std::u16string_view key, std::u16string_view value);
+
+    // Assigns the value of a text entry; its kind stays. False, and nothing changes, if the entry is no text.
+    bool SetEntryText(EntryIterator iterator, std::u16string_view value);
+    bool SetEntryText(NodeEntry* entry, String&& value);
+
+    // Add an entry in front of `before`, or at the end if that is null or not to be found. An unordered node that has
+    // the key already makes nothing and gives what is there; an ordered node always makes a new entry.
+    // Strings are moved from when an entry is made.
+    Added AddTextEntry(String&& key, String&& value, EntryKind kind, const String* before = nullptr);
+    Added AddLinkEntry(String&& key, String&& path, const String* before = nullptr);
+
+    // `child` is the new node; if nothing was made, the existing one, or null if the entry is no child.
+    Added AddChildEntry(std::u16string_view key, std::u16string_view childType, bool childOrdered, ResTreeNode*& child,
+                        const String* before = nullptr);
+
+    // Store an entry without a test, and raise nothing. `position` is where to insert in an ordered node and only a
+    // hint in an unordered one. The node takes `child`.
+    EntryIterator InsertEntry(EntryIterator position, std::u16string_view key, EntryKind kind, std::u16string_view text);
+    EntryIterator InsertEntry(EntryIterator position, std::u16string_view key, std::unique_ptr<ResTreeNode> child);
+
+    // Removes an entry. The nodes of a child's subtree hear NodeDeleting from the top down, then NodeDeleted from the
+    // bottom up; then this node hears of the removal.
+    void RemoveEntry(EntryIterator iterator);
+    void RemoveEntry(NodeEntry* entry);
+
+    // The same by name, after a deferred load if need be; a missing entry does nothing.
+    void RemoveEntryByName(std::u16string_view key);
+
+    // Removes every child entry. Texts and links stay.
+    void RemoveChildNodes();
+
+    // Changes the key of an entry, not the name of its node. False if there is no `oldKey`. In an unordered node that
+    // has `newKey` already the entry is lost, what it held is never released, and the result is false.
+    bool RenameEntry(std::u16string_view oldKey, std::u16string_view newKey);
+
+    // Renames the node, and its entry in the parent. False if RenameEntry of the parent says so; the node then keeps
+    // its name.
+    bool Rename(std::u16string_view newName);
+
+    // Makes an empty collection of the other form. Only for a node that has no entries yet.
+    void SetOrdered(bool ordered);
+
+    // Removes the entry `name`: always when `unconditional`, else unless it is a child of just this type and order.
+    void RemoveIfMismatched(bool unconditional, std::u16string_view entryName, std::u16string_view entryType,
+                            bool entryOrdered);
+
+    // Copies the entries of `source`, as they stand, to the end of this node; children deeply, links re-expressed
+    // from here. Texts that are there already are overwritten on demand. A node may be merged with one of its own
+    // ancestors: what is being filled is not copied into itself.
+    void MergeFrom(ResTreeNode& source, bool overwrite);
+
+    // Makes `source` or its contents the child `key` at `position`, and gives that child. An entry of that name goes,
+    // except that with `overwrite` a child of the same type and order stays and receives the merge.
+    EntryIterator CloneSubtreeInto(EntryIterator position, std::u16string_view key, ResTreeNode& source, bool overwrite,
+                                   ResTreeNode*& child);
+
+    // A detached copy with its own type table, if this node has one. The caller owns it.
+    std::unique_ptr<ResTreeNode> Clone();
+
+    // --- Types ---
+
+    // True if `typeName` is the node's type or one that it inherits from.
+    bool IsA(std::u16string_view typeName) const;
+
+    // True if `text` is empty, if IsA(text), or if it stands in the comma list "Protocols", there letter by letter.
+    bool Supports(std::u16string_view text);
+
+    // Appends the type, all types that it inherits from (repetitions stay) and the pieces of "Protocols".
+    void GetProtocols(std::vector<String>& list);
+
+    // Gives the node a copy of the type table that holds for it, unless it has one of its own.
+    void MakeTypeTableLocal();
+
+    // This node's own table, or null; and the nearest one on the way up, or null.
+    TypeTable* GetTypeTable() const;
+    const TypeTable* NearestTypeTable() const;
+
+    // --- Change notices ---
+
+    // Lets `observer` hear of the changes in `mask`; a second call with the same `context` replaces the mask, and a
+    // `context` of -1 stands for any. Contexts 1 and 2 are taken by nodes that watch each other. With AncestorChanged
+    // all nodes above are watched too, with ReservationChanged all nodes that "Reserves" names, at any distance.
+    // The observer isn't owned (but see DeleteWithNode): remove it before it dies.
+    // True if something new was registered, here or on a node that this one watches in turn.
+    bool AddObserver(ResTreeNodeChangeObserver* observer, uint32_t mask, int32_t context);
+
+    // Ends what AddObserver began; a `context` of -1 stands for all. With `recursive` on all nodes below too, which
+    // loads deferred contents. True if anything was removed.
+    bool RemoveObserver(ResTreeNodeChangeObserver* observer, int32_t context, bool recursive);
+
+    // Hold delivery back; nests. BeginChanges gives the flags raised so far and clears them. EndChanges puts `saved`
+    // in place of what was raised since (`replace`) or adds it, and delivers when the last bracket closes.
+    uint32_t BeginChanges();
+    void EndChanges(uint32_t saved, bool replace);
+
+    bool HasNoPendingChanges() const { return pendingChanges == 0; }
+
+    // Delivers what is pending of `mask`, in passes, until nothing of it is left.
+    void DispatchChanges(uint32_t mask);
+
+    // Notes `changes`, and delivers at once unless delivery is held back.
+    void Raise(uint32_t changes);
+
+    // A watched node changed: raises on this node what concerns it.
+    void OnNodeChanged(ResTreeNode* node, uint32_t changes, int32_t context) override;
+
+    // Appends the nodes that "Reserves" names; paths that lead nowhere are left out. Unless `raw`, a miss may load.
+    void GetDependants(std::vector<ResTreeNode*>& list, bool raw);
+
+    // --- Paths ---
+
+    // The node at `path`, or null. "/" climbs to the root first, "#{document-root}/" starts at `documentRoot` if given.
+    // Follows links, 256 at most. May load.
+    ResTreeNode* Lookup(std::u16string_view path, ResTreeNode* documentRoot);
+
+    // The path of the node from its root, and the same with display names. Built anew at each call.
+    String GetPath() const;
+    String GetDisplayPath();
+
+    // The display path of the node behind an entry of this node; empty if there is none. May load.
+    String GetEntryDisplayPath(EntryIterator iterator, const String& parentDisplayPath);
+
+    // --- Loading ---
+
+    // Reads a resource file into the tree. With `asChild` the document element becomes a child of this node or merges
+    // into one of the same name; otherwise it stands for this node. `node`, if given, gets the node of the document
+    // element, or null. 0, or 0x80004005 if the file can't be opened or isn't well formed: what was read before the
+    // fault stays, and a report stands in "XMLParseErrors". Changes are delivered in one go at the end.
+    // `path` is in code page 0.
+    int32_t LoadResourceFile(const NarrowString& path, bool asChild, ResTreeNode** node);
+
+    // The same from text.
+    int32_t LoadResourceText(const String& text, bool asChild, ResTreeNode** node);
+
+    // Appends a report to "XMLParseErrors": where `stack` stands, what libexpat says or `message` instead, and the
+    // text around. In place, so many reports take time in proportion to their text.
+    void ReportParseError(const ParseStack& stack, const NarrowString* fileName, const String* message);
+
+    // If the entry ":DeferredLoadPath" is there, removes it and loads the files that it names into this node. False
+    // if at least one was read. Failures are silent, but for the reports of a file that isn't well formed.
+    bool EnsureDeferredLoaded();
+
+    // Expands "#{name}" in all texts of the subtree, after deferred loads.
+    void ApplyParameters(const ParameterMap& parameters);
+
+    // ApplyParameters with "name" and, unless `variable` is empty, the loop variable.
+    void ApplyInstance(const String& instanceName, const String& variable, int32_t index);
+
+  private:
+    friend class ChangeDispatch;
+    friend class ParseStack;
+    friend class ReleaseScope;
+    struct Attachments;
+    struct MergeWalk;
+
+    // A path that has been cut up for EnsureDeferredLoaded.
+    struct DeferredLoad;
+
+    Attachments& GetAttachments();
+    Added Store(EntryPosition position, NodeEntry* entry, uint32_t change);
+    EntryPosition PositionBefore(const String* before);
+    Added AddChildAt(EntryPosition position, String&& key, std::u16string_view childType, bool childOrdered,
+                     ResTreeNode*& child);
+    Added AddChild(String&& key, std::u16string_view childType, bool childOrdered, ResTreeNode*& child,
+                   const String* before);
+    ResTreeNode* PrepareClone(EntryPosition position, std::u16string_view key, ResTreeNode& source, bool overwrite,
+                              NodeEntry*& entry);
+
+    void RetireSubtree();
+    void TearDown() noexcept;
+    static void ReleaseNode(ResTreeNode* node) noexcept;
+    static void DestroySubtree(ResTreeNode* top) noexcept;
+
+    bool HasObserver(ResTreeNodeChangeObserver* observer, int32_t context) const;
+    bool Register(ResTreeNodeChangeObserver* observer, uint32_t mask, int32_t context, ResTreeNode* chained);
+    bool Unregister(ResTreeNodeChangeObserver* observer, int32_t context);
+    bool WatchAncestors();
+    void StopWatchingAncestors();
+    bool WatchDependants();
+    void StopWatchingDependants();
+    void ForgetWatching() noexcept;
+    bool AnyActiveObserver(uint32_t mask) const;
+
+    int32_t LoadFile(const NarrowString& path, bool asChild, ResTreeNode** node, const LoadChain* includer);
+    bool BeginDeferredLoad(std::vector<String>& pieces);
+
+    String name;
+    String type;
+    ResTreeNode* parent;                       // Null for a root and a detached clone.
+    EntryList entries;
+    std::unique_ptr<Attachments> attachments;  // What few nodes have: a type table, observers.
+    uint32_t suspendCount = 0;                 // Nonzero while delivery is held back.
+    uint16_t pendingChanges = 0;               // ChangeFlags raised and not yet delivered.
+    bool isDefunct = false;                    // Torn down; only the memory is left (ReleaseScope).
+};
+
+}  // namespace zkhw
