@@ -12,7 +12,9 @@
 
 namespace {
 
-double Seconds(const timeval& time) { return static_cast<double>(time.tv_sec) + static_cast<double>(time.tv_usec) * 1e-6; }
+double Seconds(const timeval& time) {
+    return static_cast<double>(time.tv_sec) + static_cast<double>(time.tv_usec) * 1e-6;
+}
 
 double Now() {
     timespec time{};
@@ -46,6 +48,7 @@ int main(int argc, char** argv) {
     }
     const double wall = Now() - start;
     const int code = WIFEXITED(status) ? WEXITSTATUS(status) : 128 + WTERMSIG(status);
-    std::printf("%d %.6f %.6f %.6f %ld\n", code, Seconds(usage.ru_utime), Seconds(usage.ru_stime), wall, usage.ru_maxrss * 1024);
+    std::printf("%d %.6f %.6f %.6f %ld\n", code, Seconds(usage.ru_utime), Seconds(usage.ru_stime), wall,
+                usage.ru_maxrss * 1024);
     return 0;
 }
