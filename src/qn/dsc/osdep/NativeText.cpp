@@ -66,7 +66,7 @@ size_t DecodeOne(std::string_view bytes, char32_t& character) {
 template <typename Unit>
 class Sink {
   public:
-    explicit Sink(Unit* output) : output(output) {}
+    explicit Sink(Unit* destination) : output(destination) {}
 
     void Put(char32_t unit) {
         if (output != nullptr) {
