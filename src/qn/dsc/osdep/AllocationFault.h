@@ -1,0 +1,35 @@
+#pragma once
+
+// Lets a test make chosen task allocations fail. One switch for the process; off, it costs one predictable branch for
+// each allocation. Not for use while other threads allocate.
+
+#include <atomic>
+#include <cstdint>
+
+namespace qn::dsc::osdep {
+
+// From now on counts the allocations, from 1, and makes the `nth` fail; with `fromThenOn` all behind it too.
+// An allocation is a TaskMemAlloc, or a TaskMemRealloc that needs a block of a greater size class, or one above the
+// greatest class. UINT64_MAX only counts.
+void FailAllocation(uint64_t nth, bool fromThenOn);
+
+// No allocation fails any more, and none is counted; the count stays readable.
+void ClearAllocationFault();
+
+// How many allocations there were between the last FailAllocation and ClearAllocationFault (or now).
+uint64_t AllocationCount();
+
+// Counts one allocation and says whether it is to fail. Every allocator asks this once before it allocates; a test's
+// own global operator new may ask as well, and so take part in the count.
+inline bool ShouldFailAllocation();
+
+namespace detail {
+extern std::atomic<bool> allocationFaultSet;
+bool CountAllocation();
+}  // namespace detail
+
+inline bool ShouldFailAllocation() {
+    return detail::allocationFaultSet.load(std::memory_order_relaxed) && detail::CountAllocation();
+}
+
+}  // namespace qn::dsc::osdep

@@ -1,0 +1,3 @@
+# Paths, files and folders.
+set(QN_FILE_TESTS
+)
