@@ -1,0 +1,6 @@
+# Sources that deal with the process itself and its modules.
+target_sources(zkfpga PRIVATE
+  ${CMAKE_CURRENT_LIST_DIR}/dsc/osdep/DebugTrap_linux.cpp
+  ${CMAKE_CURRENT_LIST_DIR}/dsc/osdep/FatalError_linux.cpp
+  ${CMAKE_CURRENT_LIST_DIR}/dsc/osdep/Module_linux.cpp)
+target_link_libraries(zkfpga PRIVATE ${CMAKE_DL_LIBS})
