@@ -102,6 +102,10 @@ NodeEntry* EntryList::FindInIndex(std::u16string_view key) const {
 }
 
 EntryList::Place EntryList::FindPlace(std::u16string_view key) const {
+    // Copies and caches come in order.
+    if (count == 0 || Compare(At(Last())->Key().View(), key) < 0) {
+        return {{}, nullptr};
+    }
     if (isLong) {
         const EntryPieces& pieces = longForm->pieces;
         const EntryPosition position =
@@ -193,10 +197,9 @@ EntryPosition EntryList::Detach(EntryPosition position) noexcept {
     return next;
 }
 
-void EntryList::AssignKey(NodeEntry* entry, const String& key) {
-    String copy(key);
+void EntryList::AssignKey(NodeEntry* entry, String&& key) noexcept {
     DropIndex();
-    entry->key.Swap(copy);
+    entry->key.Swap(key);
 }
 
 void EntryList::DropIndex() noexcept {

@@ -67,8 +67,8 @@ class EntryList {
     // Takes an entry out without releasing it; gives the position of the one that followed it.
     EntryPosition Detach(EntryPosition position) noexcept;
 
-    // Assigns the key of an entry of an ordered list. Throws bad_alloc; then nothing has changed.
-    void AssignKey(NodeEntry* entry, const String& key);
+    // Swaps the key of an entry of an ordered list, or of one that has been taken out, for `key`.
+    void AssignKey(NodeEntry* entry, String&& key) noexcept;
 
     // Forgets the index of the keys. Worth doing ahead of a removal of very many entries.
     void DropIndex() noexcept;

@@ -25,8 +25,9 @@ namespace zkhw {
 
 using qn::dsc::NarrowString;
 
+class ElementReader;
+class LoadChain;
 class ParseStack;
-struct LoadChain;
 
 // Parameters for "#{name}": from name to value, blind to letter case.
 using ParameterMap = std::map<String, String>;
@@ -216,7 +217,11 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     void DispatchChanges(uint32_t mask);
 
     // Notes `changes`, and delivers at once unless delivery is held back.
-    void Raise(uint32_t changes);
+    void Raise(uint32_t changes) {
+        if (attachments || suspendCount != 0) {
+            RaiseObserved(changes);
+        }
+    }
 
     // A watched node changed: raises on this node what concerns it.
     void OnNodeChanged(ResTreeNode* node, uint32_t changes, int32_t context) override;
@@ -265,41 +270,38 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
 
   private:
     friend class ChangeDispatch;
-    friend class ParseStack;
+    friend class ElementReader;
     friend class ReleaseScope;
     struct Attachments;
     struct MergeWalk;
 
-    // A path that has been cut up for EnsureDeferredLoaded.
-    struct DeferredLoad;
-
     Attachments& GetAttachments();
     Added Store(EntryPosition position, NodeEntry* entry, uint32_t change);
     EntryPosition PositionBefore(const String* before);
-    Added AddChildAt(EntryPosition position, String&& key, std::u16string_view childType, bool childOrdered,
-                     ResTreeNode*& child);
-    Added AddChild(String&& key, std::u16string_view childType, bool childOrdered, ResTreeNode*& child,
-                   const String* before);
+    Added AddChildAt(EntryPosition position, String&& key, String&& childType, bool childOrdered, ResTreeNode*& child);
+    Added AddChild(String&& key, String&& childType, bool childOrdered, ResTreeNode*& child, const String* before);
     ResTreeNode* PrepareClone(EntryPosition position, std::u16string_view key, ResTreeNode& source, bool overwrite,
                               NodeEntry*& entry);
 
-    void RetireSubtree();
+    void FinishRemoval(NodeEntry* entry);
+    std::vector<NodeEntry*> ChildEntriesInRemovalOrder() const;
+    void RetireDescendants();
     void TearDown() noexcept;
     static void ReleaseNode(ResTreeNode* node) noexcept;
     static void DestroySubtree(ResTreeNode* top) noexcept;
 
-    bool HasObserver(ResTreeNodeChangeObserver* observer, int32_t context) const;
+    void RaiseObserved(uint32_t changes);
     bool Register(ResTreeNodeChangeObserver* observer, uint32_t mask, int32_t context, ResTreeNode* chained);
     bool Unregister(ResTreeNodeChangeObserver* observer, int32_t context);
     bool WatchAncestors();
-    void StopWatchingAncestors();
     bool WatchDependants();
-    void StopWatchingDependants();
+    static bool RemoveRecords(ResTreeNode& node, ResTreeNodeChangeObserver* observer, int32_t context);
     void ForgetWatching() noexcept;
     bool AnyActiveObserver(uint32_t mask) const;
 
-    int32_t LoadFile(const NarrowString& path, bool asChild, ResTreeNode** node, const LoadChain* includer);
-    bool BeginDeferredLoad(std::vector<String>& pieces);
+    int32_t LoadIncludedFile(const NarrowString& path, bool asChild, ResTreeNode** node, const LoadChain& includer);
+    int32_t LoadFile(const NarrowString& path, bool asChild, ResTreeNode** node, const LoadChain& chain);
+    bool TakeDeferredPaths(std::vector<String>& paths);
 
     String name;
     String type;

@@ -1,0 +1,130 @@
+#include "restree/ChangeDispatch.h"
+
+#include <algorithm>
+
+#include "restree/NodeAttachments.h"
+
+namespace zkhw {
+
+namespace {
+
+// What a watching node passes on.
+constexpr uint32_t nameChanges = NodeNameChanged | AncestorChanged;
+
+}  // namespace
+
+void ChangeDispatch::Run(ResTreeNode& node, uint32_t mask) {
+    ChangeDispatch dispatch;
+    dispatch.Open(node, mask);
+    while (!dispatch.steps.empty()) {
+        dispatch.Advance();
+    }
+}
+
+void ChangeDispatch::Open(ResTreeNode& node, uint32_t mask) {
+    steps.push_back({&node, 0, mask, 0, 0, 0, false});
+    if (node.attachments) {
+        node.attachments->dispatch = this;
+    }
+    BeginPass(steps.back());
+}
+
+void ChangeDispatch::BeginPass(Step& step) {
+    ResTreeNode& node = *step.node;
+    step.saved = node.pendingChanges;
+    step.wasSuspended = node.suspendCount != 0;
+    step.delivered = step.saved & step.mask;
+    step.next = 0;
+    node.suspendCount = 1;
+    node.pendingChanges = 0;
+    if (node.attachments) {
+        node.attachments->notifying = true;
+    }
+}
+
+// True if the pass was the last.
+bool ChangeDispatch::EndPass(Step& step) const {
+    ResTreeNode& node = *step.node;
+    if (step.delivered != 0) {
+        step.saved &= ~step.delivered;
+        if (node.attachments) {
+            auto& observers = node.attachments->observers;
+            const auto removed = std::remove_if(observers.begin(), observers.end(), [](const ObserverRecord& record) {
+                return record.state == ObserverRecord::Removed;
+            });
+            ObserverCount::Subtract(static_cast<size_t>(observers.end() - removed));
+            observers.erase(removed, observers.end());
+            for (ObserverRecord& record : observers) {
+                record.state = ObserverRecord::Active;
+            }
+        }
+    }
+    node.pendingChanges = static_cast<uint16_t>(node.pendingChanges | step.saved);
+    node.suspendCount = step.wasSuspended ? 1 : 0;
+    if (node.attachments) {
+        node.attachments->notifying = false;
+    }
+    if (node.suspendCount == 0 && (node.pendingChanges & step.mask) != 0) {
+        return false;
+    }
+    if (node.attachments) {
+        node.attachments->dispatch = nullptr;
+    }
+    return true;
+}
+
+void ChangeDispatch::RaiseInTurn(ResTreeNode& node, uint32_t changes) {
+    if (node.isDefunct) {
+        return;
+    }
+    // A node that is open further down the stack has raised this itself: a cycle of "Reserves" ends here.
+    if (node.attachments && node.attachments->dispatch == this) {
+        return;
+    }
+    node.pendingChanges = static_cast<uint16_t>(node.pendingChanges | changes);
+    if (node.suspendCount == 0) {
+        Open(node, allChanges);
+    }
+}
+
+void ChangeDispatch::Advance() {
+    Step& step = steps.back();
+    ResTreeNode& node = *step.node;
+    if (step.raised != 0) {
+        const uint32_t raised = step.raised;
+        steps.pop_back();
+        RaiseInTurn(node, raised);
+        return;
+    }
+    if (node.isDefunct) {
+        steps.pop_back();
+        return;
+    }
+    if (step.delivered != 0 && node.attachments && step.next < node.attachments->observers.size()) {
+        // A copy: the call may register observers and so move the records.
+        const ObserverRecord record = node.attachments->observers[step.next++];
+        if (record.state != ObserverRecord::Active || (record.mask & step.delivered) == 0) {
+            return;
+        }
+        const uint32_t delivered = step.delivered;
+        if (record.chained == nullptr) {
+            record.observer->OnNodeChanged(&node, delivered, record.context);
+            return;
+        }
+        // A watching node hears in two turns, names first: the top of the stack is next.
+        if ((delivered & ReservationChanged) != 0) {
+            steps.push_back({record.chained, ReservationChanged, 0, 0, 0, 0, false});
+        }
+        if ((delivered & nameChanges) != 0) {
+            steps.push_back({record.chained, delivered & nameChanges, 0, 0, 0, 0, false});
+        }
+        return;
+    }
+    if (EndPass(step)) {
+        steps.pop_back();
+    } else {
+        BeginPass(step);
+    }
+}
+
+}  // namespace zkhw

@@ -1,0 +1,43 @@
+#pragma once
+
+// One run of change notices: from a node to its observers, and on through the nodes that watch it. The nodes that are
+// open at one time stand on a stack of its own, so that a chain of watching nodes may be as long as the tree is deep.
+
+#include <cstdint>
+#include <vector>
+
+#include "restree/ReleaseScope.h"
+
+namespace zkhw {
+
+class ResTreeNode;
+
+class ChangeDispatch {
+  public:
+    // Delivers what is pending of `mask` on `node`, and all that follows from it.
+    static void Run(ResTreeNode& node, uint32_t mask);
+
+  private:
+    // A node whose observers are being called, or (`raised` nonzero) one that is still to hear of a change.
+    struct Step {
+        ResTreeNode* node;
+        uint32_t raised;
+        uint32_t mask;
+        uint32_t saved;      // What was pending when the pass began, less what it has delivered.
+        uint32_t delivered;  // What the pass delivers.
+        size_t next;         // The record to call next.
+        bool wasSuspended;
+    };
+
+    ChangeDispatch() = default;
+    void Open(ResTreeNode& node, uint32_t mask);
+    static void BeginPass(Step& step);
+    bool EndPass(Step& step) const;
+    void RaiseInTurn(ResTreeNode& node, uint32_t changes);
+    void Advance();
+
+    const ReleaseScope scope;
+    std::vector<Step> steps;
+};
+
+}  // namespace zkhw

@@ -1,0 +1,123 @@
+#include "restree/ExPatHandler.h"
+
+#include <expat.h>
+
+#include <utility>
+
+#include "qn/dsc/osdep/TaskMemory.h"
+
+namespace zkhw {
+
+namespace {
+
+constexpr XML_Memory_Handling_Suite memorySuite = {qn::dsc::osdep::TaskMemAlloc, qn::dsc::osdep::TaskMemRealloc,
+                                                   qn::dsc::osdep::TaskMemFree};
+
+}  // namespace
+
+struct ExPatHandler::Callbacks {
+    template <typename Call>
+    static void Guard(void* userData, Call call) {
+        auto& handler = *static_cast<ExPatHandler*>(userData);
+        // libexpat may still report the end of an element whose start has failed.
+        if (handler.failure) {
+            return;
+        }
+        try {
+            call(handler);
+        } catch (...) {
+            handler.failure = std::current_exception();
+            XML_StopParser(handler.parser, XML_FALSE);
+        }
+    }
+
+    static void StartElement(void* userData, const XML_Char* name, const XML_Char** attributes) {
+        Guard(userData, [&](ExPatHandler& handler) { handler.StartElement(name, attributes); });
+    }
+    static void EndElement(void* userData, const XML_Char* name) {
+        Guard(userData, [&](ExPatHandler& handler) { handler.EndElement(name); });
+    }
+    static void CharacterData(void* userData, const XML_Char* text, int length) {
+        Guard(userData, [&](ExPatHandler& handler) { handler.CharacterData({text, static_cast<size_t>(length)}); });
+    }
+    static void ProcessingInstruction(void* userData, const XML_Char* target, const XML_Char* data) {
+        Guard(userData, [&](ExPatHandler& handler) { handler.ProcessingInstruction(target, data); });
+    }
+    static void Comment(void* userData, const XML_Char* text) {
+        Guard(userData, [&](ExPatHandler& handler) { handler.Comment(text); });
+    }
+    static void StartCdataSection(void* userData) {
+        Guard(userData, [](ExPatHandler& handler) { handler.StartCdataSection(); });
+    }
+    static void EndCdataSection(void* userData) {
+        Guard(userData, [](ExPatHandler& handler) { handler.EndCdataSection(); });
+    }
+};
+
+ExPatHandler::ExPatHandler() : parser(XML_ParserCreate_MM("utf-8", &memorySuite, nullptr)) {
+    if (parser == nullptr) {
+        return;
+    }
+    XML_SetUserData(parser, this);
+    XML_SetElementHandler(parser, Callbacks::StartElement, Callbacks::EndElement);
+    XML_SetCharacterDataHandler(parser, Callbacks::CharacterData);
+    XML_SetProcessingInstructionHandler(parser, Callbacks::ProcessingInstruction);
+    XML_SetCommentHandler(parser, Callbacks::Comment);
+    XML_SetCdataSectionHandler(parser, Callbacks::StartCdataSection, Callbacks::EndCdataSection);
+}
+
+ExPatHandler::~ExPatHandler() {
+    if (parser != nullptr) {
+        XML_ParserFree(parser);
+    }
+}
+
+bool ExPatHandler::Parse(const char* bytes, size_t count, bool isFinal) {
+    const XML_Status status = XML_Parse(parser, bytes, static_cast<int>(count), isFinal ? 1 : 0);
+    if (failure) {
+        std::rethrow_exception(std::exchange(failure, nullptr));
+    }
+    return status == XML_STATUS_OK;
+}
+
+namespace {
+
+// The end of `before` that shows the line at fault and the one ahead of it, with the line feed that it starts with.
+std::u16string_view ContextTail(const String& before) {
+    uint32_t start = before.FindLast(u'\n');
+    if (start != String::npos && start != 0) {
+        start = before.FindLast(u'\n', start - 1);
+    }
+    return before.View().substr(start == String::npos ? 0 : start);
+}
+
+// The beginning of `after` up to its second line feed.
+std::u16string_view ContextHead(const String& after) {
+    uint32_t end = after.Find(u'\n');
+    if (end != String::npos) {
+        end = after.Find(u'\n', end + 1);
+    }
+    return after.View().substr(0, end == String::npos ? end : end + 1);
+}
+
+}  // namespace
+
+void ExPatHandler::GetErrorInfo(String& message, uint32_t& line, uint32_t& column, String& context) const {
+    const XML_Error error = XML_GetErrorCode(parser);
+    message = error == XML_ERROR_NONE ? String() : String(XML_ErrorString(error));
+    line = static_cast<uint32_t>(XML_GetCurrentLineNumber(parser));
+    column = static_cast<uint32_t>(XML_GetCurrentColumnNumber(parser));
+    int offset = 0;
+    int size = 0;
+    const char* buffer = XML_GetInputContext(parser, &offset, &size);
+    if (buffer == nullptr) {
+        context = String();
+        return;
+    }
+    const String before(buffer, static_cast<uint32_t>(offset));
+    const String after(buffer + offset, static_cast<uint32_t>(size - offset));
+    context = String(ContextTail(before));
+    context.Append(ContextHead(after));
+}
+
+}  // namespace zkhw

@@ -1,0 +1,39 @@
+#pragma once
+
+// What only few nodes have, kept out of the node itself: most nodes of a tree are never observed and have no types of
+// their own. Internal to the node's implementation.
+
+#include <memory>
+#include <vector>
+
+#include "restree/ResTreeNode.h"
+
+namespace zkhw {
+
+class ChangeDispatch;
+
+struct ResTreeNode::Attachments {
+    std::unique_ptr<TypeTable> typeTable;
+
+    std::vector<ObserverRecord> observers;  // In order of registration.
+    bool notifying = false;                 // A dispatch runs over `observers`.
+    const ChangeDispatch* dispatch = nullptr;  // The run of notices that has this node open, if any.
+
+    // The nodes that hold a record of this one, so that none of them is left with it when this node goes. Each stands
+    // here once per record.
+    std::vector<ResTreeNode*> watched;
+
+    // Entries that a renaming over a sibling took from the collection. They live on, out of reach of any lookup, for
+    // as long as this node does.
+    std::vector<NodeEntry*> lostEntries;
+};
+
+// How many observer records there are in the process. While there are none, nodes come and go without notices.
+class ObserverCount {
+  public:
+    static bool IsZero() noexcept;
+    static void Add(size_t count) noexcept;
+    static void Subtract(size_t count) noexcept;
+};
+
+}  // namespace zkhw

@@ -1,0 +1,49 @@
+#include "restree/NodeEntry.h"
+
+#include <new>
+#include <utility>
+
+#include "qn/dsc/osdep/TaskMemory.h"
+
+namespace zkhw {
+
+namespace {
+
+void* Allocate(size_t size) {
+    void* memory = qn::dsc::osdep::TaskMemAlloc(size);
+    if (memory == nullptr) {
+        throw std::bad_alloc();
+    }
+    return memory;
+}
+
+}  // namespace
+
+NodeEntry* NodeEntry::MakeText(String&& key, EntryKind kind, String&& text) {
+    return new (Allocate(sizeof(TextShape))) TextShape(std::move(key), kind, std::move(text));
+}
+
+NodeEntry* NodeEntry::MakeChild(String&& key, ResTreeNode* child) {
+    return new (Allocate(sizeof(ChildShape))) ChildShape(std::move(key), child);
+}
+
+void NodeEntry::Release(NodeEntry* entry) noexcept {
+    if (entry->textShape) {
+        static_cast<TextShape*>(entry)->~TextShape();
+    } else {
+        static_cast<ChildShape*>(entry)->~ChildShape();
+    }
+    qn::dsc::osdep::TaskMemFree(entry);
+}
+
+ResTreeNode* NodeEntry::TakeChild() {
+    kind = EmptyEntry;
+    return std::exchange(static_cast<ChildShape*>(this)->child, nullptr);
+}
+
+void NodeEntry::ReleaseText() {
+    kind = EmptyEntry;
+    static_cast<TextShape*>(this)->text.Erase(0, String::npos, 0);
+}
+
+}  // namespace zkhw

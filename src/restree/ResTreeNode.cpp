@@ -1,0 +1,388 @@
+#include "restree/ResTreeNode.h"
+
+#include <new>
+#include <utility>
+
+#include "qn/dsc/osdep/Compare.h"
+#include "qn/dsc/osdep/TaskMemory.h"
+#include "restree/NodeAttachments.h"
+#include "restree/ReleaseScope.h"
+#include "restree/TextList.h"
+
+namespace zkhw {
+
+using qn::dsc::osdep::Compare;
+
+namespace {
+
+constexpr std::u16string_view displayNameKey = u"DisplayName";
+constexpr std::u16string_view protocolsKey = u"Protocols";
+
+struct TypeRelation {
+    std::u16string_view type;
+    std::u16string_view base;
+};
+
+constexpr TypeRelation builtInRelations[] = {
+    {u"Resource", u""},         {u"IOResource", u"Resource"},     {u"ResourceList", u""},     {u"Target", u"ResourceList"},
+    {u"Connector", u"ResourceList"}, {u"Module", u"Resource"}, {u"Module", u"ResourceList"},
+};
+
+}  // namespace
+
+ResTreeNode::ResTreeNode(std::u16string_view name, std::u16string_view type, bool ordered)
+    : name(name), type(type), parent(nullptr), entries(ordered) {
+    auto table = std::make_unique<TypeTable>();
+    for (const TypeRelation& relation : builtInRelations) {
+        table->AddTypeRelation(relation.type, relation.base);
+    }
+    GetAttachments().typeTable = std::move(table);
+}
+
+ResTreeNode::ResTreeNode(String&& name, String&& type, bool ordered, ResTreeNode* parent)
+    : name(std::move(name)), type(std::move(type)), parent(parent), entries(ordered) {}
+
+ResTreeNode::ResTreeNode(std::u16string_view name, std::u16string_view type, bool ordered, const TypeTable* sourceTable)
+    : name(name), type(type), parent(nullptr), entries(ordered) {
+    if (sourceTable != nullptr) {
+        GetAttachments().typeTable = sourceTable->Copy();
+    }
+}
+
+void* ResTreeNode::operator new(size_t size) {
+    if (void* memory = qn::dsc::osdep::TaskMemAlloc(size)) {
+        return memory;
+    }
+    throw std::bad_alloc();
+}
+
+void* ResTreeNode::operator new(size_t size, const std::nothrow_t&) noexcept {
+    return qn::dsc::osdep::TaskMemAlloc(size);
+}
+
+void ResTreeNode::operator delete(void* memory) noexcept {
+    qn::dsc::osdep::TaskMemFree(memory);
+}
+
+void ResTreeNode::operator delete(void* memory, const std::nothrow_t&) noexcept {
+    qn::dsc::osdep::TaskMemFree(memory);
+}
+
+ResTreeNode::Attachments& ResTreeNode::GetAttachments() {
+    if (!attachments) {
+        attachments = std::make_unique<Attachments>();
+    }
+    return *attachments;
+}
+
+// --- Reading ---
+
+EntryIterator ResTreeNode::BeginLoaded() {
+    EnsureDeferredLoaded();
+    return Begin();
+}
+
+EntryIterator ResTreeNode::FindEntryRaw(std::u16string_view key) {
+    const NodeEntry* entry = FindRaw(key);
+    return entry == nullptr ? End() : PositionOf(entry);
+}
+
+EntryIterator ResTreeNode::FindEntry(std::u16string_view key) {
+    const NodeEntry* entry = Find(key);
+    return entry == nullptr ? End() : PositionOf(entry);
+}
+
+NodeEntry* ResTreeNode::Find(std::u16string_view key) {
+    if (NodeEntry* entry = FindRaw(key)) {
+        return entry;
+    }
+    // The load may remove this very node.
+    const ReleaseScope scope;
+    EnsureDeferredLoaded();
+    return FindRaw(key);
+}
+
+const String* ResTreeNode::GetProperty(std::u16string_view key) {
+    const NodeEntry* entry = Find(key);
+    return entry == nullptr ? nullptr : entry->Text();
+}
+
+const String& ResTreeNode::GetPropertyOrEmpty(std::u16string_view key) {
+    static const String empty;
+    const String* value = GetProperty(key);
+    return value == nullptr ? empty : *value;
+}
+
+ResTreeNode* ResTreeNode::ResolveEntry(EntryIterator iterator) {
+    return iterator.IsEnd() ? nullptr : ResolveEntry(&*iterator);
+}
+
+ResTreeNode* ResTreeNode::ResolveEntry(NodeEntry* entry) {
+    if (entry == nullptr) {
+        return nullptr;
+    }
+    if (const String* path = entry->LinkPath()) {
+        return Lookup(path->View(), nullptr);
+    }
+    return entry->Child();
+}
+
+// --- Changing ---
+
+bool ResTreeNode::SetProperty(std::u16string_view key, std::u16string_view value) {
+    if (NodeEntry* entry = Find(key)) {
+        return SetEntryText(entry, String(value));
+    }
+    AddTextEntry(String(key), String(value), TextEntry);
+    return true;
+}
+
+bool ResTreeNode::SetEntryText(EntryIterator iterator, std::u16string_view value) {
+    return !iterator.IsEnd() && SetEntryText(&*iterator, String(value));
+}
+
+bool ResTreeNode::SetEntryText(NodeEntry* entry, String&& value) {
+    String* text = entry == nullptr ? nullptr : entry->Text();
+    if (text == nullptr) {
+        return false;
+    }
+    const bool isDisplayName = Compare(entry->Key().View(), displayNameKey) == 0;
+    text->Swap(value);
+    const ReleaseScope scope;
+    Raise(PropertyChanged);
+    if (isDisplayName) {
+        Raise(NodeNameChanged);
+        if (parent != nullptr) {
+            parent->Raise(ChildNameChanged);
+        }
+    }
+    return true;
+}
+
+EntryPosition ResTreeNode::PositionBefore(const String* before) {
+    if (before == nullptr) {
+        return EntryList::End();
+    }
+    const NodeEntry* entry = Find(before->View());
+    return entry == nullptr ? EntryList::End() : entries.Locate(entry);
+}
+
+ResTreeNode::Added ResTreeNode::Store(EntryPosition position, NodeEntry* entry, uint32_t change) {
+    try {
+        entries.Insert(position, entry);
+    } catch (...) {
+        delete entry->Child();
+        NodeEntry::Release(entry);
+        throw;
+    }
+    Raise(change);
+    return {entry, true};
+}
+
+ResTreeNode::Added ResTreeNode::AddTextEntry(String&& key, String&& value, EntryKind kind, const String* before) {
+    EntryPosition position = PositionBefore(before);
+    if (!IsOrdered()) {
+        const EntryList::Place place = entries.FindPlace(key.View());
+        if (place.entry != nullptr) {
+            return {place.entry, false};
+        }
+        position = place.position;
+    }
+    return Store(position, NodeEntry::MakeText(std::move(key), kind, std::move(value)), PropertyAdded);
+}
+
+ResTreeNode::Added ResTreeNode::AddLinkEntry(String&& key, String&& path, const String* before) {
+    EntryPosition position = PositionBefore(before);
+    if (!IsOrdered()) {
+        const EntryList::Place place = entries.FindPlace(key.View());
+        if (place.entry != nullptr) {
+            return {place.entry, false};
+        }
+        position = place.position;
+    }
+    return Store(position, NodeEntry::MakeText(std::move(key), LinkEntry, std::move(path)), ChildAdded);
+}
+
+ResTreeNode::Added ResTreeNode::AddChildEntry(std::u16string_view key, std::u16string_view childType, bool childOrdered,
+                                              ResTreeNode*& child, const String* before) {
+    return AddChild(String(key), String(childType), childOrdered, child, before);
+}
+
+ResTreeNode::Added ResTreeNode::AddChild(String&& key, String&& childType, bool childOrdered, ResTreeNode*& child,
+                                         const String* before) {
+    return AddChildAt(PositionBefore(before), std::move(key), std::move(childType), childOrdered, child);
+}
+
+ResTreeNode::Added ResTreeNode::AddChildAt(EntryPosition position, String&& key, String&& childType, bool childOrdered,
+                                           ResTreeNode*& child) {
+    if (!IsOrdered()) {
+        const EntryList::Place place = entries.FindPlace(key.View());
+        if (place.entry != nullptr) {
+            child = place.entry->Child();
+            return {place.entry, false};
+        }
+        position = place.position;
+    }
+    auto made = std::make_unique<ResTreeNode>(String(key), std::move(childType), childOrdered, this);
+    NodeEntry* entry = NodeEntry::MakeChild(std::move(key), made.get());
+    child = made.release();
+    return Store(position, entry, ChildAdded);
+}
+
+EntryIterator ResTreeNode::InsertEntry(EntryIterator position, std::u16string_view key, EntryKind kind,
+                                       std::u16string_view text) {
+    const EntryPosition place = IsOrdered() ? position.Position() : entries.FindPlace(key).position;
+    NodeEntry* entry = NodeEntry::MakeText(String(key), kind, String(text));
+    try {
+        return {entries, entries.Insert(place, entry)};
+    } catch (...) {
+        NodeEntry::Release(entry);
+        throw;
+    }
+}
+
+EntryIterator ResTreeNode::InsertEntry(EntryIterator position, std::u16string_view key, std::unique_ptr<ResTreeNode> child) {
+    const EntryPosition place = IsOrdered() ? position.Position() : entries.FindPlace(key).position;
+    NodeEntry* entry = NodeEntry::MakeChild(String(key), child.get());
+    try {
+        const EntryPosition stored = entries.Insert(place, entry);
+        child.release()->parent = this;
+        return {entries, stored};
+    } catch (...) {
+        NodeEntry::Release(entry);
+        throw;
+    }
+}
+
+bool ResTreeNode::RenameEntry(std::u16string_view oldKey, std::u16string_view newKey) {
+    NodeEntry* entry = Find(oldKey);
+    if (entry == nullptr) {
+        return false;
+    }
+    String key(newKey);
+    if (IsOrdered()) {
+        entries.AssignKey(entry, std::move(key));
+        return true;
+    }
+    std::vector<NodeEntry*>& lost = GetAttachments().lostEntries;
+    lost.push_back(entry);
+    entries.Detach(entries.Locate(entry));
+    entries.AssignKey(entry, std::move(key));
+    const EntryList::Place place = entries.FindPlace(newKey);
+    if (place.entry != nullptr) {
+        // Lost on purpose, with all that it holds: whoever cares tests first.
+        return false;
+    }
+    entries.Insert(place.position, entry);
+    lost.pop_back();
+    return true;
+}
+
+bool ResTreeNode::Rename(std::u16string_view newName) {
+    const ReleaseScope scope;
+    String assigned(newName);
+    if (parent != nullptr && !parent->RenameEntry(name.View(), newName)) {
+        return false;
+    }
+    name.Swap(assigned);
+    Raise(NodeNameChanged);
+    if (parent != nullptr) {
+        parent->Raise(ChildNameChanged);
+    }
+    return true;
+}
+
+void ResTreeNode::SetOrdered(bool ordered) {
+    entries.Reset(ordered);
+}
+
+void ResTreeNode::RemoveIfMismatched(bool unconditional, std::u16string_view entryName, std::u16string_view entryType,
+                                     bool entryOrdered) {
+    if (unconditional) {
+        RemoveEntryByName(entryName);
+        return;
+    }
+    NodeEntry* entry = FindRaw(entryName);
+    if (entry == nullptr) {
+        return;
+    }
+    const ResTreeNode* child = entry->Child();
+    if (child == nullptr || child->IsOrdered() != entryOrdered || Compare(child->type.View(), entryType) != 0) {
+        RemoveEntry(entry);
+    }
+}
+
+// --- Types ---
+
+TypeTable* ResTreeNode::GetTypeTable() const {
+    return attachments ? attachments->typeTable.get() : nullptr;
+}
+
+const TypeTable* ResTreeNode::NearestTypeTable() const {
+    for (const ResTreeNode* node = this; node != nullptr; node = node->parent) {
+        if (const TypeTable* table = node->GetTypeTable()) {
+            return table;
+        }
+    }
+    return nullptr;
+}
+
+bool ResTreeNode::IsA(std::u16string_view typeName) const {
+    if (Compare(typeName, type.View()) == 0) {
+        return true;
+    }
+    const TypeTable* table = NearestTypeTable();
+    const TypeRecord* record = table == nullptr ? nullptr : table->Find(type.View());
+    return record != nullptr && record->IsA(typeName);
+}
+
+bool ResTreeNode::Supports(std::u16string_view text) {
+    if (text.empty() || IsA(text)) {
+        return true;
+    }
+    const String* protocols = GetProperty(protocolsKey);
+    if (protocols == nullptr) {
+        return false;
+    }
+    const std::u16string_view value = protocols->View();
+    for (size_t hit = value.find(text); hit != std::u16string_view::npos; hit = value.find(text, hit + 1)) {
+        const size_t end = hit + text.size();
+        if ((hit == 0 || value[hit - 1] == u',') && (end == value.size() || value[end] == u',')) {
+            return true;
+        }
+    }
+    return false;
+}
+
+namespace {
+
+void AppendBaseNames(const TypeRecord& record, std::vector<String>& list) {
+    for (const TypeRecord* base : record.bases) {
+        list.push_back(base->name);
+        AppendBaseNames(*base, list);
+    }
+}
+
+}  // namespace
+
+void ResTreeNode::GetProtocols(std::vector<String>& list) {
+    list.push_back(type);
+    const TypeTable* table = NearestTypeTable();
+    if (const TypeRecord* record = table == nullptr ? nullptr : table->Find(type.View())) {
+        AppendBaseNames(*record, list);
+    }
+    if (const String* protocols = GetProperty(protocolsKey)) {
+        SplitList(protocols->View(), u',', list, true);
+    }
+}
+
+void ResTreeNode::MakeTypeTableLocal() {
+    if (GetTypeTable() != nullptr) {
+        return;
+    }
+    if (const TypeTable* table = NearestTypeTable()) {
+        GetAttachments().typeTable = table->Copy();
+    }
+}
+
+}  // namespace zkhw

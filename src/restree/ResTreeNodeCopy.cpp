@@ -1,0 +1,141 @@
+// Merges and deep copies. A merge walks the source and fills the target at the same time, level by level on a stack
+// of its own. What the target gains on the way is never entered as a source, so a node can be merged with a node
+// above it; and what the merge removes stays readable until it ends (ReleaseScope).
+
+#include <utility>
+#include <vector>
+
+#include "restree/NodePath.h"
+#include "restree/ReleaseScope.h"
+#include "restree/ResTreeNode.h"
+#include "restree/TextList.h"
+
+namespace zkhw {
+
+struct ResTreeNode::MergeWalk {
+    struct Level {
+        ResTreeNode* target;
+        ResTreeNode* source;
+        EntryPosition next;
+        // Paths of the two, made for the first link.
+        String sourcePath = String::WithoutBuffer();
+        String targetPath = String::WithoutBuffer();
+        bool hasPaths = false;
+    };
+
+    MergeWalk(ResTreeNode& target, ResTreeNode& source, bool overwrite) : top(&target), overwrite(overwrite) {
+        Enter(target, source);
+    }
+
+    void Run();
+    void Enter(ResTreeNode& target, ResTreeNode& source) {
+        if (&target != &source) {
+            levels.push_back({&target, &source, source.entries.Begin()});
+        }
+    }
+    void MergeText(ResTreeNode& target, const NodeEntry& entry);
+    void MergeLink(Level& level, const NodeEntry& entry);
+
+    const ReleaseScope scope;
+    ResTreeNode* top;
+    bool overwrite;
+    std::vector<Level> levels;
+};
+
+void ResTreeNode::MergeWalk::Run() {
+    while (!levels.empty()) {
+        Level& level = levels.back();
+        if (level.next.IsEnd()) {
+            levels.pop_back();
+            continue;
+        }
+        const NodeEntry& entry = *level.source->entries.At(level.next);
+        level.next = level.source->entries.Next(level.next);
+        if (entry.IsText()) {
+            MergeText(*level.target, entry);
+        } else if (entry.LinkPath() != nullptr) {
+            MergeLink(level, entry);
+        } else if (ResTreeNode* sourceChild = entry.Child(); sourceChild != nullptr && sourceChild != top) {
+            NodeEntry* placed = nullptr;
+            if (ResTreeNode* child =
+                    level.target->PrepareClone(EntryList::End(), entry.Key().View(), *sourceChild, overwrite, placed)) {
+                Enter(*child, *sourceChild);
+            }
+        }
+    }
+}
+
+void ResTreeNode::MergeWalk::MergeText(ResTreeNode& target, const NodeEntry& entry) {
+    String text(*entry.Text());
+    const Added added = target.AddTextEntry(String(entry.Key()), std::move(text), entry.Kind());
+    if (!added.isNew && overwrite) {
+        target.SetEntryText(added.entry, std::move(text));
+    }
+}
+
+void ResTreeNode::MergeWalk::MergeLink(Level& level, const NodeEntry& entry) {
+    if (!level.hasPaths) {
+        level.sourcePath = level.source->GetPath();
+        level.targetPath = level.target->GetPath();
+        level.hasPaths = true;
+    }
+    // The text of the link counts as one further component of the path, slashes and all.
+    const String linkTarget = JoinList(level.sourcePath, *entry.LinkPath(), u'/', false, true);
+    String path = MakeRelativeNodePath(linkTarget, level.targetPath);
+    const Added added = level.target->AddLinkEntry(String(entry.Key()), std::move(path));
+    if (!added.isNew && overwrite) {
+        level.target->SetEntryText(added.entry, std::move(path));
+    }
+}
+
+void ResTreeNode::MergeFrom(ResTreeNode& source, bool overwrite) {
+    MergeWalk(*this, source, overwrite).Run();
+}
+
+// All of CloneSubtreeInto but the merge. Gives the child that is to receive it, or null if another kind of entry holds
+// the place.
+ResTreeNode* ResTreeNode::PrepareClone(EntryPosition position, std::u16string_view key, ResTreeNode& source,
+                                       bool overwrite, NodeEntry*& entry) {
+    if (IsOrdered()) {
+        if (const NodeEntry* found = FindRaw(key)) {
+            const EntryPosition foundPosition = entries.Locate(found);
+            const uint32_t foundIndex = entries.IndexOf(foundPosition);
+            uint32_t index = entries.IndexOf(position);
+            const bool isThatEntry = foundPosition == position;
+            if (foundIndex < index) {
+                // One less for the entry that is about to go, and one less as well if it then stays.
+                --index;
+            }
+            RemoveIfMismatched(!overwrite, key, source.type.View(), source.IsOrdered());
+            position = isThatEntry ? EntryList::End() : entries.AtIndex(index);
+        } else {
+            const uint32_t index = position.IsEnd() ? 0 : entries.IndexOf(position);
+            RemoveIfMismatched(!overwrite, key, source.type.View(), source.IsOrdered());
+            position = position.IsEnd() ? position : entries.AtIndex(index);
+        }
+    } else {
+        RemoveIfMismatched(!overwrite, key, source.type.View(), source.IsOrdered());
+    }
+    ResTreeNode* child = nullptr;
+    entry = AddChildAt(position, String(key), String(source.type), source.IsOrdered(), child).entry;
+    return child;
+}
+
+EntryIterator ResTreeNode::CloneSubtreeInto(EntryIterator position, std::u16string_view key, ResTreeNode& source,
+                                            bool overwrite, ResTreeNode*& child) {
+    const ReleaseScope scope;
+    NodeEntry* entry = nullptr;
+    child = PrepareClone(position.Position(), key, source, overwrite, entry);
+    if (child != nullptr) {
+        child->MergeFrom(source, overwrite);
+    }
+    return PositionOf(entry);
+}
+
+std::unique_ptr<ResTreeNode> ResTreeNode::Clone() {
+    auto clone = std::make_unique<ResTreeNode>(name.View(), type.View(), IsOrdered(), GetTypeTable());
+    clone->MergeFrom(*this, false);
+    return clone;
+}
+
+}  // namespace zkhw

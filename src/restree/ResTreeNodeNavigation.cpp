@@ -1,0 +1,187 @@
+// From a path to a node and back.
+
+#include <algorithm>
+#include <vector>
+
+#include "qn/dsc/osdep/Compare.h"
+#include "restree/NodePath.h"
+#include "restree/ReleaseScope.h"
+#include "restree/ResTreeNode.h"
+#include "restree/TextList.h"
+
+namespace zkhw {
+
+using qn::dsc::osdep::Compare;
+
+namespace {
+
+constexpr std::u16string_view displayNameKey = u"DisplayName";
+
+// The components of a path one after the other, unescaped.
+class PathComponents {
+  public:
+    explicit PathComponents(std::u16string_view path) : rest(path), done(path.empty()) {}
+
+    bool IsDone() const { return done; }
+
+    // The next component. It lives until the next call.
+    std::u16string_view Take() {
+        size_t end = 0;
+        bool hasEscape = false;
+        size_t backslashes = 0;
+        for (; end < rest.size(); ++end) {
+            if (rest[end] == u'\\') {
+                ++backslashes;
+                hasEscape = true;
+            } else if (rest[end] == u'/' && backslashes % 2 == 0) {
+                break;
+            } else {
+                backslashes = 0;
+            }
+        }
+        const std::u16string_view raw = rest.substr(0, end);
+        done = end == rest.size();
+        rest.remove_prefix(done ? end : end + 1);
+        if (!hasEscape) {
+            return raw;
+        }
+        unescaped = UnescapeText(String(raw), u'/');
+        return unescaped.View();
+    }
+
+  private:
+    std::u16string_view rest;
+    bool done;
+    String unescaped = String::WithoutBuffer();
+};
+
+// A path that is being followed. It has its own text: a load on the way may change the entry that the path is from.
+struct OpenPath {
+    explicit OpenPath(std::u16string_view path, size_t start) : text(path), components(text.View().substr(start)) {}
+    OpenPath(const OpenPath&) = delete;
+    OpenPath& operator=(const OpenPath&) = delete;
+
+    String text;
+    PathComponents components;
+};
+
+constexpr size_t maximalLinks = 256;
+
+// Where a path starts: the node, and the offset of the first component.
+size_t FindStart(std::u16string_view path, ResTreeNode*& node, ResTreeNode* documentRoot) {
+    if (path.substr(0, 2) == u"#{") {
+        const size_t close = path.find(u'}', 2);
+        const bool isClosed = close != std::u16string_view::npos;
+        const std::u16string_view anchor = path.substr(2, isClosed ? close - 2 : close);
+        if (documentRoot != nullptr && Compare(anchor, u"document-root") == 0) {
+            node = documentRoot;
+        }
+        // Behind the brace and the separator; an anchor that isn't closed leaves all but its first unit as the path.
+        return isClosed ? std::min(close + 2, path.size()) : 1;
+    }
+    if (path.substr(0, 1) == u"/") {
+        while (node->GetParent() != nullptr) {
+            node = node->GetParent();
+        }
+        return 1;
+    }
+    return 0;
+}
+
+}  // namespace
+
+ResTreeNode* ResTreeNode::Lookup(std::u16string_view path, ResTreeNode* documentRoot) {
+    const ReleaseScope scope;
+    ResTreeNode* node = this;
+    const size_t start = FindStart(path, node, documentRoot);
+    // The paths of links that are open inside each other; the last is the innermost.
+    std::vector<std::unique_ptr<OpenPath>> open;
+    open.push_back(std::make_unique<OpenPath>(path, start));
+    size_t links = 0;
+    while (!open.empty()) {
+        PathComponents& components = open.back()->components;
+        if (components.IsDone()) {
+            open.pop_back();
+            continue;
+        }
+        const std::u16string_view component = components.Take();
+        if (Compare(component, u"..") == 0) {
+            node = node->parent;
+        } else if (Compare(component, u".") != 0) {
+            const NodeEntry* entry = node->Find(component);
+            const String* link = entry == nullptr ? nullptr : entry->LinkPath();
+            if (link != nullptr) {
+                if (++links > maximalLinks) {
+                    return nullptr;
+                }
+                const size_t linkStart = FindStart(link->View(), node, nullptr);
+                open.push_back(std::make_unique<OpenPath>(link->View(), linkStart));
+            } else {
+                node = entry == nullptr ? nullptr : entry->Child();
+            }
+        }
+        if (node == nullptr) {
+            return nullptr;
+        }
+    }
+    return node;
+}
+
+namespace {
+
+// From the node below the root to `node`.
+std::vector<ResTreeNode*> WayFromRoot(const ResTreeNode* node) {
+    std::vector<ResTreeNode*> way;
+    for (; node->GetParent() != nullptr; node = node->GetParent()) {
+        way.push_back(const_cast<ResTreeNode*>(node));
+    }
+    std::reverse(way.begin(), way.end());
+    return way;
+}
+
+// What JoinEscapedPath gives, in place.
+void AppendToPath(String& path, std::u16string_view part) {
+    // A path that counts as "/" alone, such as "/" and ignorable units, is replaced.
+    if (Compare(path.View(), u"/") == 0) {
+        path.Assign(u"/", 1);
+    } else {
+        path.Append(u"/");
+    }
+    if (part.find_first_of(u"/\\") == std::u16string_view::npos) {
+        path.Append(part);
+    } else {
+        path.Append(EscapeText(String(part), u'/').View());
+    }
+}
+
+}  // namespace
+
+String ResTreeNode::GetPath() const {
+    String path(u"/");
+    for (const ResTreeNode* node : WayFromRoot(this)) {
+        AppendToPath(path, node->name.View());
+    }
+    return path;
+}
+
+String ResTreeNode::GetDisplayPath() {
+    const ReleaseScope scope;
+    String path(u"/");
+    for (ResTreeNode* node : WayFromRoot(this)) {
+        const String* displayName = node->GetProperty(displayNameKey);
+        if (displayName == nullptr) {
+            AppendToPath(path, node->name.View());
+        } else if (!displayName->IsEmpty()) {
+            AppendToPath(path, displayName->View());
+        }
+    }
+    return path;
+}
+
+String ResTreeNode::GetEntryDisplayPath(EntryIterator iterator, const String& parentDisplayPath) {
+    const ReleaseScope scope;
+    ResTreeNode* node = ResolveEntry(iterator);
+    return node == nullptr ? String() : JoinDisplayPath(parentDisplayPath, node->name, node->GetProperty(displayNameKey));
+}
+
+}  // namespace zkhw

@@ -1,0 +1,262 @@
+// Who hears of a node's changes, and how a node comes to watch others.
+
+#include <algorithm>
+#include <atomic>
+#include <unordered_set>
+
+#include "restree/ChangeDispatch.h"
+#include "restree/NodeAttachments.h"
+#include "restree/ReleaseScope.h"
+#include "restree/ResTreeNode.h"
+#include "restree/TextList.h"
+
+namespace zkhw {
+
+namespace {
+
+constexpr int32_t anyContext = -1;
+constexpr int32_t ancestorContext = 1;   // The watching node stands below.
+constexpr int32_t dependantContext = 2;  // The watching node reserves this one with it.
+constexpr uint32_t ancestorMask = NodeNameChanged | AncestorChanged;
+
+std::atomic<size_t> observerCount = 0;
+
+bool IsMatch(const ObserverRecord& record, const ResTreeNodeChangeObserver* observer, int32_t context) {
+    return record.observer == observer && (context == anyContext || record.context == context);
+}
+
+}  // namespace
+
+bool ObserverCount::IsZero() noexcept {
+    return observerCount.load(std::memory_order_relaxed) == 0;
+}
+
+void ObserverCount::Add(size_t count) noexcept {
+    observerCount.fetch_add(count, std::memory_order_relaxed);
+}
+
+void ObserverCount::Subtract(size_t count) noexcept {
+    observerCount.fetch_sub(count, std::memory_order_relaxed);
+}
+
+// --- Delivery ---
+
+uint32_t ResTreeNode::BeginChanges() {
+    const uint32_t saved = pendingChanges;
+    pendingChanges = 0;
+    ++suspendCount;
+    return saved;
+}
+
+void ResTreeNode::EndChanges(uint32_t saved, bool replace) {
+    pendingChanges = static_cast<uint16_t>(replace ? saved : pendingChanges | saved);
+    if (--suspendCount == 0) {
+        DispatchChanges(allChanges);
+    }
+}
+
+void ResTreeNode::DispatchChanges(uint32_t mask) {
+    if (suspendCount == 0 && (!attachments || attachments->observers.empty())) {
+        pendingChanges = static_cast<uint16_t>(pendingChanges & ~mask);
+        return;
+    }
+    ChangeDispatch::Run(*this, mask);
+}
+
+void ResTreeNode::RaiseObserved(uint32_t changes) {
+    if (isDefunct) {
+        return;
+    }
+    pendingChanges = static_cast<uint16_t>(pendingChanges | changes);
+    if (suspendCount == 0) {
+        DispatchChanges(allChanges);
+    }
+}
+
+void ResTreeNode::OnNodeChanged(ResTreeNode*, uint32_t changes, int32_t) {
+    const ReleaseScope scope;
+    if ((changes & ancestorMask) != 0) {
+        Raise(changes & ancestorMask);
+    }
+    if ((changes & ReservationChanged) != 0) {
+        Raise(ReservationChanged);
+    }
+}
+
+// --- Registration ---
+
+bool ResTreeNode::AnyActiveObserver(uint32_t mask) const {
+    return attachments && std::any_of(attachments->observers.begin(), attachments->observers.end(),
+                                      [mask](const ObserverRecord& record) {
+                                          return record.state == ObserverRecord::Active && (record.mask & mask) != 0;
+                                      });
+}
+
+// The record itself, without what AddObserver does on top. True if it is new.
+bool ResTreeNode::Register(ResTreeNodeChangeObserver* observer, uint32_t mask, int32_t context, ResTreeNode* chained) {
+    Attachments& own = GetAttachments();
+    for (ObserverRecord& record : own.observers) {
+        if (record.state == ObserverRecord::Active && IsMatch(record, observer, context)) {
+            record.mask = mask;
+            return false;
+        }
+    }
+    own.observers.reserve(own.observers.size() + 1);
+    if (chained != nullptr) {
+        chained->GetAttachments().watched.push_back(this);
+    }
+    own.observers.push_back({observer, context, mask, own.notifying ? ObserverRecord::Added : ObserverRecord::Active, chained});
+    ObserverCount::Add(1);
+    return true;
+}
+
+// Takes out the first matching record, also one that waits for the end of a dispatch to become active: its observer
+// may be about to die. True if there was one.
+bool ResTreeNode::Unregister(ResTreeNodeChangeObserver* observer, int32_t context) {
+    if (!attachments) {
+        return false;
+    }
+    auto& observers = attachments->observers;
+    const auto found = std::find_if(observers.begin(), observers.end(), [&](const ObserverRecord& record) {
+        return record.state != ObserverRecord::Removed && IsMatch(record, observer, context);
+    });
+    if (found == observers.end()) {
+        return false;
+    }
+    if (found->chained != nullptr) {
+        auto& watched = found->chained->attachments->watched;
+        watched.erase(std::find(watched.begin(), watched.end(), this));
+    }
+    if (attachments->notifying) {
+        found->state = ObserverRecord::Removed;
+    } else {
+        observers.erase(found);
+        ObserverCount::Subtract(1);
+    }
+    return true;
+}
+
+bool ResTreeNode::WatchAncestors() {
+    bool anyNew = false;
+    for (ResTreeNode* node = this; node->parent != nullptr; node = node->parent) {
+        anyNew |= node->parent->Register(node, ancestorMask, ancestorContext, node);
+    }
+    return anyNew;
+}
+
+bool ResTreeNode::WatchDependants() {
+    // A node that has been walked once has all its dependants registered already, so cycles and repeated paths end.
+    const ReleaseScope scope;
+    bool anyNew = false;
+    std::unordered_set<ResTreeNode*> walked{this};
+    std::vector<ResTreeNode*> open{this};
+    std::vector<ResTreeNode*> dependants;
+    while (!open.empty()) {
+        ResTreeNode* node = open.back();
+        open.pop_back();
+        dependants.clear();
+        node->GetDependants(dependants, false);
+        for (ResTreeNode* dependant : dependants) {
+            anyNew |= dependant->Register(node, ReservationChanged, dependantContext, node);
+        }
+        for (auto dependant = dependants.rbegin(); dependant != dependants.rend(); ++dependant) {
+            if (walked.insert(*dependant).second) {
+                open.push_back(*dependant);
+            }
+        }
+    }
+    return anyNew;
+}
+
+// The record `observer`, `context` of `node`, and what nodes no longer have to watch for its sake.
+bool ResTreeNode::RemoveRecords(ResTreeNode& node, ResTreeNodeChangeObserver* observer, int32_t context) {
+    struct Removal {
+        ResTreeNode* node;
+        ResTreeNodeChangeObserver* observer;
+        int32_t context;
+    };
+    const ReleaseScope scope;
+    bool removedAny = false;
+    std::vector<Removal> open{{&node, observer, context}};
+    std::vector<ResTreeNode*> dependants;
+    while (!open.empty()) {
+        const Removal removal = open.back();
+        open.pop_back();
+        ResTreeNode* from = removal.node;
+        bool removed = false;
+        while (from->Unregister(removal.observer, removal.context)) {
+            removed = true;
+        }
+        if (!removed) {
+            continue;
+        }
+        removedAny = true;
+        if (from->parent != nullptr && !from->AnyActiveObserver(AncestorChanged)) {
+            open.push_back({from->parent, from, ancestorContext});
+        }
+        if (!from->AnyActiveObserver(ReservationChanged)) {
+            dependants.clear();
+            from->GetDependants(dependants, true);
+            for (ResTreeNode* dependant : dependants) {
+                open.push_back({dependant, from, dependantContext});
+            }
+        }
+    }
+    return removedAny;
+}
+
+bool ResTreeNode::AddObserver(ResTreeNodeChangeObserver* observer, uint32_t mask, int32_t context) {
+    bool anyNew = Register(observer, mask, context, nullptr);
+    if ((mask & AncestorChanged) != 0) {
+        anyNew |= WatchAncestors();
+    }
+    if ((mask & ReservationChanged) != 0) {
+        anyNew |= WatchDependants();
+    }
+    return anyNew;
+}
+
+bool ResTreeNode::RemoveObserver(ResTreeNodeChangeObserver* observer, int32_t context, bool recursive) {
+    const ReleaseScope scope;
+    bool removedAny = false;
+    std::vector<ResTreeNode*> open{this};
+    while (!open.empty()) {
+        ResTreeNode* node = open.back();
+        open.pop_back();
+        removedAny |= RemoveRecords(*node, observer, context);
+        if (recursive) {
+            const size_t first = open.size();
+            for (EntryIterator entry = node->BeginLoaded(); !entry.IsEnd(); ++entry) {
+                if (ResTreeNode* child = entry->Child()) {
+                    open.push_back(child);
+                }
+            }
+            std::reverse(open.begin() + static_cast<std::ptrdiff_t>(first), open.end());
+        }
+    }
+    return removedAny;
+}
+
+void ResTreeNode::ForgetWatching() noexcept {
+    while (attachments && !attachments->watched.empty()) {
+        RemoveRecords(*attachments->watched.back(), this, anyContext);
+    }
+}
+
+void ResTreeNode::GetDependants(std::vector<ResTreeNode*>& list, bool raw) {
+    constexpr std::u16string_view key = u"Reserves";
+    const NodeEntry* entry = raw ? FindRaw(key) : Find(key);
+    if (entry == nullptr || !entry->IsText()) {
+        return;
+    }
+    std::vector<String> paths;
+    SplitList(entry->Text()->View(), u',', paths, true);
+    const ReleaseScope scope;
+    for (const String& path : paths) {
+        if (ResTreeNode* node = Lookup(path.View(), nullptr)) {
+            list.push_back(node);
+        }
+    }
+}
+
+}  // namespace zkhw

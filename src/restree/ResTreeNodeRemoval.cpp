@@ -1,0 +1,214 @@
+// How entries and whole subtrees leave a tree.
+//
+// While nobody observes anything, a subtree goes without notices, in one walk that needs no memory. Otherwise each
+// node of it is told, and any observer may change the tree meanwhile: what such a walk still holds is kept by a
+// ReleaseScope, and an entry that an observer has removed already is known by its kind, EmptyEntry.
+
+#include <algorithm>
+#include <optional>
+#include <utility>
+#include <vector>
+
+#include "restree/NodeAttachments.h"
+#include "restree/ReleaseScope.h"
+#include "restree/ResTreeNode.h"
+
+namespace zkhw {
+
+ResTreeNode::~ResTreeNode() {
+    if (!isDefunct) {
+        TearDown();
+    }
+    // What observers have added to a node that was torn down already.
+    for (EntryIterator entry = Begin(); !entry.IsEnd(); ++entry) {
+        if (entry->Child() != nullptr) {
+            DestroySubtree(entry->TakeChild());
+        }
+    }
+}
+
+void ResTreeNode::TearDown() noexcept {
+    if (!ObserverCount::IsZero()) {
+        const ReleaseScope scope;
+        entries.DropIndex();
+        while (!entries.IsEmpty()) {
+            RemoveEntry(entries.At(entries.Begin()));
+        }
+        ForgetWatching();
+    }
+    isDefunct = true;
+    if (attachments) {
+        for (NodeEntry* entry : attachments->lostEntries) {
+            if (entry->Child() != nullptr) {
+                delete entry->TakeChild();
+            }
+            NodeEntry::Release(entry);
+        }
+        const std::vector<ObserverRecord> observers = std::move(attachments->observers);
+        ObserverCount::Subtract(observers.size());
+        for (const ObserverRecord& record : observers) {
+            if (record.chained != nullptr) {
+                std::erase(record.chained->attachments->watched, this);
+            } else if (record.state != ObserverRecord::Removed && record.observer->DeleteWithNode()) {
+                delete record.observer;
+            }
+        }
+        attachments.reset();
+    }
+    parent = nullptr;
+}
+
+// Destroys a subtree that nobody observes. The nodes still to come are threaded through their parent pointers.
+void ResTreeNode::DestroySubtree(ResTreeNode* top) noexcept {
+    ResTreeNode* pending = top;
+    pending->parent = nullptr;
+    while (pending != nullptr) {
+        ResTreeNode* node = pending;
+        pending = node->parent;
+        for (EntryIterator entry = node->Begin(); !entry.IsEnd(); ++entry) {
+            if (entry->Child() != nullptr) {
+                ResTreeNode* child = entry->TakeChild();
+                child->parent = pending;
+                pending = child;
+            }
+        }
+        node->parent = nullptr;
+        delete node;
+    }
+}
+
+void ResTreeNode::ReleaseNode(ResTreeNode* node) noexcept {
+    if (ObserverCount::IsZero()) {
+        if (ReleaseScope::IsActive()) {
+            ReleaseScope::Keep(node);
+        } else {
+            DestroySubtree(node);
+        }
+        return;
+    }
+    if (ReleaseScope::IsActive()) {
+        node->TearDown();
+        ReleaseScope::Keep(node);
+    } else {
+        delete node;
+    }
+}
+
+void ResTreeNode::RemoveEntry(EntryIterator iterator) {
+    if (!iterator.IsEnd()) {
+        RemoveEntry(&*iterator);
+    }
+}
+
+void ResTreeNode::RemoveEntry(NodeEntry* entry) {
+    ResTreeNode* child = entry->Child();
+    if (child == nullptr || ObserverCount::IsZero()) {
+        FinishRemoval(entry);
+        return;
+    }
+    const ReleaseScope scope;
+    child->Raise(NodeDeleting);
+    child->RetireDescendants();
+    child->Raise(NodeDeleted);
+    if (entry->Kind() != EmptyEntry) {
+        FinishRemoval(entry);
+    }
+}
+
+// The removal itself, when all who watch a child have been told.
+void ResTreeNode::FinishRemoval(NodeEntry* entry) {
+    std::optional<ReleaseScope> scope;
+    if (!ObserverCount::IsZero()) {
+        scope.emplace();
+    }
+    if (ReleaseScope::IsActive()) {
+        ReleaseScope::Reserve();
+    }
+    const bool isText = entry->IsText();
+    entries.Detach(entries.Locate(entry));
+    ResTreeNode* child = entry->Child();
+    if (child != nullptr) {
+        entry->TakeChild();
+    } else {
+        entry->ReleaseText();
+    }
+    if (ReleaseScope::IsActive()) {
+        ReleaseScope::Keep(entry);
+    } else {
+        NodeEntry::Release(entry);
+    }
+    if (child != nullptr) {
+        ReleaseNode(child);
+    }
+    Raise(isText ? PropertyRemoved : ChildRemoved);
+}
+
+std::vector<NodeEntry*> ResTreeNode::ChildEntriesInRemovalOrder() const {
+    std::vector<NodeEntry*> children;
+    for (EntryPosition position = entries.Begin(); !position.IsEnd(); position = entries.Next(position)) {
+        if (entries.At(position)->Child() != nullptr) {
+            children.push_back(entries.At(position));
+        }
+    }
+    // From the last to the first in an ordered node, by key in an unordered one.
+    if (IsOrdered()) {
+        std::reverse(children.begin(), children.end());
+    }
+    return children;
+}
+
+// Removes all nodes below, each with its notices. Every node of an open level still stands, unless an observer has
+// removed it, which its entry tells.
+void ResTreeNode::RetireDescendants() {
+    struct Level {
+        ResTreeNode* node;
+        NodeEntry* entry;  // Of `node` in the level above; null for the topmost level.
+        std::vector<NodeEntry*> children;
+        size_t next = 0;
+    };
+    std::vector<Level> levels;
+    levels.push_back({this, nullptr, ChildEntriesInRemovalOrder()});
+    while (true) {
+        Level& level = levels.back();
+        if (level.next < level.children.size()) {
+            NodeEntry* entry = level.children[level.next++];
+            if (ResTreeNode* child = entry->Child()) {
+                child->Raise(NodeDeleting);
+                if (entry->Kind() != EmptyEntry) {
+                    levels.push_back({child, entry, child->ChildEntriesInRemovalOrder()});
+                }
+            }
+            continue;
+        }
+        if (levels.size() == 1) {
+            return;
+        }
+        ResTreeNode* node = level.node;
+        NodeEntry* entry = level.entry;
+        levels.pop_back();
+        node->Raise(NodeDeleted);
+        if (entry->Kind() != EmptyEntry) {
+            levels.back().node->FinishRemoval(entry);
+        }
+    }
+}
+
+void ResTreeNode::RemoveChildNodes() {
+    entries.DropIndex();
+    if (!ObserverCount::IsZero()) {
+        const ReleaseScope scope;
+        RetireDescendants();
+        return;
+    }
+    for (NodeEntry* entry : ChildEntriesInRemovalOrder()) {
+        FinishRemoval(entry);
+    }
+}
+
+void ResTreeNode::RemoveEntryByName(std::u16string_view key) {
+    if (NodeEntry* entry = Find(key)) {
+        RemoveEntry(entry);
+    }
+}
+
+}  // namespace zkhw
