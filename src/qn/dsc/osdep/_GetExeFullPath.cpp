@@ -1,10 +1,9 @@
 #include "qn/dsc/osdep/_GetExeFullPath.h"
 
-#include <cerrno>
-
 #include "qn/dsc/exception/Exception.h"
 #include "qn/dsc/osdep/FileSystem.h"
 #include "qn/dsc/osdep/OSException.h"
+#include "qn/dsc/osdep/SystemError.h"
 #include "qn/dsc/osdep/path.h"
 
 namespace qn::dsc::osdep {
@@ -13,7 +12,7 @@ String _GetExeFullPath() {
     String path;
     const int error = GetFileSystem().ReadExecutablePath(path);
     if (error != 0) {
-        errno = error;
+        SetLastSystemError(SystemErrorOf(error));
         exception::ThrowAt(WinError(), "qn/dsc/osdep/_GetExeFullPath", __LINE__);
     }
     return MakeAbsolutePath(path);
