@@ -1,5 +1,6 @@
 #include "qn/dsc/osdep/NativePath.h"
 
+#include <algorithm>
 #include <cerrno>
 #include <cstdint>
 
@@ -102,23 +103,29 @@ void AppendNameUnits(std::string_view name, std::u16string& units) {
 
 String SystemPathFromNative(std::string_view native) {
     const bool isAbsolute = !native.empty() && native.front() == '/';
-    std::u16string system = isAbsolute ? u"C:\\" : u"";
-    bool needsSeparator = false;
+    std::u16string system;
     size_t start = 0;
     while (start < native.size()) {
         const size_t end = std::min(native.find('/', start), native.size());
         if (end > start) {
-            system.append(needsSeparator ? u"\\" : u"");
+            if (isAbsolute || !system.empty()) {
+                system.push_back(u'\\');
+            }
             AppendNameUnits(native.substr(start, end - start), system);
-            needsSeparator = true;
         }
         start = end + 1;
     }
-    if (needsSeparator && native.back() == '/') {
+    if (isAbsolute && system.empty()) {
+        return String(u"C:\\");
+    }
+    if (!system.empty() && native.back() == '/') {
         system.push_back(u'\\');
     }
-    String result{std::u16string_view(system)};
-    return !isAbsolute && IsAbsolutePath(result) ? JoinPath(String(u"."), String(u"")) + result.CStr() : result;
+    const String result{std::u16string_view(system)};
+    if (isAbsolute) {
+        return u"C:" + result;
+    }
+    return IsAbsolutePath(result) ? u".\\" + result : result;
 }
 
 int MakeNativePath(const String& path, NativePath& native) {
