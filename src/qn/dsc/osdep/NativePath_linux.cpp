@@ -154,7 +154,7 @@ int MakeNativePath(const String& path, NativePath& native) {
     }
     StepThrough(rest, native);
     if (native.text.empty()) {
-        native.text = "/";
+        native.text.push_back('/');
         native.lastName.clear();
     } else {
         native.endsInSeparator = !rest.empty() && IsSeparator(rest.back());
