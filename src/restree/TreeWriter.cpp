@@ -114,7 +114,7 @@ ResTreeNode* AppendFlatEntry(const NodeEntry& entry, String& out, std::u16string
 // leaves it is kept, and a position is stepped before it is read again.
 class SubtreeWriter {
   public:
-    explicit SubtreeWriter(String& out) : out(out) {}
+    explicit SubtreeWriter(String& text) : out(text) {}
 
     void WriteNode(ResTreeNode& top, Indent indent) {
         Open(top, indent.blanks);

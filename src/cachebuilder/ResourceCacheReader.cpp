@@ -1,0 +1,84 @@
+#include <algorithm>
+
+#include "cachebuilder/FPGAResTree.h"
+#include "cachebuilder/ResourceCache.h"
+#include "cachebuilder/TargetDiscovery.h"
+#include "qn/dsc/osdep/_GetExeFullPath.h"
+#include "qn/dsc/osdep/path.h"
+#include "restree/ReleaseScope.h"
+#include "restree/ResTreeNode.h"
+#include "restree/ResultCode.h"
+
+namespace zkhw {
+
+using qn::dsc::NarrowString;
+using qn::dsc::osdep::GetDirectoryName;
+using qn::dsc::osdep::GetExecutableDir;
+using qn::dsc::osdep::GetFileModificationTime;
+using qn::dsc::osdep::JoinPath;
+using qn::dsc::osdep::TimeStamp;
+
+namespace {
+
+bool IsStale(const String& directory, const String& cachePath) {
+    const TimeStamp cacheTime = GetFileModificationTime(cachePath);
+    std::vector<String> files;
+    FindResourceFiles(directory, u"*resource.xml", files);
+    return std::any_of(files.begin(), files.end(),
+                       [&](const String& file) { return cacheTime < GetFileModificationTime(file); });
+}
+
+// ":DeferredLoadPath" comes last: with it in place, a name that the stub lacks makes it load, also when it is to be
+// set.
+void ArmTarget(ResTreeNode& target) {
+    target.MakeTypeTableLocal();
+    const String folder = GetDirectoryName(target.GetPropertyOrEmpty(u"TargetXMLPath"));
+    target.SetProperty(u"TargetDir", JoinPath(GetExecutableDir(), folder).View());
+    target.SetProperty(u"TargetClassShortClassName", target.GetName().View());
+    const String file = target.GetPropertyOrEmpty(u"TargetXMLPath");
+    target.SetProperty(u":DeferredLoadPath", file.View());
+}
+
+void ArmOther(ResTreeNode& node) {
+    if (const String* source = node.GetProperty(u"FPGA_XMLSource")) {
+        const String files = *source;
+        node.SetProperty(u":DeferredLoadPath", files.View());
+    }
+}
+
+// Whether there was a target.
+bool ArmStubs(ResTreeNode& root) {
+    const ReleaseScope scope;
+    bool seenTarget = false;
+    for (EntryIterator entry = root.Begin(); !entry.IsEnd(); ++entry) {
+        ResTreeNode* const child = entry->Child();
+        if (child == nullptr) {
+            continue;
+        }
+        if (child->IsA(u"Target")) {
+            seenTarget = true;
+            ArmTarget(*child);
+        } else {
+            ArmOther(*child);
+        }
+    }
+    return seenTarget;
+}
+
+}  // namespace
+
+int32_t FPGAResTree::ReadResourceCache(const String& directory, const String& cachePath, ResTreeNode& root) {
+    if (IsStale(directory, cachePath)) {
+        return needsScan;
+    }
+    root.LoadResourceFile(NarrowString(cachePath), false, nullptr);
+    if (ArmStubs(root)) {
+        return success;
+    }
+    while (!root.Begin().IsEnd()) {
+        root.RemoveEntry(root.Begin());
+    }
+    return needsScan;
+}
+
+}  // namespace zkhw

@@ -1,0 +1,74 @@
+#include "cachebuilder/SourceLists.h"
+
+#include "restree/ResTreeNode.h"
+#include "restree/TextList.h"
+
+namespace zkhw {
+
+namespace {
+
+constexpr std::u16string_view sourceKey = u"FPGA_XMLSource";
+
+std::u16string ToUpper(std::u16string_view text) {
+    std::u16string upper(text);
+    for (char16_t& unit : upper) {
+        if (unit >= u'a' && unit <= u'z') {
+            unit = static_cast<char16_t>(unit - (u'a' - u'A'));
+        }
+    }
+    return upper;
+}
+
+void AddPieces(std::u16string_view text, std::unordered_set<std::u16string>& pieces) {
+    for (PieceReader reader(text, u",", true); reader.Next();) {
+        const bool isPlain = !reader.MayHaveEscapes();
+        pieces.insert(ToUpper(isPlain ? reader.Raw() : UnescapeText(reader.Raw(), u",").View()));
+    }
+}
+
+// To the unit, unlike ==.
+bool IsSameText(const String& left, const String& right) {
+    return left.View() == right.View();
+}
+
+// Whether a separator behind `text` would count as escaped.
+bool EndsInEscape(std::u16string_view text) {
+    const size_t last = text.find_last_not_of(u'\\');
+    return (text.size() - 1 - last) % 2 != 0;
+}
+
+}  // namespace
+
+void SourceLists::Add(ResTreeNode& node, const String& file) {
+    NodeEntry* const entry = node.Find(sourceKey);
+    if (entry == nullptr) {
+        node.SetProperty(sourceKey, file.View());
+        return;
+    }
+    String* const source = entry->Text();
+    if (source == nullptr) {
+        return;
+    }
+    List& list = lists[&node];
+    // A file may have written the entry itself since.
+    if (!IsSameText(list.text, *source)) {
+        list.pieces.clear();
+        AddPieces(source->View(), list.pieces);
+        list.text = *source;
+    }
+    if (list.pieces.contains(ToUpper(file.View()))) {
+        return;
+    }
+    if (EndsInEscape(list.text.View())) {
+        list.text = {};
+    } else {
+        AddPieces(file.View(), list.pieces);
+        list.text.Append(u",");
+        list.text.Append(file);
+    }
+    source->Append(u",");
+    source->Append(file);
+    node.Raise(PropertyChanged);
+}
+
+}  // namespace zkhw

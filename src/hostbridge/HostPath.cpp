@@ -1,0 +1,71 @@
+#include "hostbridge/HostPath.h"
+
+#include <cstring>
+#include <iterator>
+
+#include "hostbridge/RuntimeModule.h"
+#include "qn/dsc/osdep/CommandLine.h"
+#include "qn/dsc/osdep/_GetExeFullPath.h"
+#include "qn/dsc/osdep/path.h"
+
+namespace zkhw {
+
+using qn::dsc::NarrowString;
+using qn::dsc::String;
+using qn::dsc::osdep::GetExecutableDir;
+using qn::dsc::osdep::JoinPath;
+using qn::dsc::osdep::PathFromArgument;
+
+namespace {
+
+// From numbers of this system to codes of the host. The codes 2, 11, 12 and 20 can't be asked for.
+constexpr int32_t specialDirectoryCodes[] = {0,  1,  3,  4,  5,  6,  7,  8,  9,  10, 13, 14, 15,
+                                             16, 17, 18, 19, 21, 22, 23, 24, 25, 26, 27, 28};
+constexpr uint32_t targetsDirectory = 24;
+
+// A 32-bit length, and that many bytes.
+NarrowString TextOf(HostHandle handle) {
+    if (handle == nullptr) {
+        return {};
+    }
+    int32_t length = 0;
+    std::memcpy(&length, *handle, sizeof length);
+    return NarrowString(*handle + sizeof length, static_cast<uint32_t>(length));
+}
+
+}  // namespace
+
+HostPath::HostPath() : path(HostEmptyPath(nullptr)) {}
+
+HostPath::~HostPath() {
+    if (text != nullptr) {
+        HostDisposeHandle(text);
+    }
+    HostDestroyPath(path);
+}
+
+bool HostPath::GetText(String& result) {
+    if (HostPathToString(path, &text) != 0) {
+        return false;
+    }
+    // A host may speak of native paths.
+    result = PathFromArgument(TextOf(text).CStr());
+    return true;
+}
+
+String GetHostSpecialDir(uint32_t number) {
+    String directory;
+    if (FindRuntimeModule() == nullptr) {
+        return number == targetsDirectory ? JoinPath(GetExecutableDir(), u"Targets") : directory;
+    }
+    if (number >= std::size(specialDirectoryCodes)) {
+        return directory;
+    }
+    HostPath path;
+    if (HostGetSpecialDir(specialDirectoryCodes[number], path.Get()) == 0) {
+        path.GetText(directory);
+    }
+    return directory;
+}
+
+}  // namespace zkhw
