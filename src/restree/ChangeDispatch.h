@@ -3,6 +3,7 @@
 // One run of change notices: from a node to its observers, and on through the nodes that watch it. The nodes that are
 // open at one time stand on a stack of its own, so that a chain of watching nodes may be as long as the tree is deep.
 
+#include <cstddef>
 #include <cstdint>
 #include <vector>
 

@@ -63,7 +63,7 @@ class NodeEntry {
 
   private:
     friend class EntryList;
-    friend class OrderedKeyIndex;
+    friend class EntryPieces;
 
     // The two shapes differ behind the common head only, so that a child entry doesn't carry room for a text.
     struct TextShape;

@@ -17,52 +17,14 @@ namespace {
 
 constexpr std::u16string_view displayNameKey = u"DisplayName";
 
-// The components of a path one after the other, unescaped.
-class PathComponents {
-  public:
-    explicit PathComponents(std::u16string_view path) : rest(path), done(path.empty()) {}
-
-    bool IsDone() const { return done; }
-
-    // The next component. It lives until the next call.
-    std::u16string_view Take() {
-        size_t end = 0;
-        bool hasEscape = false;
-        size_t backslashes = 0;
-        for (; end < rest.size(); ++end) {
-            if (rest[end] == u'\\') {
-                ++backslashes;
-                hasEscape = true;
-            } else if (rest[end] == u'/' && backslashes % 2 == 0) {
-                break;
-            } else {
-                backslashes = 0;
-            }
-        }
-        const std::u16string_view raw = rest.substr(0, end);
-        done = end == rest.size();
-        rest.remove_prefix(done ? end : end + 1);
-        if (!hasEscape) {
-            return raw;
-        }
-        unescaped = UnescapeText(String(raw), u'/');
-        return unescaped.View();
-    }
-
-  private:
-    std::u16string_view rest;
-    bool done;
-    String unescaped = String::WithoutBuffer();
-};
-
 // A path that is being followed. It has its own text: a load on the way may change the entry that the path is from.
 struct OpenPath {
-    explicit OpenPath(std::u16string_view path, size_t start) : text(path), components(text.View().substr(start)) {}
+    explicit OpenPath(std::u16string_view path, size_t start) : text(path), components(text.View().substr(start), u"/", false) {}
     OpenPath(const OpenPath&) = delete;
     OpenPath& operator=(const OpenPath&) = delete;
 
     String text;
-    PathComponents components;
+    PieceReader components;
 };
 
 constexpr size_t maximalLinks = 256;
@@ -99,12 +61,17 @@ ResTreeNode* ResTreeNode::Lookup(std::u16string_view path, ResTreeNode* document
     open.push_back(std::make_unique<OpenPath>(path, start));
     size_t links = 0;
     while (!open.empty()) {
-        PathComponents& components = open.back()->components;
-        if (components.IsDone()) {
+        PieceReader& components = open.back()->components;
+        if (!components.Next()) {
             open.pop_back();
             continue;
         }
-        const std::u16string_view component = components.Take();
+        String unescaped = String::WithoutBuffer();
+        std::u16string_view component = components.Raw();
+        if (components.MayHaveEscapes()) {
+            unescaped = UnescapeText(component, u'/');
+            component = unescaped.View();
+        }
         if (Compare(component, u"..") == 0) {
             node = node->parent;
         } else if (Compare(component, u".") != 0) {

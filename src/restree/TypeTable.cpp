@@ -22,8 +22,8 @@ bool TypeRecord::IsA(std::u16string_view typeName) const {
            std::any_of(bases.begin(), bases.end(), [&](const TypeRecord* base) { return base->IsA(typeName); });
 }
 
-bool TypeTable::NameOrder::operator()(std::u16string_view left, std::u16string_view right) const {
-    return Compare(left, right) < 0;
+bool TypeTable::NameOrder::operator()(qn::dsc::TextArgument left, qn::dsc::TextArgument right) const {
+    return Compare(left.View(), right.View()) < 0;
 }
 
 void TypeTable::AddTypeRelation(std::u16string_view type, std::u16string_view base) {

@@ -9,6 +9,7 @@
 #include <vector>
 
 #include "qn/dsc/StringBase.h"
+#include "qn/dsc/TextArgument.h"
 
 namespace zkhw {
 
@@ -47,7 +48,7 @@ class TypeTable {
   private:
     struct NameOrder {
         using is_transparent = void;
-        bool operator()(std::u16string_view left, std::u16string_view right) const;
+        bool operator()(qn::dsc::TextArgument left, qn::dsc::TextArgument right) const;
     };
 
     void CopyRecord(const TypeRecord& record);

@@ -1,0 +1,100 @@
+#include "restree/AttributeList.h"
+
+#include <algorithm>
+
+#include "restree/TextList.h"
+#include "restree/Utf8Text.h"
+
+namespace zkhw {
+
+namespace {
+
+struct KnownName {
+    std::string_view lowerCase;
+    std::u16string_view wide;
+};
+
+// In the order of AttributeName.
+constexpr std::array<KnownName, 10> knownNames = {{{"name", u"name"},
+                                                   {"names", u"names"},
+                                                   {"prototype", u"prototype"},
+                                                   {"type", u"type"},
+                                                   {"ordered", u"ordered"},
+                                                   {"replace", u"replace"},
+                                                   {"next", u"next"},
+                                                   {"localize", u"localize"},
+                                                   {"xml:space", u"xml:space"},
+                                                   {"what", u"what"}}};
+
+}  // namespace
+
+void AttributeList::Clear() {
+    text.clear();
+    items.clear();
+    known.fill(absent);
+}
+
+void AttributeList::Assign(const char* const* attributes) {
+    Clear();
+    if (attributes == nullptr) {
+        return;
+    }
+    for (; *attributes != nullptr; attributes += 2) {
+        const std::string_view name = attributes[0];
+        const std::string_view value = attributes[1];
+        const Item item{static_cast<uint32_t>(text.size()), static_cast<uint32_t>(text.size() + name.size() + 1)};
+        text.append(name).push_back('\0');
+        text.append(value).push_back('\0');
+        items.push_back(item);
+        Note(name, item.value);
+    }
+}
+
+// The first of equal names stays.
+void AttributeList::Note(std::string_view name, uint32_t value) {
+    if (IsAscii(name)) {
+        for (size_t i = 0; i < knownCount; ++i) {
+            if (EqualsWord(name, knownNames[i].lowerCase)) {
+                known[i] = std::min(known[i], value);
+                return;
+            }
+        }
+        return;
+    }
+    const String wide = Widen(name);
+    for (size_t i = 0; i < knownCount; ++i) {
+        if (wide == knownNames[i].wide) {
+            known[i] = std::min(known[i], value);
+            return;
+        }
+    }
+}
+
+String AttributeList::Value(AttributeName name) const {
+    return Widen(TextAt(known[static_cast<size_t>(name)]));
+}
+
+bool AttributeList::Is(AttributeName name, std::u16string_view word) const {
+    return Has(name) && Value(name) == word;
+}
+
+bool AttributeList::IsTrue(AttributeName name) const {
+    return Has(name) && ParseBool(Value(name));
+}
+
+std::vector<AttributeList::Attribute> AttributeList::InOrder() const {
+    std::vector<Attribute> ordered;
+    ordered.reserve(items.size());
+    for (const Item& item : items) {
+        ordered.emplace_back(Widen(TextAt(item.name)), Widen(TextAt(item.value)));
+    }
+    std::stable_sort(ordered.begin(), ordered.end(),
+                     [](const Attribute& left, const Attribute& right) { return left.first < right.first; });
+    const auto repeated = std::unique(ordered.begin(), ordered.end(), [](const Attribute& left, const Attribute& right) {
+        return left.first == right.first;
+    });
+    ordered.erase(repeated, ordered.end());
+    return ordered;
+}
+
+}  // namespace zkhw

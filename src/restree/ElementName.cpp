@@ -1,0 +1,45 @@
+#include "restree/ElementName.h"
+
+#include "restree/TextList.h"
+#include "restree/Utf8Text.h"
+
+namespace zkhw {
+
+void ElementName::Assign(std::string_view name) {
+    if (IsAscii(name)) {
+        text = name;
+        ClassifyAscii();
+    } else {
+        if (IsWidenable(name)) {
+            text = name;
+        } else {
+            text.clear();
+        }
+        ClassifyByCompare();
+    }
+}
+
+qn::dsc::String ElementName::Wide() const {
+    return Widen(text);
+}
+
+// Hyphens and apostrophes count in an equality of ASCII texts, so letter by letter is enough here.
+void ElementName::ClassifyAscii() {
+    isLink = EqualsWord(text, ":link");
+    isInclude = EqualsWord(text, ":include");
+    isReserves = EqualsWord(text, "reserves");
+    endsInPathOrDir = EndsWithWord(text, "path") || EndsWithWord(text, "dir");
+    endsInList = EndsWithWord(text, "list");
+}
+
+// Other scripts have letters that equal ASCII ones but for their width, and signs that count for nothing.
+void ElementName::ClassifyByCompare() {
+    const qn::dsc::String wide = Wide();
+    isLink = wide == u":Link";
+    isInclude = wide == u":Include";
+    isReserves = wide == u"Reserves";
+    endsInPathOrDir = EndsWith(wide.View(), u"Path") || EndsWith(wide.View(), u"Dir");
+    endsInList = EndsWith(wide.View(), u"List");
+}
+
+}  // namespace zkhw

@@ -1,0 +1,277 @@
+#include "restree/ElementReader.h"
+
+#include <utility>
+#include <vector>
+
+#include "qn/dsc/osdep/OSException.h"
+#include "qn/dsc/osdep/path.h"
+#include "restree/InstallRoot.h"
+#include "restree/LoadChain.h"
+#include "restree/LocalizeText.h"
+#include "restree/NodePath.h"
+#include "restree/Parameters.h"
+#include "restree/TextList.h"
+#include "restree/Utf8Text.h"
+
+namespace zkhw {
+
+using qn::dsc::osdep::JoinPath;
+
+void ElementReader::FlushPendingElement(ElementMode mode, std::string_view nextName, const char* const* nextAttributes) {
+    if (frame.position != nullptr) {
+        // The element lies inside an xml value. The tag that has just arrived is lost.
+        AppendTagToXmlValue();
+        frame.pendingName.Clear();
+        frame.text.clear();
+        return;
+    }
+    bool isNode = false;
+    String entryName = ChooseEntryName(mode, isNode);
+    if (!isNode) {
+        MakeValue(std::move(entryName));
+        frame.pendingName.Clear();
+    } else if (Attributes().Is(AttributeName::Type, u"xml")) {
+        BeginXmlValue(std::move(entryName), nextName, nextAttributes);
+    } else {
+        String elementName = frame.pendingName.Wide();
+        const bool isOrdered = IsNodeOrdered(elementName);
+        if (Attributes().Has(AttributeName::Replace)) {
+            frame.mergeExisting = !Attributes().IsTrue(AttributeName::Replace);
+        }
+        if (!frame.rootTypeKnown) {
+            // Its name stays pending in the frame, which sees no further start tag.
+            BindDocumentElement(std::move(entryName), std::move(elementName), isOrdered);
+            stack.PushFrame(node, nextName, nextAttributes);
+        } else {
+            ResTreeNode& child = MakeChild(std::move(entryName), std::move(elementName), isOrdered);
+            stack.NoteNode(child);
+            frame.pendingName.Clear();
+            if (mode == ElementMode::Container) {
+                stack.PushFrame(child, nextName, nextAttributes);
+            }
+        }
+        frame.position = nullptr;
+    }
+    frame.text.clear();
+}
+
+// --- xml values ---
+
+// Nothing is escaped, and the attributes come in the order of their names.
+void ElementReader::AppendTagToXmlValue() {
+    String* value = frame.position->Text();
+    if (value == nullptr) {
+        return;
+    }
+    ++frame.xmlDepth;
+    value->Append(u"<");
+    value->Append(frame.pendingName.Wide());
+    for (const auto& [key, text] : Attributes().InOrder()) {
+        value->Append(u" ");
+        value->Append(key);
+        value->Append(u"=\"");
+        value->Append(text);
+        value->Append(u"\"");
+    }
+    value->Append(u">");
+}
+
+void ElementReader::BeginXmlValue(String&& entryName, std::string_view nextName, const char* const* nextAttributes) {
+    frame.position = node.AddTextEntry(std::move(entryName), String(), TextEntry, Before()).entry;
+    frame.xmlDepth = 1;
+    // The tag that told of the content is the first one inside the value. Without content nothing stays pending.
+    frame.pendingName.Assign(nextName);
+    if (nextAttributes != nullptr) {
+        frame.pendingAttributes.Assign(nextAttributes);
+    }
+    frame.instances.clear();
+}
+
+// --- Nodes ---
+
+String ElementReader::ChooseEntryName(ElementMode mode, bool& isNode) {
+    if (Attributes().Has(AttributeName::Names)) {
+        ParseNames(Attributes().Value(AttributeName::Names), frame.instances);
+        if (!frame.instances.empty()) {
+            isNode = true;
+            return frame.instances.front().name;
+        }
+    }
+    if (Attributes().Has(AttributeName::Name)) {
+        isNode = !frame.pendingName.IsLink();
+        return Attributes().Value(AttributeName::Name);
+    }
+    isNode = mode == ElementMode::Container || Attributes().Has(AttributeName::Prototype);
+    return isNode || frame.pendingName.IsLink() ? frame.pendingName.Wide() : String::WithoutBuffer();
+}
+
+const String* ElementReader::Before() {
+    if (!Attributes().Has(AttributeName::Next)) {
+        return nullptr;
+    }
+    before = Attributes().Value(AttributeName::Next);
+    return &before;
+}
+
+bool ElementReader::IsNodeOrdered(const String& elementName) const {
+    if (Attributes().Has(AttributeName::Ordered)) {
+        return Attributes().IsTrue(AttributeName::Ordered);
+    }
+    if (frame.typeTable != nullptr) {
+        if (const TypeRecord* record = frame.typeTable->Find(elementName.View())) {
+            return record->IsListType();
+        }
+    }
+    return frame.pendingName.EndsInList();
+}
+
+void ElementReader::BindDocumentElement(String&& entryName, String&& elementName, bool isOrdered) {
+    if (node.type.IsEmpty()) {
+        node.name = std::move(entryName);
+        node.type = std::move(elementName);
+        node.SetOrdered(isOrdered);
+    }
+    frame.rootTypeKnown = !node.type.IsEmpty();
+    stack.NoteNode(node);
+}
+
+ResTreeNode* ElementReader::FindPrototype() {
+    if (!Attributes().Has(AttributeName::Prototype)) {
+        return nullptr;
+    }
+    const String path = Attributes().Value(AttributeName::Prototype);
+    ResTreeNode* prototype = node.Lookup(path.View(), stack.GetDocumentRoot());
+    if (prototype == nullptr) {
+        Report(u"Unable to find prototype node: ", path);
+    }
+    return prototype;
+}
+
+ResTreeNode& ElementReader::MakeChild(String&& entryName, String&& elementName, bool isOrdered) {
+    ResTreeNode* prototype = FindPrototype();
+    node.RemoveIfMismatched(!frame.mergeExisting, entryName.View(), elementName.View(), isOrdered);
+    ResTreeNode* child = nullptr;
+    node.AddChild(std::move(entryName), std::move(elementName), isOrdered, child, Before());
+    if (child == nullptr) {
+        // An observer has put something else in the place that was just cleared. What follows is read all the same.
+        return node;
+    }
+    if (prototype != nullptr) {
+        // Ahead of the element's own children, so that these override it.
+        child->MergeFrom(*prototype, frame.mergeExisting);
+        child->ApplyParameters(CollectParameters(stack));
+    }
+    return *child;
+}
+
+// --- Values ---
+
+void ElementReader::MakeValue(String&& entryName) {
+    const ElementName& name = frame.pendingName;
+    const bool hasType = Attributes().Has(AttributeName::Type);
+    const bool isPath = hasType ? Attributes().Is(AttributeName::Type, u"path") : name.EndsInPathOrDir() || name.IsInclude();
+    String text = ReadValueText(isPath);
+    frame.position = nullptr;
+    if (name.IsInclude()) {
+        Include(text);
+    } else if (name.IsLink()) {
+        MakeLink(std::move(entryName), text);
+    } else {
+        const bool isReferenceList = hasType ? Attributes().Is(AttributeName::Type, u"ref-list") : name.IsReserves();
+        MakeOrdinaryValue(std::move(text), isReferenceList);
+    }
+    frame.xmlDepth = 0;
+}
+
+String ElementReader::ReadValueText(bool isPath) const {
+    std::string_view text = frame.text;
+    if (!Attributes().Is(AttributeName::XmlSpace, u"preserve")) {
+        constexpr std::string_view blanks = " \t\r\n";
+        const size_t first = text.find_first_not_of(blanks);
+        text = first == std::string_view::npos ? std::string_view()
+                                               : text.substr(first, text.find_last_not_of(blanks) + 1 - first);
+    }
+    String wide = Widen(text);
+    if (!isPath) {
+        return wide;
+    }
+    std::vector<String> pieces;
+    SplitList(wide.View(), u'/', pieces, false);
+    String path;
+    for (const String& piece : pieces) {
+        path = JoinPath(path, piece);
+    }
+    return path;
+}
+
+void ElementReader::MakeOrdinaryValue(String&& text, bool isReferenceList) {
+    if (HasVariables(text)) {
+        text = ExpandVariables(text, CollectParameters(stack));
+    }
+    if (isReferenceList) {
+        text = RebaseListPaths(text, node.GetPath());
+    }
+    if (Attributes().IsTrue(AttributeName::Localize)) {
+        StoreText(LocalizeText(text), LocalizedTextEntry);
+    } else {
+        StoreText(std::move(text), TextEntry);
+    }
+}
+
+void ElementReader::StoreText(String&& text, EntryKind kind) {
+    const ResTreeNode::Added added = node.AddTextEntry(frame.pendingName.Wide(), std::move(text), kind, Before());
+    frame.position = added.entry;
+    if (!added.isNew && frame.mergeExisting && node.SetEntryText(added.entry, std::move(text)) &&
+        kind == LocalizedTextEntry) {
+        added.entry->SetTextKind(LocalizedTextEntry);
+    }
+}
+
+void ElementReader::MakeLink(String&& entryName, const String& text) {
+    const ResTreeNode* target = node.Lookup(text.View(), stack.GetDocumentRoot());
+    if (target == nullptr) {
+        // It stays a dead text, even when the target is read later. The first one of a node stays.
+        String dead(u"UNRESOLVED LINK: ");
+        dead.Append(text);
+        frame.position = node.AddTextEntry(frame.pendingName.Wide(), std::move(dead), TextEntry, Before()).entry;
+        return;
+    }
+    if (entryName == u":Link") {
+        entryName = target->GetName();
+    }
+    String path = MakeRelativeNodePath(target->GetPath(), node.GetPath());
+    const ResTreeNode::Added added = node.AddLinkEntry(std::move(entryName), std::move(path), Before());
+    frame.position = added.entry;
+    if (!added.isNew && frame.mergeExisting) {
+        node.SetEntryText(added.entry, std::move(path));
+    }
+}
+
+void ElementReader::Include(const String& text) {
+    try {
+        IncludeFile(text);
+    } catch (const qn::dsc::osdep::OSException&) {
+        Report(u"Encountered an OS exception.", String());
+    }
+    frame.position = nullptr;
+}
+
+void ElementReader::IncludeFile(const String& text) {
+    const bool asChild = !Attributes().Is(AttributeName::What, u"children");
+    const String path = JoinPath(GetInstallRoot(), text);
+    ResTreeNode* loaded = nullptr;
+    node.LoadIncludedFile(NarrowString(path), asChild, &loaded, stack.Chain());
+    if (loaded == nullptr) {
+        Report(u"Unable to find include file node: ", path);
+        return;
+    }
+    loaded->ApplyParameters(CollectParameters(stack));
+}
+
+void ElementReader::Report(std::u16string_view message, const String& subject) {
+    String text(message);
+    text.Append(subject);
+    node.ReportParseError(stack, nullptr, &text);
+}
+
+}  // namespace zkhw

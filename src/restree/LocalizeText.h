@@ -1,0 +1,11 @@
+#pragma once
+
+#include "qn/dsc/StringBase.h"
+
+namespace zkhw {
+
+// `text` is a comma list of "code=text". Gives the text for the user's language (the last match for English if there
+// is none for that language), a NUL, and the whole list; or the list alone if neither language is in it.
+qn::dsc::String LocalizeText(const qn::dsc::String& text);
+
+}  // namespace zkhw

@@ -1,0 +1,128 @@
+#include "restree/ParseStack.h"
+
+#include <utility>
+
+#include "restree/ElementReader.h"
+#include "restree/Instances.h"
+#include "restree/Utf8Text.h"
+
+namespace zkhw {
+
+ParseStack::ParseStack(ResTreeNode& node, const String& rootType, const LoadChain& chain) : chain(chain) {
+    top = std::make_unique<ParseFrame>();
+    top->node = &node;
+    top->typeTable = node.NearestTypeTable();
+    top->rootTypeKnown = !rootType.IsEmpty();
+}
+
+ParseStack::~ParseStack() {
+    // One by one: as many frames may be left as the document is deep.
+    for (std::unique_ptr<ParseFrame>* stack : {&top, &spare}) {
+        while (*stack) {
+            *stack = std::move((*stack)->previous);
+        }
+    }
+}
+
+std::unique_ptr<ParseFrame> ParseStack::TakeSpare() {
+    if (!spare) {
+        return std::make_unique<ParseFrame>();
+    }
+    std::unique_ptr<ParseFrame> frame = std::move(spare);
+    spare = std::move(frame->previous);
+    return frame;
+}
+
+void ParseStack::PushFrame(ResTreeNode& node, std::string_view nextName, const char* const* nextAttributes) {
+    std::unique_ptr<ParseFrame> frame = TakeSpare();
+    frame->node = &node;
+    frame->firstNode = nullptr;
+    frame->position = nullptr;
+    const TypeTable* ownTable = node.GetTypeTable();
+    frame->typeTable = ownTable == nullptr ? top->typeTable : ownTable;
+    frame->rootTypeKnown = top->rootTypeKnown;
+    frame->mergeExisting = top->mergeExisting;
+    frame->pendingName.Assign(nextName);
+    frame->pendingAttributes.Assign(nextAttributes);
+    frame->text.clear();
+    frame->instances.clear();
+    top->position = nullptr;
+    frame->previous = std::move(top);
+    top = std::move(frame);
+}
+
+void ParseStack::PopFrame() {
+    std::unique_ptr<ParseFrame> frame = std::move(top);
+    top = std::move(frame->previous);
+    frame->previous = std::move(spare);
+    spare = std::move(frame);
+    if (top) {
+        top->position = nullptr;
+    }
+}
+
+void ParseStack::NoteNode(ResTreeNode& node) {
+    if (top->firstNode != nullptr) {
+        return;
+    }
+    top->firstNode = &node;
+    if (!top->previous) {
+        documentRoot = &node;
+    }
+}
+
+void ParseStack::StartElement(std::string_view name, const char* const* attributes) {
+    if (!top) {
+        return;
+    }
+    if (!top->pendingName.IsEmpty()) {
+        ElementReader(*this).FlushPendingElement(ElementMode::Container, name, attributes);
+        return;
+    }
+    top->pendingName.Assign(name);
+    top->pendingAttributes.Assign(attributes);
+    top->text.clear();
+    top->instances.clear();
+}
+
+void ParseStack::CharacterData(std::string_view text) {
+    // Text that no element is waiting for is the white space between elements.
+    if (top && !top->pendingName.IsEmpty() && IsWidenable(text)) {
+        top->text.append(text);
+    }
+}
+
+void ParseStack::EndElement(std::string_view name) {
+    if (!top) {
+        return;
+    }
+    ParseFrame* frame = top.get();
+    const bool wasPending = !frame->pendingName.IsEmpty();
+    if (wasPending) {
+        ElementReader(*this).FlushPendingElement(ElementMode::Leaf, {}, nullptr);
+    }
+    if (frame->position != nullptr) {
+        String* value = frame->position->Text();
+        if (value != nullptr && frame->xmlDepth > 1) {
+            value->Append(u"</");
+            value->Append(Widen(name));
+            value->Append(u">");
+            --frame->xmlDepth;
+        } else {
+            frame->position = nullptr;
+        }
+    } else if (!wasPending && frame->node->GetParent() != nullptr) {
+        // The end of this frame's container. The frame of a tree's root stays until the document ends.
+        PopFrame();
+        if (!top) {
+            return;
+        }
+        frame = top.get();
+    }
+    if (frame->instances.size() > 1) {
+        ReplicateInstances(*frame);
+    }
+    frame->instances.clear();
+}
+
+}  // namespace zkhw

@@ -1,0 +1,52 @@
+#pragma once
+
+// Turns the events of one document into calls on the tree, with one frame for every open container. What an element
+// means is decided in ElementReader. A ParseStack lives for one load; a load inside it has a stack of its own.
+
+#include <memory>
+
+#include "restree/ExPatHandler.h"
+#include "restree/ParseFrame.h"
+
+namespace zkhw {
+
+class LoadChain;
+
+class ParseStack final : public ExPatHandler {
+  public:
+    // Reads into `node`. `rootType` empty: the document element stands for `node`; else it becomes a child of it.
+    // `chain` tells of the file that is read.
+    ParseStack(ResTreeNode& node, const String& rootType, const LoadChain& chain);
+    ~ParseStack();
+
+    ParseFrame* Top() const { return top.get(); }
+    const LoadChain& Chain() const { return chain; }
+
+    // The node of the document element, or null before there is one.
+    ResTreeNode* GetDocumentRoot() const { return documentRoot; }
+
+    // Makes a frame for `node`, in which the element that has just begun, if any, is pending.
+    void PushFrame(ResTreeNode& node, std::string_view nextName, const char* const* nextAttributes);
+
+    // Notes a node made or taken in the top frame.
+    void NoteNode(ResTreeNode& node);
+
+    void StartElement(std::string_view name, const char* const* attributes) override;
+    void EndElement(std::string_view name) override;
+    void CharacterData(std::string_view text) override;
+    void ProcessingInstruction(std::string_view, std::string_view) override {}
+    void Comment(std::string_view) override {}
+    void StartCdataSection() override {}
+    void EndCdataSection() override {}
+
+  private:
+    void PopFrame();
+    std::unique_ptr<ParseFrame> TakeSpare();
+
+    const LoadChain& chain;
+    std::unique_ptr<ParseFrame> top;    // Null when the last frame has been popped; later events are ignored.
+    std::unique_ptr<ParseFrame> spare;  // Frames to use again, with the room that their texts have.
+    ResTreeNode* documentRoot = nullptr;
+};
+
+}  // namespace zkhw

@@ -1,0 +1,55 @@
+#pragma once
+
+// Text as libexpat gives it: UTF-8, widened once it is known what it is for. Four-byte sequences are not supported in
+// this system; a text that holds one counts as empty.
+
+#include <algorithm>
+#include <string_view>
+
+#include "qn/dsc/StringBase.h"
+
+namespace zkhw {
+
+// True if libexpat's text can be widened. It has been checked to be UTF-8 already, so only the lead byte of a
+// four-byte sequence is refused.
+inline bool IsWidenable(std::string_view text) {
+    bool refused = false;
+    for (const char byte : text) {
+        refused |= static_cast<unsigned char>(byte) >= 0xF0;
+    }
+    return !refused;
+}
+
+// The wide form; empty if the text is refused.
+inline qn::dsc::String Widen(std::string_view text) {
+    qn::dsc::String wide = qn::dsc::String::WithoutBuffer();
+    if (!qn::dsc::String::TryFromUtf8(text.data(), static_cast<uint32_t>(text.size()), wide)) {
+        wide = qn::dsc::String();
+    }
+    return wide;
+}
+
+inline bool IsAscii(std::string_view text) {
+    bool found = false;
+    for (const char byte : text) {
+        found |= static_cast<unsigned char>(byte) >= 0x80;
+    }
+    return !found;
+}
+
+constexpr char LowerAscii(char unit) {
+    return unit >= 'A' && unit <= 'Z' ? static_cast<char>(unit + ('a' - 'A')) : unit;
+}
+
+// Equality of an ASCII text and an ASCII word in lower case, blind to letter case.
+inline bool EqualsWord(std::string_view text, std::string_view word) {
+    return text.size() == word.size() && std::equal(text.begin(), text.end(), word.begin(), [](char left, char right) {
+               return LowerAscii(left) == right;
+           });
+}
+
+inline bool EndsWithWord(std::string_view text, std::string_view word) {
+    return text.size() >= word.size() && EqualsWord(text.substr(text.size() - word.size()), word);
+}
+
+}  // namespace zkhw
