@@ -167,8 +167,8 @@ const Collation& UserCollation() {
 
 }  // namespace
 
-void Collation::Closer::operator()(UCollator* collator) const {
-    ucol_close(collator);
+void Collation::Closer::operator()(UCollator* opened) const {
+    ucol_close(opened);
 }
 
 Collation::Handle Collation::OpenWithRules(std::u16string_view rules) {

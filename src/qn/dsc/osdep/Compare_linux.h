@@ -27,7 +27,7 @@ class Collation {
 
   private:
     struct Closer {
-        void operator()(UCollator* collator) const;
+        void operator()(UCollator* opened) const;
     };
     using Handle = std::unique_ptr<UCollator, Closer>;
 
