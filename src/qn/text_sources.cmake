@@ -2,6 +2,7 @@
 target_sources(zkfpga PRIVATE
   ${CMAKE_CURRENT_LIST_DIR}/dsc/Guid.cpp
   ${CMAKE_CURRENT_LIST_DIR}/dsc/osdep/AnsiToWide_linux.cpp
+  ${CMAKE_CURRENT_LIST_DIR}/dsc/osdep/CodePage932_linux.cpp
   ${CMAKE_CURRENT_LIST_DIR}/dsc/osdep/Compare_ascii.cpp
   ${CMAKE_CURRENT_LIST_DIR}/dsc/osdep/Compare_linux.cpp
   ${CMAKE_CURRENT_LIST_DIR}/dsc/osdep/IntegerToString.cpp

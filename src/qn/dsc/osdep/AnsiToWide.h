@@ -9,7 +9,7 @@ namespace qn::dsc::osdep {
 // early. An empty source, null included, gives the empty text, whatever the locale. No byte is refused: in the default
 // code page a byte that is no part of valid UTF-8 becomes the unit 0xDC00 + byte (NativeText.h), in "US-ASCII" a byte
 // above 0x7F loses its top bit, in "cp932" one without a character becomes U+30FB, the default character of that code
-// page. exception::InvalidLocale for an unknown locale, std::bad_alloc, and OSException if the platform cannot convert.
+// page. exception::InvalidLocale for an unknown locale, std::bad_alloc, and WinError if the platform cannot convert.
 // Linear.
 char16_t* AnsiToWide(const char* begin, const char* end, const char* locale);
 

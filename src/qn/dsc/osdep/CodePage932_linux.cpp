@@ -1,8 +1,8 @@
 #include "qn/dsc/osdep/CodePage932_linux.h"
 
 #include <algorithm>
-#include <cerrno>
 #include <cstdint>
+#include <iterator>
 #include <memory>
 #include <new>
 
@@ -11,6 +11,7 @@
 
 #include "qn/dsc/exception/Exception.h"
 #include "qn/dsc/osdep/OSException.h"
+#include "qn/dsc/osdep/SystemError.h"
 
 namespace qn::dsc::osdep {
 
@@ -28,8 +29,8 @@ constexpr char16_t defaultCharacter = u'\u30FB';
     if (error == U_MEMORY_ALLOCATION_ERROR) {
         throw std::bad_alloc();
     }
-    errno = error == U_FILE_ACCESS_ERROR ? ENOENT : EINVAL;
-    exception::ThrowAt(PosixError(), "qn/dsc/osdep/CodePage932", __LINE__);
+    SetLastSystemError(error == U_FILE_ACCESS_ERROR ? systemErrorFileNotFound : systemErrorNoMapping);
+    exception::ThrowAt(WinError(), "qn/dsc/osdep/CodePage932", __LINE__);
 }
 
 void RequireSuccess(UErrorCode error) {
@@ -44,6 +45,22 @@ void WriteDefaultCharacter(const void*, UConverterToUnicodeArgs* arguments, cons
     if (reason <= UCNV_IRREGULAR) {
         *error = U_ZERO_ERROR;
         ucnv_cbToUWriteUChars(arguments, &defaultCharacter, 1, 0, error);
+    }
+}
+
+// ICU's table has three control characters in each other's places, an old habit of IBM's personal computers. None of
+// their bytes is part of a pair, so they can be put right afterwards.
+constexpr uint8_t controls[] = {0x1A, 0x1C, 0x7F};
+constexpr uint8_t controlsOfTableUnits[] = {0x7F, 0x1A, 0x1C};
+constexpr uint8_t controlsOfTableBytes[] = {0x1C, 0x7F, 0x1A};
+
+template <typename Unit>
+void PutControlsRight(Unit* units, size_t count, const uint8_t (&rightOnes)[3]) {
+    for (size_t i = 0; i < count; ++i) {
+        const auto* const found = std::find(std::begin(controls), std::end(controls), units[i]);
+        if (found != std::end(controls)) {
+            units[i] = static_cast<Unit>(rightOnes[found - controls]);
+        }
     }
 }
 
@@ -63,8 +80,8 @@ Converter Open() {
 // ICU counts in signed 32 bits.
 int32_t CheckedCount(size_t count) {
     if (count > INT32_MAX) {
-        errno = EOVERFLOW;
-        exception::ThrowAt(PosixError(), "qn/dsc/osdep/CodePage932", __LINE__);
+        SetLastSystemError(systemErrorInvalidParameter);
+        exception::ThrowAt(WinError(), "qn/dsc/osdep/CodePage932", __LINE__);
     }
     return static_cast<int32_t>(count);
 }
@@ -81,6 +98,7 @@ size_t CodePage932ToUnits(std::string_view bytes, char16_t* units, size_t capaci
     UErrorCode error = U_ZERO_ERROR;
     const int32_t written = ucnv_toUChars(converter.get(), units, Capacity(capacity), bytes.data(), count, &error);
     RequireSuccess(error);
+    PutControlsRight(units, std::min(static_cast<size_t>(written), capacity), controlsOfTableUnits);
     return static_cast<size_t>(written);
 }
 
@@ -90,6 +108,7 @@ size_t UnitsToCodePage932(std::u16string_view text, char* bytes, size_t capacity
     UErrorCode error = U_ZERO_ERROR;
     const int32_t written = ucnv_fromUChars(converter.get(), bytes, Capacity(capacity), text.data(), count, &error);
     RequireSuccess(error);
+    PutControlsRight(bytes, std::min(static_cast<size_t>(written), capacity), controlsOfTableBytes);
     return static_cast<size_t>(written);
 }
 

@@ -8,7 +8,7 @@
 namespace qn::dsc::osdep {
 
 // Stores the units of `bytes` at `units`, which has room for `capacity`, and gives their number; with a capacity of 0
-// it only counts. A byte or pair of bytes without a character becomes U+30FB. OSException if ICU cannot convert.
+// it only counts. A byte or pair of bytes without a character becomes U+30FB. WinError if ICU cannot convert.
 // Linear.
 size_t CodePage932ToUnits(std::string_view bytes, char16_t* units, size_t capacity);
 
