@@ -22,6 +22,10 @@ EntryPosition EntryPieces::Last() const {
 }
 
 EntryPosition EntryPieces::Next(EntryPosition position) const {
+    // Pieces may have gone since the position was taken.
+    if (position.piece >= pieces.size()) {
+        return {};
+    }
     if (++position.slot < pieces[position.piece]->count) {
         return position;
     }
