@@ -3,6 +3,7 @@
 // The part of Compare that every platform shares: what ASCII decides by itself, and the second step. Pure text, no
 // library behind it.
 
+#include <array>
 #include <cstdint>
 #include <string_view>
 
@@ -24,5 +25,28 @@ int CompareCollated(std::u16string_view a, std::u16string_view b);
 // The punctuation of ASCII in its order; all of it stands behind the blank and before the digits. "-" and "'" are not
 // among it, since they only count in the second step.
 inline constexpr std::u16string_view asciiPunctuation = u"!\"#$%&()*,./:;?@[\\]^_`{|}~+<=>";
+
+constexpr std::array<uint8_t, 0x80> MakeAsciiWeights() {
+    std::array<uint8_t, 0x80> weights{};
+    uint8_t next = 1;
+    for (char16_t unit : std::u16string_view(u"\t\n\v\f\r ")) {
+        weights[unit] = next++;
+    }
+    for (char16_t unit : asciiPunctuation) {
+        weights[unit] = next++;
+    }
+    for (char16_t unit = u'0'; unit <= u'9'; ++unit) {
+        weights[unit] = next++;
+    }
+    for (char16_t unit = u'a'; unit <= u'z'; ++unit) {
+        weights[unit] = next;
+        weights[unit - u'a' + u'A'] = next++;
+    }
+    return weights;
+}
+
+// The place of each ASCII unit in the order; the letters of either case share one. 0: the unit does not count in the
+// first step ("-", "'" and the control characters without a place).
+inline constexpr std::array<uint8_t, 0x80> asciiWeights = MakeAsciiWeights();
 
 }  // namespace qn::dsc::osdep
