@@ -2,6 +2,7 @@
 
 #include <algorithm>
 
+#include "qn/dsc/osdep/Compare.h"
 #include "restree/TextList.h"
 #include "restree/Utf8Text.h"
 
@@ -25,6 +26,16 @@ constexpr std::array<KnownName, 10> knownNames = {{{"name", u"name"},
                                                    {"localize", u"localize"},
                                                    {"xml:space", u"xml:space"},
                                                    {"what", u"what"}}};
+
+// Equality under Compare of an ASCII name and any wide one.
+bool EqualsWide(std::string_view name, std::u16string_view wide) {
+    std::array<char16_t, 64> units;
+    if (name.size() > units.size()) {
+        return Widen(name) == wide;
+    }
+    std::copy(name.begin(), name.end(), units.begin());
+    return qn::dsc::osdep::Equal({units.data(), name.size()}, wide);
+}
 
 }  // namespace
 
@@ -74,6 +85,20 @@ String AttributeList::Value(AttributeName name) const {
     return Widen(TextAt(known[static_cast<size_t>(name)]));
 }
 
+AttributeList::Place AttributeList::Find(std::u16string_view name) const {
+    for (const Item& item : items) {
+        const std::string_view candidate = TextAt(item.name);
+        if (IsAscii(candidate) ? EqualsWide(candidate, name) : Widen(candidate) == name) {
+            return item.value;
+        }
+    }
+    return nowhere;
+}
+
+String AttributeList::ValueAt(Place place) const {
+    return Widen(TextAt(place));
+}
+
 bool AttributeList::Is(AttributeName name, std::u16string_view word) const {
     return Has(name) && Value(name) == word;
 }
@@ -90,9 +115,9 @@ std::vector<AttributeList::Attribute> AttributeList::InOrder() const {
     }
     std::stable_sort(ordered.begin(), ordered.end(),
                      [](const Attribute& left, const Attribute& right) { return left.first < right.first; });
-    const auto repeated = std::unique(ordered.begin(), ordered.end(), [](const Attribute& left, const Attribute& right) {
-        return left.first == right.first;
-    });
+    const auto repeated =
+        std::unique(ordered.begin(), ordered.end(),
+                    [](const Attribute& left, const Attribute& right) { return left.first == right.first; });
     ordered.erase(repeated, ordered.end());
     return ordered;
 }

@@ -38,6 +38,12 @@ class AttributeList {
     bool Is(AttributeName name, std::u16string_view word) const;
     bool IsTrue(AttributeName name) const;
 
+    // Where the attribute `name` stands, the first of equal ones; linear. And the value there.
+    using Place = uint32_t;
+    static constexpr Place nowhere = 0xFFFFFFFF;
+    Place Find(std::u16string_view name) const;
+    String ValueAt(Place place) const;
+
     // All of them in the order of their names. Costs a sort.
     std::vector<Attribute> InOrder() const;
 

@@ -17,7 +17,8 @@ namespace zkhw {
 
 using qn::dsc::osdep::JoinPath;
 
-void ElementReader::FlushPendingElement(ElementMode mode, std::string_view nextName, const char* const* nextAttributes) {
+void ElementReader::FlushPendingElement(ElementMode mode, std::string_view nextName,
+                                        const char* const* nextAttributes) {
     if (frame.position != nullptr) {
         // The element lies inside an xml value. The tag that has just arrived is lost.
         AppendTagToXmlValue();
@@ -84,14 +85,14 @@ void ElementReader::BeginXmlValue(String&& entryName, std::string_view nextName,
     if (nextAttributes != nullptr) {
         frame.pendingAttributes.Assign(nextAttributes);
     }
-    frame.instances.clear();
+    frame.ForgetInstances();
 }
 
 // --- Nodes ---
 
 String ElementReader::ChooseEntryName(ElementMode mode, bool& isNode) {
     if (Attributes().Has(AttributeName::Names)) {
-        ParseNames(Attributes().Value(AttributeName::Names), frame.instances);
+        ParseNames(Attributes().Value(AttributeName::Names), frame.instances, frame.loopVariables);
         if (!frame.instances.empty()) {
             isNode = true;
             return frame.instances.front().name;
@@ -159,7 +160,7 @@ ResTreeNode& ElementReader::MakeChild(String&& entryName, String&& elementName, 
     if (prototype != nullptr) {
         // Ahead of the element's own children, so that these override it.
         child->MergeFrom(*prototype, frame.mergeExisting);
-        child->ApplyParameters(CollectParameters(stack));
+        child->ApplyParameters(OpenElementParameters(stack));
     }
     return *child;
 }
@@ -169,7 +170,8 @@ ResTreeNode& ElementReader::MakeChild(String&& entryName, String&& elementName, 
 void ElementReader::MakeValue(String&& entryName) {
     const ElementName& name = frame.pendingName;
     const bool hasType = Attributes().Has(AttributeName::Type);
-    const bool isPath = hasType ? Attributes().Is(AttributeName::Type, u"path") : name.EndsInPathOrDir() || name.IsInclude();
+    const bool isPath =
+        hasType ? Attributes().Is(AttributeName::Type, u"path") : name.EndsInPathOrDir() || name.IsInclude();
     String text = ReadValueText(isPath);
     frame.position = nullptr;
     if (name.IsInclude()) {
@@ -206,7 +208,7 @@ String ElementReader::ReadValueText(bool isPath) const {
 
 void ElementReader::MakeOrdinaryValue(String&& text, bool isReferenceList) {
     if (HasVariables(text)) {
-        text = ExpandVariables(text, CollectParameters(stack));
+        text = ExpandVariables(text, OpenElementParameters(stack));
     }
     if (isReferenceList) {
         text = RebaseListPaths(text, node.GetPath());
@@ -265,7 +267,7 @@ void ElementReader::IncludeFile(const String& text) {
         Report(u"Unable to find include file node: ", path);
         return;
     }
-    loaded->ApplyParameters(CollectParameters(stack));
+    loaded->ApplyParameters(OpenElementParameters(stack));
 }
 
 void ElementReader::Report(std::u16string_view message, const String& subject) {

@@ -1,7 +1,5 @@
 #include "restree/LocalizeText.h"
 
-#include <vector>
-
 #include "hostbridge/ResourceLanguage.h"
 #include "qn/dsc/osdep/Compare.h"
 #include "restree/TextList.h"
@@ -9,36 +7,39 @@
 namespace zkhw {
 
 using qn::dsc::String;
-using qn::dsc::osdep::Compare;
+using qn::dsc::osdep::Equal;
 
 String LocalizeText(const String& text) {
     const String language = GetResourceLanguage();
-    std::vector<String> items;
-    SplitList(text.View(), u',', items, true);
-    const String* chosen = nullptr;
-    size_t chosenStart = 0;
-    for (const String& item : items) {
-        const size_t equals = item.View().find(u'=');
+    String unescaped = String::WithoutBuffer();
+    String chosen = String::WithoutBuffer();
+    bool isChosen = false;
+    PieceReader items(text.View(), u",", true);
+    while (items.Next()) {
+        std::u16string_view item = items.Raw();
+        if (items.MayHaveEscapes()) {
+            unescaped = UnescapeText(item, u',');
+            item = unescaped.View();
+        }
+        const size_t equals = item.find(u'=');
         if (equals == std::u16string_view::npos) {
             continue;
         }
-        const std::u16string_view code = item.View().substr(0, equals);
-        const bool isExact = Compare(code, language.View()) == 0;
-        if (isExact || Compare(code, u"eng") == 0) {
-            chosen = &item;
-            chosenStart = equals + 1;
+        const std::u16string_view code = item.substr(0, equals);
+        const bool isExact = Equal(code, language.View());
+        if (isExact || Equal(code, u"eng")) {
+            chosen = String(item.substr(equals + 1));
+            isChosen = true;
         }
         if (isExact) {
             break;
         }
     }
-    if (chosen == nullptr) {
+    if (!isChosen) {
         return text;
     }
-    String result(chosen->View().substr(chosenStart));
-    result.Append(1, u'\0');
-    result.Append(text);
-    return result;
+    constexpr char16_t nul[] = {0};
+    return String::Concat({chosen.View(), std::u16string_view(nul, 1), text.View()});
 }
 
 }  // namespace zkhw

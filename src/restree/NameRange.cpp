@@ -74,12 +74,18 @@ bool ParseNameRange(const String& item, std::vector<InstanceRecord>& instances) 
     return true;
 }
 
-void ParseNames(const String& names, std::vector<InstanceRecord>& instances) {
+void ParseNames(const String& names, std::vector<InstanceRecord>& instances, std::vector<String>& loopVariables) {
     std::vector<String> items;
     SplitList(names.View(), u',', items, true);
     for (String& item : items) {
+        const size_t before = instances.size();
         if (!ParseNameRange(item, instances)) {
             instances.push_back({std::move(item), String(), 0});
+        } else if (instances.size() > before) {
+            const String& variable = instances.back().variable;
+            if (!variable.IsEmpty() && (loopVariables.empty() || loopVariables.back() != variable)) {
+                loopVariables.push_back(variable);
+            }
         }
     }
 }

@@ -21,7 +21,7 @@ struct InstanceRecord {
 // for a range without any value. Otherwise false, and the item is a plain name, brackets and all.
 bool ParseNameRange(const String& item, std::vector<InstanceRecord>& instances);
 
-// The records of a whole comma list of plain names and ranges.
-void ParseNames(const String& names, std::vector<InstanceRecord>& instances);
+// The records of a whole comma list of plain names and ranges, and the loop variables of the ranges, in order.
+void ParseNames(const String& names, std::vector<InstanceRecord>& instances, std::vector<String>& loopVariables);
 
 }  // namespace zkhw

@@ -15,8 +15,8 @@ class ChangeDispatch;
 struct ResTreeNode::Attachments {
     std::unique_ptr<TypeTable> typeTable;
 
-    std::vector<ObserverRecord> observers;  // In order of registration.
-    bool notifying = false;                 // A dispatch runs over `observers`.
+    std::vector<ObserverRecord> observers;     // In order of registration.
+    bool notifying = false;                    // A dispatch runs over `observers`.
     const ChangeDispatch* dispatch = nullptr;  // The run of notices that has this node open, if any.
 
     // The nodes that hold a record of this one, so that none of them is left with it when this node goes. Each stands

@@ -69,7 +69,8 @@ class NodeEntry {
     struct TextShape;
     struct ChildShape;
 
-    NodeEntry(String&& key, EntryKind kind, bool textShape) : key(static_cast<String&&>(key)), kind(kind), textShape(textShape) {}
+    NodeEntry(String&& key, EntryKind kind, bool textShape)
+        : key(static_cast<String&&>(key)), kind(kind), textShape(textShape) {}
     ~NodeEntry() = default;
 
     inline String& Payload();
@@ -89,7 +90,8 @@ struct NodeEntry::TextShape : NodeEntry {
 };
 
 struct NodeEntry::ChildShape : NodeEntry {
-    ChildShape(String&& key, ResTreeNode* child) : NodeEntry(static_cast<String&&>(key), ChildEntry, false), child(child) {}
+    ChildShape(String&& key, ResTreeNode* child)
+        : NodeEntry(static_cast<String&&>(key), ChildEntry, false), child(child) {}
     ResTreeNode* child;
 };
 

@@ -1,20 +1,68 @@
 #include "restree/Parameters.h"
 
+#include <algorithm>
 #include <utility>
 #include <vector>
 
+#include "qn/dsc/osdep/Compare.h"
 #include "qn/dsc/osdep/IntegerToString.h"
 #include "restree/ParseStack.h"
 #include "restree/ReleaseScope.h"
 #include "restree/TextList.h"
+#include "restree/Utf8Text.h"
 
 namespace zkhw {
+
+using qn::dsc::osdep::Equal;
 
 namespace {
 
 constexpr std::u16string_view openMark = u"#{";
+constexpr std::u16string_view nameKey = u"name";
+constexpr std::u16string_view documentRootKey = u"document-root";
+
+bool IsLoopVariable(const ParseStack& stack, std::u16string_view name) {
+    for (const ParseFrame* frame = stack.Top(); frame != nullptr; frame = frame->previous.get()) {
+        for (const String& variable : frame->loopVariables) {
+            if (Equal(variable.View(), name)) {
+                return true;
+            }
+        }
+    }
+    return false;
+}
+
+std::u16string_view TrimBlanks(std::u16string_view text) {
+    constexpr std::u16string_view blanks = u" \t\r\n";
+    const size_t first = text.find_first_not_of(blanks);
+    return first == std::u16string_view::npos ? std::u16string_view()
+                                              : text.substr(first, text.find_last_not_of(blanks) + 1 - first);
+}
 
 }  // namespace
+
+bool MapParameters::AppendValue(std::u16string_view name, std::u16string& text) const {
+    const auto found = values.find(String(name));
+    if (found == values.end()) {
+        return false;
+    }
+    text.append(found->second.View());
+    return true;
+}
+
+InstanceParameters::InstanceParameters(const String& name, const String& variable, int32_t index)
+    : instanceName(name), variable(variable), index(qn::dsc::osdep::IntegerToString(index, 10)) {}
+
+bool InstanceParameters::AppendValue(std::u16string_view name, std::u16string& text) const {
+    if (Equal(name, nameKey)) {
+        text.append(instanceName.View());
+    } else if (!variable.IsEmpty() && Equal(name, variable.View())) {
+        text.append(index.View());
+    } else {
+        return false;
+    }
+    return true;
+}
 
 ParameterMap CollectParameters(const ParseStack& stack) {
     std::vector<const ParseFrame*> frames;
@@ -28,25 +76,67 @@ ParameterMap CollectParameters(const ParseStack& stack) {
         }
     }
     if (const ResTreeNode* documentRoot = stack.GetDocumentRoot()) {
-        parameters.emplace(String(u"document-root"), documentRoot->GetPath());
+        parameters.emplace(documentRootKey, documentRoot->GetPath());
     }
     for (const ParseFrame* frame : frames) {
-        for (const InstanceRecord& record : frame->instances) {
-            if (!record.variable.IsEmpty()) {
-                parameters.erase(record.variable);
-            }
+        for (const String& variable : frame->loopVariables) {
+            parameters.erase(variable);
         }
     }
-    parameters.erase(String(u"name"));
+    parameters.erase(String(nameKey));
     return parameters;
 }
 
-String ExpandVariables(const String& text, const ParameterMap& parameters) {
-    if (parameters.empty()) {
+const MapParameters& OpenElementParameters::Gathered() const {
+    if (!gathered) {
+        gathered = std::make_unique<MapParameters>(CollectParameters(stack));
+    }
+    return *gathered;
+}
+
+bool OpenElementParameters::IsEmpty() const {
+    const bool hasDocumentRoot = stack.GetDocumentRoot() != nullptr && !IsLoopVariable(stack, documentRootKey);
+    return !hasDocumentRoot && Gathered().IsEmpty();
+}
+
+bool OpenElementParameters::AppendValue(std::u16string_view name, std::u16string& text) const {
+    if (gathered || ++questions > questionsWithoutMap) {
+        return Gathered().AppendValue(name, text);
+    }
+    if (Equal(name, nameKey) || IsLoopVariable(stack, name)) {
+        return false;
+    }
+    // From the innermost outward: the last hit stands.
+    const ParseFrame* outermost = nullptr;
+    AttributeList::Place place = AttributeList::nowhere;
+    for (const ParseFrame* frame = stack.Top(); frame != nullptr; frame = frame->previous.get()) {
+        const AttributeList::Place found = frame->pendingAttributes.Find(name);
+        if (found != AttributeList::nowhere) {
+            outermost = frame;
+            place = found;
+        }
+    }
+    if (outermost != nullptr) {
+        text.append(outermost->pendingAttributes.ValueAt(place).View());
+        return true;
+    }
+    if (stack.GetDocumentRoot() != nullptr && Equal(name, documentRootKey)) {
+        text.append(stack.GetDocumentRoot()->GetPath().View());
+        return true;
+    }
+    return false;
+}
+
+bool HasVariables(const String& text) {
+    return text.View().find(openMark) != std::u16string_view::npos;
+}
+
+String ExpandVariables(const String& text, const Parameters& parameters) {
+    if (parameters.IsEmpty()) {
         return text;
     }
     const std::u16string_view source = text.View();
-    String result;
+    std::u16string result;
     size_t done = 0;
     size_t open = source.find(openMark);
     while (open != std::u16string_view::npos) {
@@ -54,26 +144,22 @@ String ExpandVariables(const String& text, const ParameterMap& parameters) {
         if (close == std::u16string_view::npos) {
             break;
         }
-        result.Append(source.substr(done, open - done));
-        const String key = TrimWhitespace(source.substr(open + openMark.size(), close - open - openMark.size()));
-        const auto found = parameters.find(key);
-        if (found != parameters.end()) {
-            result.Append(found->second);
-        } else {
-            result.Append(openMark);
-            result.Append(key);
-            result.Append(u"}");
+        result.append(source.substr(done, open - done));
+        const std::u16string_view key =
+            TrimBlanks(source.substr(open + openMark.size(), close - open - openMark.size()));
+        if (!parameters.AppendValue(key, result)) {
+            result.append(openMark).append(key).push_back(u'}');
         }
         done = close + 1;
         open = source.find(openMark, done);
     }
-    result.Append(source.substr(done));
-    return result;
+    result.append(source.substr(done));
+    return String(std::u16string_view(result));
 }
 
 // --- Expansion in a subtree ---
 
-void ResTreeNode::ApplyParameters(const ParameterMap& parameters) {
+void ResTreeNode::ApplyParameters(const Parameters& parameters) {
     struct Level {
         ResTreeNode* node;
         EntryPosition next;
@@ -102,12 +188,7 @@ void ResTreeNode::ApplyParameters(const ParameterMap& parameters) {
 }
 
 void ResTreeNode::ApplyInstance(const String& instanceName, const String& variable, int32_t index) {
-    ParameterMap parameters;
-    parameters.emplace(u"name", instanceName);
-    if (!variable.IsEmpty()) {
-        parameters.emplace(variable, qn::dsc::osdep::IntegerToString(index, 10));
-    }
-    ApplyParameters(parameters);
+    ApplyParameters(InstanceParameters(instanceName, variable, index));
 }
 
 }  // namespace zkhw

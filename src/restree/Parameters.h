@@ -1,25 +1,94 @@
 #pragma once
 
-// Parameters of the resource language: "#{name}" in texts.
+// Parameters of the resource language: what "#{name}" in a text stands for. Most texts ask for one or two of the many
+// attributes that are open, so values are looked for when they are asked for.
 
-#include "restree/ParseFrame.h"
-#include "restree/ResTreeNode.h"
+#include <cstdint>
+#include <map>
+#include <memory>
+#include <string>
+#include <string_view>
+
+#include "qn/dsc/StringBase.h"
 
 namespace zkhw {
 
+using qn::dsc::String;
+
 class ParseStack;
 
-// The attributes of all elements that are open in the top frame and below, of which the outermost wins, and
-// "document-root". Without "name" and the loop variables of open `names`, which are filled in per copy.
+class Parameters {
+  public:
+    Parameters() = default;
+    Parameters(const Parameters&) = delete;
+    Parameters& operator=(const Parameters&) = delete;
+    virtual ~Parameters() = default;
+
+    // True if there is no parameter at all. Texts then stay as they are, to the last blank.
+    virtual bool IsEmpty() const = 0;
+
+    // Appends the value of the parameter `name`, blind to letter case. False if there is none.
+    virtual bool AppendValue(std::u16string_view name, std::u16string& text) const = 0;
+};
+
+// From name to value, blind to letter case.
+using ParameterMap = std::map<String, String>;
+
+class MapParameters : public Parameters {
+  public:
+    explicit MapParameters(ParameterMap&& values) : values(std::move(values)) {}
+
+    bool IsEmpty() const override { return values.empty(); }
+    bool AppendValue(std::u16string_view name, std::u16string& text) const override;
+
+  private:
+    ParameterMap values;
+};
+
+// Those of one copy that `names` stands for.
+class InstanceParameters : public Parameters {
+  public:
+    // `variable` may be empty. Both texts outlive the object.
+    InstanceParameters(const String& name, const String& variable, int32_t index);
+
+    bool IsEmpty() const override { return false; }
+    bool AppendValue(std::u16string_view name, std::u16string& text) const override;
+
+  private:
+    const String& instanceName;
+    const String& variable;
+    String index;
+};
+
+// Those of the elements that are open in `stack`: their attributes, of which the outermost wins, and "document-root",
+// the path of the document element's node. Without "name" and the loop variables of open `names`, which are filled in
+// per copy. Only good while the same elements are open.
+class OpenElementParameters : public Parameters {
+  public:
+    explicit OpenElementParameters(const ParseStack& stack) : stack(stack) {}
+
+    bool IsEmpty() const override;
+    bool AppendValue(std::u16string_view name, std::u16string& text) const override;
+
+  private:
+    // After so many questions the answers are gathered in a map.
+    static constexpr uint32_t questionsWithoutMap = 16;
+
+    const MapParameters& Gathered() const;
+
+    const ParseStack& stack;
+    mutable uint32_t questions = 0;
+    mutable std::unique_ptr<MapParameters> gathered;
+};
+
+// All that OpenElementParameters answers, as a map.
 ParameterMap CollectParameters(const ParseStack& stack);
 
 // `text` with every "#{name}" that has a parameter replaced by its value, in one pass. An unknown one stays, without
 // the blanks inside its braces; a "#{" that isn't closed stays with all that follows.
-String ExpandVariables(const String& text, const ParameterMap& parameters);
+String ExpandVariables(const String& text, const Parameters& parameters);
 
 // True if there is anything to expand.
-inline bool HasVariables(const String& text) {
-    return text.View().find(u"#{") != std::u16string_view::npos;
-}
+bool HasVariables(const String& text);
 
 }  // namespace zkhw

@@ -16,6 +16,11 @@
 namespace zkhw {
 
 struct ParseFrame {
+    void ForgetInstances() {
+        instances.clear();
+        loopVariables.clear();
+    }
+
     std::unique_ptr<ParseFrame> previous;  // The frame below; null for the bottom frame.
     ResTreeNode* node = nullptr;           // Receives what is read at this level.
     ResTreeNode* firstNode = nullptr;      // The first node made or taken at this level.
@@ -38,6 +43,7 @@ struct ParseFrame {
     AttributeList pendingAttributes;
     std::string text;                       // Since the last start tag at this level, in UTF-8.
     std::vector<InstanceRecord> instances;  // What `names` of the pending element stands for.
+    std::vector<String> loopVariables;      // Those of `instances`; consecutive equal ones stand here once.
 };
 
 }  // namespace zkhw

@@ -45,7 +45,7 @@ void ParseStack::PushFrame(ResTreeNode& node, std::string_view nextName, const c
     frame->pendingName.Assign(nextName);
     frame->pendingAttributes.Assign(nextAttributes);
     frame->text.clear();
-    frame->instances.clear();
+    frame->ForgetInstances();
     top->position = nullptr;
     frame->previous = std::move(top);
     top = std::move(frame);
@@ -82,7 +82,7 @@ void ParseStack::StartElement(std::string_view name, const char* const* attribut
     top->pendingName.Assign(name);
     top->pendingAttributes.Assign(attributes);
     top->text.clear();
-    top->instances.clear();
+    top->ForgetInstances();
 }
 
 void ParseStack::CharacterData(std::string_view text) {
@@ -122,7 +122,7 @@ void ParseStack::EndElement(std::string_view name) {
     if (frame->instances.size() > 1) {
         ReplicateInstances(*frame);
     }
-    frame->instances.clear();
+    frame->ForgetInstances();
 }
 
 }  // namespace zkhw

@@ -24,8 +24,9 @@ struct TypeRelation {
 };
 
 constexpr TypeRelation builtInRelations[] = {
-    {u"Resource", u""},         {u"IOResource", u"Resource"},     {u"ResourceList", u""},     {u"Target", u"ResourceList"},
-    {u"Connector", u"ResourceList"}, {u"Module", u"Resource"}, {u"Module", u"ResourceList"},
+    {u"Resource", u""},           {u"IOResource", u"Resource"},    {u"ResourceList", u""},
+    {u"Target", u"ResourceList"}, {u"Connector", u"ResourceList"}, {u"Module", u"Resource"},
+    {u"Module", u"ResourceList"},
 };
 
 }  // namespace
@@ -241,7 +242,8 @@ EntryIterator ResTreeNode::InsertEntry(EntryIterator position, std::u16string_vi
     }
 }
 
-EntryIterator ResTreeNode::InsertEntry(EntryIterator position, std::u16string_view key, std::unique_ptr<ResTreeNode> child) {
+EntryIterator ResTreeNode::InsertEntry(EntryIterator position, std::u16string_view key,
+                                       std::unique_ptr<ResTreeNode> child) {
     const EntryPosition place = IsOrdered() ? position.Position() : entries.FindPlace(key).position;
     NodeEntry* entry = NodeEntry::MakeChild(String(key), child.get());
     try {

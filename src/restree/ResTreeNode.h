@@ -8,7 +8,6 @@
 // All operations that make something may throw bad_alloc.
 
 #include <cstdint>
-#include <map>
 #include <memory>
 #include <string_view>
 #include <vector>
@@ -27,10 +26,8 @@ using qn::dsc::NarrowString;
 
 class ElementReader;
 class LoadChain;
+class Parameters;
 class ParseStack;
-
-// Parameters for "#{name}": from name to value, blind to letter case.
-using ParameterMap = std::map<String, String>;
 
 struct ObserverRecord {
     enum State : uint8_t {
@@ -133,7 +130,8 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
 
     // Store an entry without a test, and raise nothing. `position` is where to insert in an ordered node and only a
     // hint in an unordered one. The node takes `child`.
-    EntryIterator InsertEntry(EntryIterator position, std::u16string_view key, EntryKind kind, std::u16string_view text);
+    EntryIterator InsertEntry(EntryIterator position, std::u16string_view key, EntryKind kind,
+                              std::u16string_view text);
     EntryIterator InsertEntry(EntryIterator position, std::u16string_view key, std::unique_ptr<ResTreeNode> child);
 
     // Removes an entry. The nodes of a child's subtree hear NodeDeleting from the top down, then NodeDeleted from the
@@ -263,7 +261,7 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     bool EnsureDeferredLoaded();
 
     // Expands "#{name}" in all texts of the subtree, after deferred loads.
-    void ApplyParameters(const ParameterMap& parameters);
+    void ApplyParameters(const Parameters& parameters);
 
     // ApplyParameters with "name" and, unless `variable` is empty, the loop variable.
     void ApplyInstance(const String& instanceName, const String& variable, int32_t index);
@@ -305,7 +303,7 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
 
     String name;
     String type;
-    ResTreeNode* parent;                       // Null for a root and a detached clone.
+    ResTreeNode* parent;  // Null for a root and a detached clone.
     EntryList entries;
     std::unique_ptr<Attachments> attachments;  // What few nodes have: a type table, observers.
     uint32_t suspendCount = 0;                 // Nonzero while delivery is held back.

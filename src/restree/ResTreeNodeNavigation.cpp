@@ -19,7 +19,8 @@ constexpr std::u16string_view displayNameKey = u"DisplayName";
 
 // A path that is being followed. It has its own text: a load on the way may change the entry that the path is from.
 struct OpenPath {
-    explicit OpenPath(std::u16string_view path, size_t start) : text(path), components(text.View().substr(start), u"/", false) {}
+    explicit OpenPath(std::u16string_view path, size_t start)
+        : text(path), components(text.View().substr(start), u"/", false) {}
     OpenPath(const OpenPath&) = delete;
     OpenPath& operator=(const OpenPath&) = delete;
 
@@ -148,7 +149,8 @@ String ResTreeNode::GetDisplayPath() {
 String ResTreeNode::GetEntryDisplayPath(EntryIterator iterator, const String& parentDisplayPath) {
     const ReleaseScope scope;
     ResTreeNode* node = ResolveEntry(iterator);
-    return node == nullptr ? String() : JoinDisplayPath(parentDisplayPath, node->name, node->GetProperty(displayNameKey));
+    return node == nullptr ? String()
+                           : JoinDisplayPath(parentDisplayPath, node->name, node->GetProperty(displayNameKey));
 }
 
 }  // namespace zkhw

@@ -105,7 +105,8 @@ bool ResTreeNode::Register(ResTreeNodeChangeObserver* observer, uint32_t mask, i
     if (chained != nullptr) {
         chained->GetAttachments().watched.push_back(this);
     }
-    own.observers.push_back({observer, context, mask, own.notifying ? ObserverRecord::Added : ObserverRecord::Active, chained});
+    own.observers.push_back(
+        {observer, context, mask, own.notifying ? ObserverRecord::Added : ObserverRecord::Active, chained});
     ObserverCount::Add(1);
     return true;
 }

@@ -43,9 +43,8 @@ constexpr char LowerAscii(char unit) {
 
 // Equality of an ASCII text and an ASCII word in lower case, blind to letter case.
 inline bool EqualsWord(std::string_view text, std::string_view word) {
-    return text.size() == word.size() && std::equal(text.begin(), text.end(), word.begin(), [](char left, char right) {
-               return LowerAscii(left) == right;
-           });
+    return text.size() == word.size() && std::equal(text.begin(), text.end(), word.begin(),
+                                                    [](char left, char right) { return LowerAscii(left) == right; });
 }
 
 inline bool EndsWithWord(std::string_view text, std::string_view word) {
