@@ -1,0 +1,78 @@
+#include "hostbridge/ResourceLanguage.h"
+
+#include "hostbridge/LoadedRuntime.h"
+#include "support/ExactText.h"
+
+namespace zkhw {
+namespace {
+
+using qn::dsc::ExactText;
+
+// The process remembers its language, so each test asks in one of its own.
+std::string LanguageOfHost(const char* name) {
+    LoadFakeRuntime().language = name;
+    return ExactText(GetResourceLanguage());
+}
+
+TEST(ResourceLanguage, IsEnglishWithoutAHost) {
+    EXPECT_IN_CHILD([] { return ExactText(GetResourceLanguage()) == "eng"; });
+}
+
+TEST(ResourceLanguage, IsEnglishForAnEnglishHost) {
+    EXPECT_IN_CHILD([] { return LanguageOfHost("English") == "eng"; });
+}
+
+TEST(ResourceLanguage, IsJapaneseForAJapaneseHost) {
+    EXPECT_IN_CHILD([] { return LanguageOfHost("Japanese") == "jpn"; });
+}
+
+TEST(ResourceLanguage, IsChineseForAChineseHost) {
+    EXPECT_IN_CHILD([] { return LanguageOfHost("ChineseS") == "chs"; });
+}
+
+TEST(ResourceLanguage, NameOfTheHostMayHaveAnyLetterCase) {
+    EXPECT_IN_CHILD([] { return LanguageOfHost("english") == "eng"; });
+    EXPECT_IN_CHILD([] { return LanguageOfHost("JAPANESE") == "jpn"; });
+    EXPECT_IN_CHILD([] { return LanguageOfHost("chineses") == "chs"; });
+}
+
+TEST(ResourceLanguage, IsEnglishForAnyOtherHost) {
+    EXPECT_IN_CHILD([] { return LanguageOfHost("French") == "eng"; });
+    EXPECT_IN_CHILD([] { return LanguageOfHost("Chinese") == "eng"; });
+    EXPECT_IN_CHILD([] { return LanguageOfHost("") == "eng"; });
+}
+
+TEST(ResourceLanguage, NameMayHave255Bytes) {
+    EXPECT_IN_CHILD([] { return LanguageOfHost(std::string(255, 'x').c_str()) == "eng"; });
+}
+
+TEST(ResourceLanguage, IsAskedForOnce) {
+    EXPECT_IN_CHILD([] {
+        FakeRuntime& runtime = LoadFakeRuntime();
+        runtime.language = "Japanese";
+        GetResourceLanguage();
+        runtime.language = "English";
+        return ExactText(GetResourceLanguage()) == "jpn" && runtime.languageCalls == 1;
+    });
+}
+
+TEST(ResourceLanguage, HostThatComesLaterChangesNothing) {
+    EXPECT_IN_CHILD([] {
+        const bool wasEnglish = ExactText(GetResourceLanguage()) == "eng";
+        FakeRuntime& runtime = LoadFakeRuntime();
+        runtime.language = "Japanese";
+        return wasEnglish && ExactText(GetResourceLanguage()) == "eng" && runtime.languageCalls == 0;
+    });
+}
+
+TEST(ResourceLanguageDeathTest, HostThatCannotAnswerIsFatal) {
+    EXPECT_EXIT(
+        {
+            LoadModule(POOR_RUNTIME);
+            GetResourceLanguage();
+        },
+        testing::ExitedWithCode(1), "^Fatal Error: ZARVIKV\\.LIB could not locate \"HostGetLanguageName\"\\.\n$");
+}
+
+}  // namespace
+}  // namespace zkhw
