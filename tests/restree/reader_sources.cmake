@@ -1,0 +1,4 @@
+# What reads resource files.
+set(RESTREE_READER_TESTS
+  ${CMAKE_CURRENT_LIST_DIR}/ElementNodesTest.cpp
+  ${CMAKE_CURRENT_LIST_DIR}/ReadTree.cpp)
