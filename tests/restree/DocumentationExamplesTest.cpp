@@ -124,7 +124,7 @@ class PageReader {
     }
 
     void AddOutput(size_t opening, bool isTree, const std::string& content) {
-        if (examples.empty() || examples.back().inputs.empty() || examples.back().inputs.back().name != "") {
+        if (examples.empty() || examples.back().inputs.empty() || !examples.back().inputs.back().name.empty()) {
             Fault(opening, "follows no description");
             return;
         }
