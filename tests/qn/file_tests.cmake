@@ -1,3 +1,20 @@
 # Paths, files and folders.
 set(QN_FILE_TESTS
+  ../support/FaultyFileSystem.cpp
+  ../support/SmallStack_linux.cpp
+  ../support/TemporaryFolder_linux.cpp
+  dsc/osdep/BinaryFileTest.cpp
+  dsc/osdep/CommandLineTest.cpp
+  dsc/osdep/CopyDirectoryTreeTest.cpp
+  dsc/osdep/FaultyFileSystemTest.cpp
+  dsc/osdep/FileFinderTest.cpp
+  dsc/osdep/FileSystem_linuxTest.cpp
+  dsc/osdep/NameOrderTest.cpp
+  dsc/osdep/NativePathTest.cpp
+  dsc/osdep/NativeTextTest.cpp
+  dsc/osdep/TextStreamTest.cpp
+  dsc/osdep/TimeStampTest.cpp
+  dsc/osdep/_GetExeFullPathTest.cpp
+  dsc/osdep/pathTest.cpp
+  dsc/osdep/path_diskTest.cpp
 )

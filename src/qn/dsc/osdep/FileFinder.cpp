@@ -8,11 +8,12 @@ namespace {
 
 // The drive and the folder of a path, with the separator behind them.
 String FolderPartOf(const String& path) {
-    const uint32_t last = std::u16string_view::npos == path.View().find_last_of(u"\\/")
-                              ? 0
-                              : static_cast<uint32_t>(path.View().find_last_of(u"\\/") + 1);
-    const bool isBareDrive = last == 0 && path.Length() >= 2 && path.At(1) == u':';
-    return String(path.CStr(), isBareDrive ? 2 : last);
+    const size_t last = path.View().find_last_of(u"\\/");
+    if (last != std::u16string_view::npos) {
+        return path.Substring(0, static_cast<uint32_t>(last) + 1);
+    }
+    const bool hasDrive = path.Length() >= 2 && path.At(1) == u':';
+    return path.Substring(0, hasDrive ? 2 : 0);
 }
 
 }  // namespace

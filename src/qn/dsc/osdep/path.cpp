@@ -191,25 +191,24 @@ class TreeCopy {
             CopyFileTo(entry, target, true);
             return;
         }
-        FileIdentity identity;
-        const bool isKnown = GetFileSystem().ReadIdentity(entry, identity) == 0;
-        // To copy a folder into itself would never end, so one that is copied into counts as well.
-        if (isKnown && (sources.Holds(identity) || destinations.Holds(identity))) {
-            return;
-        }
         AppendSeparator(target);
         Enter(entry, target);
     }
 
+    // Begins the copy of a folder, unless it is on the present path already.
     void Enter(const String& source, const String& destination) {
-        if (!IsDirectory(destination)) {
-            CreateDirectoryPath(destination);
-        }
         CopyLevel level;
         level.destination = destination;
         FileSystem& fileSystem = GetFileSystem();
-        level.hasIdentities = fileSystem.ReadIdentity(source, level.sourceIdentity) == 0 &&
-                              fileSystem.ReadIdentity(destination, level.destinationIdentity) == 0;
+        const bool isKnown = fileSystem.ReadIdentity(source, level.sourceIdentity) == 0;
+        // To copy a folder into itself would never end, so one that is copied into counts as well.
+        if (isKnown && (sources.Holds(level.sourceIdentity) || destinations.Holds(level.sourceIdentity))) {
+            return;
+        }
+        if (!IsDirectory(destination)) {
+            CreateDirectoryPath(destination);
+        }
+        level.hasIdentities = isKnown && fileSystem.ReadIdentity(destination, level.destinationIdentity) == 0;
         level.hold = fileSystem.HoldFolder(destination);
         level.entries = FileFinder().ListFiles(JoinPath(source, u"*"));
         if (level.hasIdentities) {

@@ -1,0 +1,12 @@
+#pragma once
+
+// Runs a part of a test where the stack is small, so that recursion over the depth of some input ends the process.
+
+#include <functional>
+
+namespace qn::dsc::osdep {
+
+// Calls `work` on a thread of its own with a stack of 256 KB and waits for it. An exception must not leave `work`.
+void RunOnSmallStack(const std::function<void()>& work);
+
+}  // namespace qn::dsc::osdep
