@@ -3,7 +3,6 @@
 #include <algorithm>
 #include <cassert>
 #include <functional>
-#include <new>
 
 #include "qn/dsc/SafeInteger.h"
 #include "qn/dsc/exception/Exception.h"
@@ -23,7 +22,7 @@ uint32_t OffsetOrNone(size_t position) {
 
 template <typename Unit>
 void StringBase<Unit>::ThrowNoMemory() {
-    throw std::bad_alloc();
+    exception::ThrowBadAllocation();
 }
 
 template <typename Unit>

@@ -188,7 +188,12 @@ bool StringBase<char16_t>::TryFromUtf8(const char* bytes, uint32_t length, Strin
         return false;
     }
     if (!text.KeepsBuffer(count)) {
-        text.ReplaceBuffer(AllocateUnits(count), count);
+        char16_t* block = AllocateUnits(count);
+        if (text.begin != nullptr) {
+            osdep::TaskMemFree(text.begin);
+        }
+        text.begin = block;
+        text.capacityEnd = block + count;
     }
     if (isAscii) {
         WidenAscii(bytes, count, text.begin);

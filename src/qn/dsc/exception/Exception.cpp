@@ -1,5 +1,7 @@
 #include "qn/dsc/exception/Exception.h"
 
+#include <new>
+
 namespace qn::dsc::exception {
 
 namespace {
@@ -8,6 +10,11 @@ namespace {
 constexpr int32_t Code(uint32_t code) {
     return static_cast<int32_t>(code);
 }
+
+class BadAllocation : public std::bad_alloc {
+  public:
+    const char* what() const noexcept override { return "bad allocation"; }
+};
 
 }  // namespace
 
@@ -19,6 +26,10 @@ const char* Exception::what() const noexcept {
 
 int32_t Exception::GetErrorCode() const {
     return -1;
+}
+
+void ThrowBadAllocation() {
+    throw BadAllocation();
 }
 
 const char* OutOfRange::what() const noexcept {

@@ -2,8 +2,8 @@
 
 // The failures of the foundation library. Each class has a fixed text and a fixed code, and an object carries the place
 // that threw it. Objects are thrown by value, through ThrowAt, and caught by reference.
-// A failed allocation is std::bad_alloc and no member of this tree. Making or copying an object that holds text can
-// itself fail so.
+// A failed allocation is std::bad_alloc and no member of this tree (ThrowBadAllocation). Making or copying an object
+// that holds text can itself fail so.
 
 #include <cstdint>
 #include <exception>
@@ -46,6 +46,9 @@ template <class Failure>
     failure.SetFile(file);
     throw failure;
 }
+
+// Throws a std::bad_alloc whose text is "bad allocation", whatever the run-time's own is.
+[[noreturn]] void ThrowBadAllocation();
 
 class OutOfRange : public Exception {
   public:

@@ -19,6 +19,9 @@ void ClearAllocationFault();
 // How many allocations there were between the last FailAllocation and ClearAllocationFault (or now).
 uint64_t AllocationCount();
 
+// Whether allocations are being counted: while they are not, ShouldFailAllocation need not be asked.
+inline bool IsAllocationFaultSet();
+
 // Counts one allocation and says whether it is to fail. Every allocator asks this once before it allocates; a test's
 // own global operator new may ask as well, and so take part in the count.
 inline bool ShouldFailAllocation();
@@ -28,8 +31,12 @@ extern std::atomic<bool> allocationFaultSet;
 bool CountAllocation();
 }  // namespace detail
 
+inline bool IsAllocationFaultSet() {
+    return detail::allocationFaultSet.load(std::memory_order_relaxed);
+}
+
 inline bool ShouldFailAllocation() {
-    return detail::allocationFaultSet.load(std::memory_order_relaxed) && detail::CountAllocation();
+    return IsAllocationFaultSet() && detail::CountAllocation();
 }
 
 }  // namespace qn::dsc::osdep

@@ -1,0 +1,41 @@
+#include "qn/dsc/osdep/SizeClass.h"
+
+#include <gtest/gtest.h>
+
+namespace qn::dsc::osdep {
+namespace {
+
+TEST(SizeClass, HoldsEverySizeInTheSmallestClassThatDoes) {
+    for (size_t size = 1; size <= maximumClassedSize; ++size) {
+        const uint32_t sizeClass = SizeClassOf(size);
+        ASSERT_GE(SizeOfClass(sizeClass), size);
+        ASSERT_TRUE(sizeClass == 1 || SizeOfClass(sizeClass - 1) < size) << size;
+    }
+}
+
+TEST(SizeClass, HoldsNothingInTheFirstClass) {
+    EXPECT_EQ(SizeClassOf(0), 1U);
+}
+
+TEST(SizeClass, StepsBy16BytesUpTo512) {
+    for (uint32_t sizeClass = 1; sizeClass <= 32; ++sizeClass) {
+        EXPECT_EQ(SizeOfClass(sizeClass), 16U * sizeClass);
+    }
+}
+
+TEST(SizeClass, DoublesInFourStepsAbove512) {
+    constexpr size_t expected[] = {640, 768, 896, 1024, 1280, 1536, 1792, 2048, 2560};
+    for (uint32_t step = 0; step < 9; ++step) {
+        EXPECT_EQ(SizeOfClass(33 + step), expected[step]);
+    }
+    EXPECT_EQ(SizeOfClass(sizeClassCount - 1), 32768U);
+}
+
+TEST(SizeClass, KeepsTheAlignment) {
+    for (uint32_t sizeClass = 1; sizeClass < sizeClassCount; ++sizeClass) {
+        EXPECT_EQ(SizeOfClass(sizeClass) % 16, 0U) << sizeClass;
+    }
+}
+
+}  // namespace
+}  // namespace qn::dsc::osdep
