@@ -1,4 +1,6 @@
 # What reads resource files.
 set(RESTREE_READER_TESTS
   ${CMAKE_CURRENT_LIST_DIR}/ElementNodesTest.cpp
-  ${CMAKE_CURRENT_LIST_DIR}/ReadTree.cpp)
+  ${CMAKE_CURRENT_LIST_DIR}/ElementValuesTest.cpp
+  ${CMAKE_CURRENT_LIST_DIR}/ReadTree.cpp
+  ${CMAKE_CURRENT_LIST_DIR}/XmlValueTest.cpp)
