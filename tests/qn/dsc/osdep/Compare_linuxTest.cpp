@@ -2,15 +2,19 @@
 
 #include <algorithm>
 #include <array>
+#include <atomic>
 #include <cstdlib>
 #include <random>
 #include <string>
+#include <thread>
 #include <utility>
 #include <vector>
 
 #include <gtest/gtest.h>
 #include <unicode/uchar.h>
+#include <unicode/uclean.h>
 #include <unicode/ucol.h>
+#include <unicode/uloc.h>
 
 #include "qn/dsc/osdep/Compare.h"
 #include "qn/dsc/osdep/Compare_ascii.h"
@@ -341,7 +345,19 @@ TEST(Collation, UnknownLocaleGetsTheRootCollation) {
     EXPECT_EQ(unknown.Compare(u"\u00e4", u"a"), 1);
 }
 
-// The next three look at the first use in a process, so each runs in a process of its own.
+// Memory for ICU, as long as there is some.
+bool memoryIsGone = false;
+void* Allocate(const void*, size_t size) {
+    return memoryIsGone ? nullptr : std::malloc(size);
+}
+void* Reallocate(const void*, void* block, size_t size) {
+    return memoryIsGone ? nullptr : std::realloc(block, size);
+}
+void Free(const void*, void* block) {
+    std::free(block);
+}
+
+// These look at the first use in a process, so that each runs in a process of its own.
 class FirstUse : public testing::Test {
   protected:
     void SetUp() override { testing::FLAGS_gtest_death_test_style = "threadsafe"; }
@@ -385,6 +401,41 @@ TEST_F(FirstUseDeathTest, LocaleCMeansTheRootCollation) {
             testing::ExitedWithCode(0), "")
             << locale;
     }
+}
+
+TEST_F(FirstUseDeathTest, ManyThreadsMayBeTheFirst) {
+    EXPECT_EXIT(
+        {
+            std::atomic<int> wrong = 0;
+            std::vector<std::thread> threads;
+            for (int i = 0; i < 8; ++i) {
+                threads.emplace_back([&] {
+                    for (int round = 0; round < 100; ++round) {
+                        wrong += Compare(u"\u00e9", u"f") != -1 || Compare(u"\u00c9a", u"\u00e9A") != 0;
+                    }
+                });
+            }
+            for (std::thread& thread : threads) {
+                thread.join();
+            }
+            std::exit(wrong == 0 ? 0 : 1);
+        },
+        testing::ExitedWithCode(0), "");
+}
+
+TEST_F(FirstUseDeathTest, WithoutACollationOtherCharactersCountAsEqual) {
+    EXPECT_EXIT(
+        {
+            UErrorCode error = U_ZERO_ERROR;
+            u_setMemoryFunctions(nullptr, Allocate, Reallocate, Free, &error);
+            // ICU has its default locale before it runs out of memory; without one it would wait for itself.
+            uloc_getDefault();
+            memoryIsGone = true;
+            const bool areEqual = Compare(u"\u00e9", u"z") == 0 && Compare(u"\u00e9-", u"\u00e9") == 0;
+            const bool isAsciiOrdered = Compare(u"a", u"z") == -1 && Compare(u"co-op", u"coop") == 1;
+            std::exit(U_SUCCESS(error) && areEqual && isAsciiOrdered ? 0 : 1);
+        },
+        testing::ExitedWithCode(0), "");
 }
 
 }  // namespace
