@@ -40,4 +40,9 @@ int32_t RunTool(int argc, char** argv) {
     return InstallDeviceMenus(*treeOfTheRun);
 }
 
+void DiscardTreeOfTheRun() {
+    delete treeOfTheRun;
+    treeOfTheRun = nullptr;
+}
+
 }  // namespace zkhw

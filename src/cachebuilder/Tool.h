@@ -10,4 +10,7 @@ namespace zkhw {
 // end.
 int32_t RunTool(int argc, char** argv);
 
+// Takes down the tree that RunTool left standing. For a process that goes on after it.
+void DiscardTreeOfTheRun();
+
 }  // namespace zkhw

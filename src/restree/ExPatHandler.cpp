@@ -2,6 +2,7 @@
 
 #include <expat.h>
 
+#include <new>
 #include <utility>
 
 #include "qn/dsc/osdep/TaskMemory.h"
@@ -76,6 +77,10 @@ bool ExPatHandler::Parse(const char* bytes, size_t count, bool isFinal) {
     const XML_Status status = XML_Parse(parser, bytes, static_cast<int>(count), isFinal ? 1 : 0);
     if (failure) {
         std::rethrow_exception(std::exchange(failure, nullptr));
+    }
+    // No fault of the document, so no report about it.
+    if (status != XML_STATUS_OK && XML_GetErrorCode(parser) == XML_ERROR_NO_MEMORY) {
+        throw std::bad_alloc();
     }
     return status == XML_STATUS_OK;
 }

@@ -35,7 +35,8 @@ class ExPatHandler {
     bool HasParser() const { return parser != nullptr; }
 
     // Parses the next piece of the document, which always counts as UTF-8 unless it begins with the mark of UTF-16.
-    // False if it isn't well formed. An exception of a handler comes out here.
+    // False if it isn't well formed. An exception of a handler comes out here, and bad_alloc if the parser ran out of
+    // memory.
     bool Parse(const char* bytes, size_t count, bool isFinal);
 
     // Where the parser stands: what is wrong (empty if nothing is), the line from 1 and the column from 0, and the text

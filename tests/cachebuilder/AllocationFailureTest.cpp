@@ -1,0 +1,96 @@
+// The whole tool with every single allocation failing in turn: of texts, of nodes, of the ordinary heap and of the
+// parser. A run may end with a result code or with an exception, and nothing else; no file stays open and nothing
+// leaks.
+
+#include <gtest/gtest.h>
+
+#include <new>
+#include <string>
+
+#include "cachebuilder/SmallInstallation.h"
+#include "qn/dsc/exception/Exception.h"
+#include "support/AllocationFaultScope.h"
+
+namespace zkhw {
+namespace {
+
+using support::AllocationCounter;
+using support::AllocationFaultScope;
+
+std::string OutcomeOf(SmallInstallation& installation) {
+    try {
+        switch (const uint32_t result = installation.Run()) {
+            case 0:
+                return "0";
+            case 0x80004005:
+                return "failure";
+            case 0x8007000e:
+                return "out of memory";
+            default:
+                return "result " + std::to_string(result);
+        }
+    } catch (const std::bad_alloc&) {
+        return "bad_alloc";
+    } catch (const qn::dsc::exception::Exception&) {
+        // IsDirectory never throws: without memory it finds none, and the copy of the menus then fails in its own way.
+        return "failed copy";
+    }
+}
+
+uint64_t CountAllocations(SmallInstallation& installation) {
+    // The first run also fills what lives to the end of the process.
+    EXPECT_EQ(OutcomeOf(installation), "0");
+    const AllocationCounter counter;
+    EXPECT_EQ(OutcomeOf(installation), "0");
+    return counter.Count();
+}
+
+void FailEachInTurn(bool fromThenOn) {
+    SmallInstallation installation;
+    const uint64_t total = CountAllocations(installation);
+    ASSERT_GT(total, 500U);
+    const std::string cache = installation.Cache();
+    uint64_t failures = 0;
+    for (uint64_t nth = 1; nth <= total; ++nth) {
+        std::string outcome;
+        bool wasReached = false;
+        {
+            const AllocationFaultScope fault(nth, fromThenOn);
+            outcome = OutcomeOf(installation);
+            wasReached = qn::dsc::osdep::AllocationCount() >= nth;
+        }
+        ASSERT_TRUE(outcome == "0" || outcome == "failure" || outcome == "out of memory" || outcome == "bad_alloc" ||
+                    outcome == "failed copy")
+            << "allocation " << nth << ": " << outcome;
+        ASSERT_TRUE(wasReached) << "allocation " << nth;
+        failures += outcome == "0" ? 0 : 1;
+        ASSERT_EQ(installation.files.OpenFiles(), 0) << "allocation " << nth;
+        ASSERT_EQ(installation.files.OpenSearches(), 0) << "allocation " << nth;
+    }
+    EXPECT_GT(failures, total / 2);
+    // With the failure lifted all is as before.
+    EXPECT_EQ(OutcomeOf(installation), "0");
+    EXPECT_EQ(installation.Cache(), cache);
+}
+
+TEST(ToolOutOfMemory, EndsWithAResultOrAnExceptionWhereverOneAllocationFails) {
+    FailEachInTurn(false);
+}
+
+TEST(ToolOutOfMemory, EndsWithAResultOrAnExceptionWhereverAllocationsFailFromThenOn) {
+    FailEachInTurn(true);
+}
+
+TEST(ToolOutOfMemory, GivesOutOfMemoryWhenTheRootCannotBeAllocated) {
+    SmallInstallation installation;
+    const uint64_t total = CountAllocations(installation);
+    uint64_t found = 0;
+    for (uint64_t nth = 1; nth <= total && nth <= 100; ++nth) {
+        const AllocationFaultScope fault(nth);
+        found += OutcomeOf(installation) == "out of memory" ? 1 : 0;
+    }
+    EXPECT_EQ(found, 1U);
+}
+
+}  // namespace
+}  // namespace zkhw
