@@ -135,6 +135,27 @@ std::vector<uint32_t> LevelsOf(std::u16string_view path, bool& isSound) {
     return levels;
 }
 
+// CreateDirectoryPath for an absolute path. With `isLastMissing` the last folder is known not to stand.
+void CreateMissingFolders(const String& path, bool isLastMissing) {
+    bool isSound = true;
+    const std::vector<uint32_t> levels = LevelsOf(path.View(), isSound);
+    // A folder that stands has all above it standing, so the first missing one is found from below, in one step for
+    // a new folder in an old one.
+    size_t missing = levels.size();
+    if (isLastMissing && isSound && missing > 0) {
+        --missing;
+    }
+    while (missing > 0 && !IsDirectory(path.Substring(0, levels[missing - 1]))) {
+        --missing;
+    }
+    for (; missing < levels.size(); ++missing) {
+        CreateOneDirectory(path.Substring(0, levels[missing]));
+    }
+    if (!isSound) {
+        ThrowAt(exception::InvalidArgument(), module, __LINE__);
+    }
+}
+
 // Set of folders that can be on a path more than once.
 class FolderSet {
   public:
@@ -206,7 +227,7 @@ class TreeCopy {
             return;
         }
         if (!IsDirectory(destination)) {
-            CreateDirectoryPath(destination);
+            CreateMissingFolders(destination, EndsInSeparator(destination.View()));
         }
         level.hasIdentities = isKnown && fileSystem.ReadIdentity(destination, level.destinationIdentity) == 0;
         level.hold = fileSystem.HoldFolder(destination);
@@ -354,20 +375,7 @@ void CreateDirectoryPath(const String& path) {
     if (!IsAbsolute(path.View())) {
         ThrowAt(exception::InvalidArgument(), module, __LINE__);
     }
-    bool isSound = true;
-    const std::vector<uint32_t> levels = LevelsOf(path.View(), isSound);
-    // A folder that stands has all above it standing, so the first missing one is found from below, in one step for
-    // a new folder in an old one.
-    size_t missing = levels.size();
-    while (missing > 0 && !IsDirectory(path.Substring(0, levels[missing - 1]))) {
-        --missing;
-    }
-    for (; missing < levels.size(); ++missing) {
-        CreateOneDirectory(path.Substring(0, levels[missing]));
-    }
-    if (!isSound) {
-        ThrowAt(exception::InvalidArgument(), module, __LINE__);
-    }
+    CreateMissingFolders(path, false);
 }
 
 void CreateOneDirectory(const String& path) {
