@@ -2,5 +2,7 @@
 set(RESTREE_READER_TESTS
   ${CMAKE_CURRENT_LIST_DIR}/ElementNodesTest.cpp
   ${CMAKE_CURRENT_LIST_DIR}/ElementValuesTest.cpp
+  ${CMAKE_CURRENT_LIST_DIR}/NameRangeTest.cpp
+  ${CMAKE_CURRENT_LIST_DIR}/NamesTest.cpp
   ${CMAKE_CURRENT_LIST_DIR}/ReadTree.cpp
   ${CMAKE_CURRENT_LIST_DIR}/XmlValueTest.cpp)
