@@ -150,9 +150,8 @@ ResTreeNode* ElementReader::FindPrototype() {
 
 ResTreeNode& ElementReader::MakeChild(String&& entryName, String&& elementName, bool isOrdered) {
     ResTreeNode* prototype = FindPrototype();
-    node.RemoveIfMismatched(!frame.mergeExisting, entryName.View(), elementName.View(), isOrdered);
     ResTreeNode* child = nullptr;
-    node.AddChild(std::move(entryName), std::move(elementName), isOrdered, child, Before());
+    node.ReplaceChild(!frame.mergeExisting, std::move(entryName), std::move(elementName), isOrdered, child, Before());
     if (child == nullptr) {
         // An observer has put something else in the place that was just cleared. What follows is read all the same.
         return node;
@@ -211,7 +210,9 @@ void ElementReader::MakeOrdinaryValue(String&& text, bool isReferenceList) {
         text = ExpandVariables(text, OpenElementParameters(stack));
     }
     if (isReferenceList) {
-        text = RebaseListPaths(text, node.GetPath());
+        // The node's path is only wanted for pieces that begin with a slash.
+        const bool hasPaths = text.Find(u'/') != String::npos;
+        text = RebaseListPaths(text, hasPaths ? node.GetPath() : String());
     }
     if (Attributes().IsTrue(AttributeName::Localize)) {
         StoreText(LocalizeText(text), LocalizedTextEntry);

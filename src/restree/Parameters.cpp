@@ -136,7 +136,9 @@ String ExpandVariables(const String& text, const Parameters& parameters) {
         return text;
     }
     const std::u16string_view source = text.View();
-    std::u16string result;
+    // Kept from one text to the next: nearly every text of a copy comes through here.
+    static thread_local std::u16string result;
+    result.clear();
     size_t done = 0;
     size_t open = source.find(openMark);
     while (open != std::u16string_view::npos) {
@@ -154,7 +156,12 @@ String ExpandVariables(const String& text, const Parameters& parameters) {
         open = source.find(openMark, done);
     }
     result.append(source.substr(done));
-    return String(std::u16string_view(result));
+    String expanded{std::u16string_view(result)};
+    constexpr size_t keptCapacity = 65536;
+    if (result.capacity() > keptCapacity) {
+        result = std::u16string();
+    }
+    return expanded;
 }
 
 // --- Expansion in a subtree ---

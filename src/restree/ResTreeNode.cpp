@@ -122,8 +122,10 @@ ResTreeNode* ResTreeNode::ResolveEntry(NodeEntry* entry) {
     if (entry == nullptr) {
         return nullptr;
     }
-    if (const String* path = entry->LinkPath()) {
-        return Lookup(path->View(), nullptr);
+    if (entry->LinkPath() != nullptr) {
+        // A load on the way may change the entry.
+        const String path = *entry->LinkPath();
+        return Lookup(path.View(), nullptr);
     }
     return entry->Child();
 }
@@ -224,10 +226,34 @@ ResTreeNode::Added ResTreeNode::AddChildAt(EntryPosition position, String&& key,
         }
         position = place.position;
     }
+    return MakeChildAt(position, std::move(key), std::move(childType), childOrdered, child);
+}
+
+ResTreeNode::Added ResTreeNode::MakeChildAt(EntryPosition position, String&& key, String&& childType, bool childOrdered,
+                                            ResTreeNode*& child) {
     auto made = std::make_unique<ResTreeNode>(String(key), std::move(childType), childOrdered, this);
     NodeEntry* entry = NodeEntry::MakeChild(std::move(key), made.get());
     child = made.release();
     return Store(position, entry, ChildAdded);
+}
+
+// RemoveIfMismatched and AddChildEntry in one, with one search where one is enough.
+ResTreeNode::Added ResTreeNode::ReplaceChild(bool unconditional, String&& key, String&& childType, bool childOrdered,
+                                             ResTreeNode*& child, const String* before) {
+    if (unconditional || IsOrdered() || before != nullptr) {
+        RemoveIfMismatched(unconditional, key.View(), childType.View(), childOrdered);
+        return AddChild(std::move(key), std::move(childType), childOrdered, child, before);
+    }
+    const EntryList::Place place = entries.FindPlace(key.View());
+    if (place.entry == nullptr) {
+        return MakeChildAt(place.position, std::move(key), std::move(childType), childOrdered, child);
+    }
+    if (IsChildOfKind(*place.entry, childType.View(), childOrdered)) {
+        child = place.entry->Child();
+        return {place.entry, false};
+    }
+    RemoveEntry(place.entry);
+    return AddChild(std::move(key), std::move(childType), childOrdered, child, before);
 }
 
 EntryIterator ResTreeNode::InsertEntry(EntryIterator position, std::u16string_view key, EntryKind kind,
@@ -308,10 +334,15 @@ void ResTreeNode::RemoveIfMismatched(bool unconditional, std::u16string_view ent
     if (entry == nullptr) {
         return;
     }
-    const ResTreeNode* child = entry->Child();
-    if (child == nullptr || child->IsOrdered() != entryOrdered || Compare(child->type.View(), entryType) != 0) {
+    if (!IsChildOfKind(*entry, entryType, entryOrdered)) {
         RemoveEntry(entry);
     }
+}
+
+// Whether the entry is a child of just this type and order.
+bool ResTreeNode::IsChildOfKind(const NodeEntry& entry, std::u16string_view entryType, bool entryOrdered) {
+    const ResTreeNode* child = entry.Child();
+    return child != nullptr && child->IsOrdered() == entryOrdered && Compare(child->type.View(), entryType) == 0;
 }
 
 // --- Types ---

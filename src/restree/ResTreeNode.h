@@ -278,6 +278,10 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     EntryPosition PositionBefore(const String* before);
     Added AddChildAt(EntryPosition position, String&& key, String&& childType, bool childOrdered, ResTreeNode*& child);
     Added AddChild(String&& key, String&& childType, bool childOrdered, ResTreeNode*& child, const String* before);
+    Added ReplaceChild(bool unconditional, String&& key, String&& childType, bool childOrdered, ResTreeNode*& child,
+                       const String* before);
+    Added MakeChildAt(EntryPosition position, String&& key, String&& childType, bool childOrdered, ResTreeNode*& child);
+    static bool IsChildOfKind(const NodeEntry& entry, std::u16string_view entryType, bool entryOrdered);
     ResTreeNode* PrepareClone(EntryPosition position, std::u16string_view key, ResTreeNode& source, bool overwrite,
                               NodeEntry*& entry);
 

@@ -17,12 +17,11 @@ namespace {
 
 constexpr std::u16string_view displayNameKey = u"DisplayName";
 
-// A path that is being followed. It has its own text: a load on the way may change the entry that the path is from.
-struct OpenPath {
-    explicit OpenPath(std::u16string_view path, size_t start)
-        : text(path), components(text.View().substr(start), u"/", false) {}
-    OpenPath(const OpenPath&) = delete;
-    OpenPath& operator=(const OpenPath&) = delete;
+// The path of a link that is being followed. It has its own text: a load on the way may change the link.
+struct LinkPath {
+    LinkPath(std::u16string_view path, size_t start) : text(path), components(text.View().substr(start), u"/", false) {}
+    LinkPath(const LinkPath&) = delete;
+    LinkPath& operator=(const LinkPath&) = delete;
 
     String text;
     PieceReader components;
@@ -57,14 +56,17 @@ ResTreeNode* ResTreeNode::Lookup(std::u16string_view path, ResTreeNode* document
     const ReleaseScope scope;
     ResTreeNode* node = this;
     const size_t start = FindStart(path, node, documentRoot);
+    PieceReader outermost(path.substr(start), u"/", false);
     // The paths of links that are open inside each other; the last is the innermost.
-    std::vector<std::unique_ptr<OpenPath>> open;
-    open.push_back(std::make_unique<OpenPath>(path, start));
-    size_t links = 0;
-    while (!open.empty()) {
-        PieceReader& components = open.back()->components;
+    std::vector<std::unique_ptr<LinkPath>> links;
+    size_t followed = 0;
+    while (true) {
+        PieceReader& components = links.empty() ? outermost : links.back()->components;
         if (!components.Next()) {
-            open.pop_back();
+            if (links.empty()) {
+                return node;
+            }
+            links.pop_back();
             continue;
         }
         String unescaped = String::WithoutBuffer();
@@ -78,21 +80,20 @@ ResTreeNode* ResTreeNode::Lookup(std::u16string_view path, ResTreeNode* document
         } else if (Compare(component, u".") != 0) {
             const NodeEntry* entry = node->Find(component);
             const String* link = entry == nullptr ? nullptr : entry->LinkPath();
-            if (link != nullptr) {
-                if (++links > maximalLinks) {
+            if (link == nullptr) {
+                node = entry == nullptr ? nullptr : entry->Child();
+            } else {
+                if (++followed > maximalLinks) {
                     return nullptr;
                 }
                 const size_t linkStart = FindStart(link->View(), node, nullptr);
-                open.push_back(std::make_unique<OpenPath>(link->View(), linkStart));
-            } else {
-                node = entry == nullptr ? nullptr : entry->Child();
+                links.push_back(std::make_unique<LinkPath>(link->View(), linkStart));
             }
         }
         if (node == nullptr) {
             return nullptr;
         }
     }
-    return node;
 }
 
 namespace {

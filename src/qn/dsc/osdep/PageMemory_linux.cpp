@@ -42,4 +42,8 @@ void* MapPages(size_t size, size_t alignment) {
     return pages + before;
 }
 
+void PopulatePages(void* pages, size_t size) {
+    madvise(pages, size, MADV_POPULATE_WRITE);
+}
+
 }  // namespace qn::dsc::osdep

@@ -64,6 +64,10 @@ struct PoolAllocator::Store {
             freshSpans += spanSize;
             Region* region = RegionOf(span);
             const auto offset = static_cast<size_t>(span - reinterpret_cast<char*>(region));
+            // In steps: 8 % of a run's CPU time was the faults of single pages.
+            if (offset % populateStep == 0) {
+                PopulatePages(span, populateStep);
+            }
             const size_t head = offset == 0 ? sizeof(Region) : 0;
             const size_t blockCount = (spanSize - head) / blockSize;
             // The first span of a region has no place for a block of the greatest class.

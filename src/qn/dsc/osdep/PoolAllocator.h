@@ -35,6 +35,7 @@ class PoolAllocator {
     static constexpr uint32_t spanShift = 15;
     static constexpr size_t spanSize = size_t{1} << spanShift;
     static constexpr size_t spansPerRegion = regionSize / spanSize;
+    static constexpr size_t populateStep = 8 * spanSize;
     // User addresses have 47 bits.
     static constexpr uint32_t addressBits = 47;
 
