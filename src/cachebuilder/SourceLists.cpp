@@ -1,5 +1,7 @@
 #include "cachebuilder/SourceLists.h"
 
+#include <cstring>
+
 #include "restree/ResTreeNode.h"
 #include "restree/TextList.h"
 
@@ -26,9 +28,10 @@ void AddPieces(std::u16string_view text, std::unordered_set<std::u16string>& pie
     }
 }
 
-// To the unit, unlike ==.
+// To the unit, unlike ==. By bytes, since the comparison of views of char16_t goes unit by unit, several times slower.
 bool IsSameText(const String& left, const String& right) {
-    return left.View() == right.View();
+    return left.Length() == right.Length() &&
+           std::memcmp(left.CStr(), right.CStr(), left.Length() * sizeof(char16_t)) == 0;
 }
 
 // Whether a separator behind `text` would count as escaped.
