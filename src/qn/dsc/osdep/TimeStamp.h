@@ -18,7 +18,10 @@ struct TimeStamp {
     static TimeStamp FromFileTime(uint64_t ticks);
 
     // By the seconds, then by the fraction.
-    auto operator<=>(const TimeStamp& other) const = default;
+    std::strong_ordering operator<=>(const TimeStamp& other) const {
+        return seconds != other.seconds ? seconds <=> other.seconds : fraction <=> other.fraction;
+    }
+    bool operator==(const TimeStamp& other) const = default;
 };
 
 }  // namespace qn::dsc::osdep
