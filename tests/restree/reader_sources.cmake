@@ -2,7 +2,11 @@
 set(RESTREE_READER_TESTS
   ${CMAKE_CURRENT_LIST_DIR}/ElementNodesTest.cpp
   ${CMAKE_CURRENT_LIST_DIR}/ElementValuesTest.cpp
+  ${CMAKE_CURRENT_LIST_DIR}/LinkTest.cpp
+  ${CMAKE_CURRENT_LIST_DIR}/LocalizeTextTest.cpp
   ${CMAKE_CURRENT_LIST_DIR}/NameRangeTest.cpp
   ${CMAKE_CURRENT_LIST_DIR}/NamesTest.cpp
+  ${CMAKE_CURRENT_LIST_DIR}/ParametersTest.cpp
+  ${CMAKE_CURRENT_LIST_DIR}/PrototypeTest.cpp
   ${CMAKE_CURRENT_LIST_DIR}/ReadTree.cpp
   ${CMAKE_CURRENT_LIST_DIR}/XmlValueTest.cpp)

@@ -1,0 +1,56 @@
+#include "restree/LocalizeText.h"
+
+#include <gtest/gtest.h>
+
+#include "support/ExactText.h"
+
+namespace zkhw {
+namespace {
+
+using qn::dsc::ExactText;
+using qn::dsc::String;
+
+// Without a host the language is English.
+TEST(LocalizeText, ChoosesATextAndKeepsTheList) {
+    struct Row {
+        const char16_t* list;
+        const char* chosen;
+    };
+    const Row rows[] = {
+        {u"eng=Clock,jpn=X", "Clock"},
+        {u"jpn=X,eng=Clock", "Clock"},
+        {u"ENG=Clock", "Clock"},
+        {u"eng=A,eng=B", "A"},
+        {u"plain,eng=Clock", "Clock"},
+        {u"eng,eng=Clock", "Clock"},
+        {u" eng=Clock , jpn=X", "Clock"},
+        {u"eng= Clock ", " Clock"},
+        {u"eng=", ""},
+        {u"eng=a=b", "a=b"},
+        {u"eng=a\\,b,jpn=X", "a,b"},
+        {u"eng=a\\\\,jpn=X", "a\\"},
+        {u"eng=a\\=b", "a\\=b"},
+        {u",,eng=Clock,,", "Clock"},
+        {u"eng=\u540D", "{540D}"},
+        {u"\uFF45\uFF4E\uFF47=Wide", "Wide"},
+    };
+    for (const Row& row : rows) {
+        const String list(row.list);
+        EXPECT_EQ(ExactText(LocalizeText(list)), row.chosen + std::string("{0000}") + ExactText(list));
+    }
+}
+
+TEST(LocalizeText, GivesTheListAloneIfNoTextFits) {
+    for (const char16_t* list :
+         {u"", u"Clock", u"jpn=X", u"jpn=X,chs=Y", u"eng", u"english=X", u"eng =X", u"=X", u"en=X", u" , "}) {
+        EXPECT_EQ(ExactText(LocalizeText(list)), ExactText(std::u16string_view(list)));
+    }
+}
+
+TEST(LocalizeText, KeepsANulInsideTheList) {
+    const String list(u"eng=a\0b,jpn=X", 13);
+    EXPECT_EQ(ExactText(LocalizeText(list)), "a{0000}b{0000}eng=a{0000}b,jpn=X");
+}
+
+}  // namespace
+}  // namespace zkhw

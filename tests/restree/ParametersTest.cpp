@@ -1,0 +1,316 @@
+#include "restree/Parameters.h"
+
+#include <string>
+#include <utility>
+
+#include <gtest/gtest.h>
+
+#include "restree/ReadTree.h"
+
+namespace zkhw {
+namespace {
+
+using qn::dsc::ExactText;
+
+std::string Expanded(const char16_t* text) {
+    ParameterMap values;
+    values.emplace(u"A", u"1");
+    values.emplace(u"B C", u"2");
+    values.emplace(u"Empty", u"");
+    values.emplace(u"Again", u"#{A}");
+    return ExactText(ExpandVariables(text, MapParameters(std::move(values))));
+}
+
+// --- One text ---
+
+TEST(ExpandVariables, ReplacesWhatItKnows) {
+    EXPECT_EQ(Expanded(u"#{A}"), "1");
+    EXPECT_EQ(Expanded(u"x#{A}y#{A}z"), "x1y1z");
+    EXPECT_EQ(Expanded(u"#{A}#{B C}"), "12");
+    EXPECT_EQ(Expanded(u"[#{Empty}]"), "[]");
+}
+
+TEST(ExpandVariables, IsBlindToCase) {
+    EXPECT_EQ(Expanded(u"#{a}#{b c}#{EMPTY}"), "12");
+}
+
+TEST(ExpandVariables, IgnoresWhiteSpaceInsideTheBraces) {
+    EXPECT_EQ(Expanded(u"#{ A }#{\t\r\nA\n}#{ B C }"), "112");
+    EXPECT_EQ(Expanded(u"#{B  C}"), "#{B  C}");
+}
+
+TEST(ExpandVariables, LeavesTheUnknownWithoutItsWhiteSpace) {
+    EXPECT_EQ(Expanded(u"a#{ x }b"), "a#{x}b");
+    EXPECT_EQ(Expanded(u"#{}#{ }"), "#{}#{}");
+}
+
+TEST(ExpandVariables, LeavesTheRestFromAMarkThatIsNotClosed) {
+    EXPECT_EQ(Expanded(u"#{A} #{ A"), "1 #{ A");
+    EXPECT_EQ(Expanded(u"#{"), "#{");
+    EXPECT_EQ(Expanded(u"#{ x } #{ y"), "#{x} #{ y");
+}
+
+TEST(ExpandVariables, DoesNotScanWhatItPutIn) {
+    EXPECT_EQ(Expanded(u"#{Again}"), "#{A}");
+    EXPECT_EQ(Expanded(u"#{Again}#{A}"), "#{A}1");
+}
+
+TEST(ExpandVariables, TakesTheFirstClosingBrace) {
+    EXPECT_EQ(Expanded(u"#{#{A}}"), "#{#{A}}");
+    EXPECT_EQ(Expanded(u"#{A}}"), "1}");
+    EXPECT_EQ(Expanded(u"}#{A}"), "}1");
+}
+
+TEST(ExpandVariables, LeavesWhatIsNoMark) {
+    EXPECT_EQ(Expanded(u"# {A} #A {A} # #"), "# {A} #A {A} # #");
+    EXPECT_EQ(Expanded(u"##{A}"), "#1");
+    EXPECT_EQ(Expanded(u"\\#{A}"), "\\1");
+    EXPECT_EQ(Expanded(u""), "");
+}
+
+TEST(ExpandVariables, WithoutAnyParameterTheTextStaysWithItsBlanks) {
+    EXPECT_EQ(ExactText(ExpandVariables(u"a#{ x }b", MapParameters(ParameterMap()))), "a#{ x }b");
+}
+
+// --- Texts of a document ---
+
+TEST(OpenElementParameters, AreTheAttributesOfAllOpenElements) {
+    ASSERT_TREE("<R J='j'><A K='k'><B L='l'><V M='m'>#{J}#{K}#{L}#{M}#{N}</V></B></A></R>", R"(
+R:R
+  A:A
+    B:B
+      V=jklm#{N}
+)");
+}
+
+TEST(OpenElementParameters, OutermostWins) {
+    ASSERT_TREE("<R><A Speed='out'><B Speed='in'><V Speed='own'>#{Speed}</V></B></A></R>", R"(
+R:R
+  A:A
+    B:B
+      V=out
+)");
+}
+
+TEST(OpenElementParameters, AreBlindToCase) {
+    ASSERT_TREE("<R SPEED='out'><A speed='in'><V>#{Speed}</V></A></R>", R"(
+R:R
+  A:A
+    V=out
+)");
+}
+
+TEST(OpenElementParameters, OfAttributesThatDifferOnlyInCaseTheFirstStays) {
+    ASSERT_TREE("<R k='1' K='2'><V>#{K}</V></R>", R"(
+R:R
+  V=1
+)");
+}
+
+TEST(OpenElementParameters, ClosedElementsDoNotCount) {
+    ASSERT_TREE("<R><A K='a'/><B K='b'><C L='c'/><V L2='v'>1</V></B><W>#{K}#{L}#{L2}</W></R>", R"(
+R:R
+  A=
+  B:B
+    C=
+    V=1
+  W=#{K}#{L}#{L2}
+)");
+}
+
+TEST(OpenElementParameters, KeywordsAreParametersToo) {
+    ASSERT_TREE(
+        "<R ordered='no' xml:space='s'><A type='t' next='n' replace='0'><V "
+        "localize='0'>#{ordered}#{xml:space}#{type}#{next}#{replace}#{localize}</V></A></R>",
+        R"(
+R:R
+  A:A
+    V=nostn00
+)");
+}
+
+TEST(OpenElementParameters, NameIsLeftToInstances) {
+    ASSERT_TREE("<R name='r'><A name='a'><V>#{name} #{NAME}</V></A></R>", R"(
+r:R
+  a:A
+    V=#{name} #{NAME}
+)");
+}
+
+TEST(OpenElementParameters, UnknownOnesStayWithoutTheirBlanks) {
+    ASSERT_TREE("<R><V>#{ x } #{ y</V></R>", R"(
+R:R
+  V=#{x} #{ y
+)");
+}
+
+TEST(OpenElementParameters, EmptyValueIsAValue) {
+    ASSERT_TREE("<R K=''><V>[#{K}]</V></R>", R"(
+R:R
+  V=[]
+)");
+}
+
+TEST(OpenElementParameters, ValueWithAMarkIsNotScannedAgain) {
+    ASSERT_TREE("<R K='#{L}' L='l'><V>#{K}</V></R>", R"(
+R:R
+  V=#{L}
+)");
+}
+
+TEST(OpenElementParameters, DocumentRootIsAPath) {
+    ASSERT_TREE("<R><A><V>#{document-root}|#{ Document-Root }</V></A></R>", R"(
+R:R
+  A:A
+    V=/|/
+)");
+    ASSERT_CHILD_TREE("<D name='a/b'><A><V>#{document-root}</V></A></D>", R"(
+Root:Root
+  a/b:D
+    A:A
+      V=/a\/b
+)");
+}
+
+TEST(OpenElementParameters, AttributeWinsOverTheDocumentRoot) {
+    ASSERT_TREE("<R><A Document-Root='mine'><V>#{document-root}</V></A></R>", R"(
+R:R
+  A:A
+    V=mine
+)");
+}
+
+TEST(OpenElementParameters, LoopVariableHidesTheDocumentRoot) {
+    ASSERT_TREE("<R><X names='P[document-root=1..2]'><V>#{document-root}</V></X></R>", R"(
+R:R
+  P1:X
+    V=1
+  P2:X
+    V=2
+)");
+}
+
+TEST(OpenElementParameters, ThereIsNoDocumentRootBeforeTheFirstNode) {
+    ASSERT_CHILD_TREE("<A K='k'>#{K} #{ document-root }</A>", R"(
+Root:Root
+  A=k #{document-root}
+)");
+}
+
+TEST(OpenElementParameters, WithoutAnyTheTextStaysWithItsBlanks) {
+    ASSERT_TREE("<A>#{ x }</A>", R"(
+:
+  A=#{ x }
+)");
+    ASSERT_TREE("<A K='k'>#{ x }</A>", R"(
+:
+  A=#{x}
+)");
+    ASSERT_CHILD_TREE("<A>#{ document-root }</A>", R"(
+Root:Root
+  A=#{ document-root }
+)");
+}
+
+TEST(OpenElementParameters, PreservedSpaceStaysAroundAValue) {
+    ASSERT_TREE("<R K=' k '><V xml:space='preserve'> #{K} </V><W>#{K}</W></R>", R"(
+R:R
+  V=  k  
+  W= k 
+)");
+}
+
+TEST(OpenElementParameters, TextMayAskForVeryMany) {
+    std::string attributes;
+    std::string text;
+    std::string expected;
+    for (int i = 0; i < 10000; ++i) {
+        const std::string number = std::to_string(i);
+        attributes += " a" + number + "='v" + number + "'";
+        text += "#{A" + number + "}";
+        expected += "v" + number;
+    }
+    auto root = MakeUnnamedRoot();
+    Load(*root, "<R" + attributes + "><A a5='own' b='b'><V>" + text + "#{b}#{c}</V></A></R>");
+    EXPECT_EQ(TextAt(At(*root, u"A"), u"V"), expected + "b#{c}");
+}
+
+// The first questions are answered one by one, later ones from a map.
+TEST(OpenElementParameters, ManyQuestionsGetTheSameAnswersAsFew) {
+    const std::string few = "#{K}#{name}#{i}#{document-root}#{L}";
+    std::string many;
+    std::string expected;
+    for (int i = 0; i < 10; ++i) {
+        many += few;
+        expected += "out#{name}#{i}/#{L}";
+    }
+    auto root = MakeUnnamedRoot();
+    Load(*root, "<R K='out' name='r' i='attribute'><X names='P[i=0..0]' K='in'><V>" + many + "</V></X></R>");
+    EXPECT_EQ(TextAt(At(*root, u"P0"), u"V"), expected);
+}
+
+// --- A whole tree ---
+
+TEST(ApplyParameters, ExpandsTextsAtAnyDepthAndNothingElse) {
+    auto root = MakeUnnamedRoot();
+    Load(*root,
+         "<R><T name='#{K}'/><A><V>#{K}</V><L localize='1'>eng=#{K}</L><:Link "
+         "name='#{K}l'>../#{K}</:Link><BList><V>#{K}</V><V>#{ J }</V></BList></A></R>");
+    ParameterMap values;
+    values.emplace(u"K", u"k");
+    root->ApplyParameters(MapParameters(std::move(values)));
+    EXPECT_EQ("\n" + DumpTree(*root), R"(
+R:R
+  #{K}:T
+  A:A
+    #{K}l->../#{K}
+    BList:BList ordered
+      V=k
+      V=#{J}
+    L~k{0000}eng=k
+    V=k
+)");
+}
+
+TEST(ApplyParameters, WithoutAnyLeavesTheBlanks) {
+    auto root = MakeUnnamedRoot();
+    Load(*root, "<R><V/></R>");
+    root->SetProperty(u"V", u"#{ x }");
+    root->ApplyParameters(MapParameters(ParameterMap()));
+    EXPECT_EQ(TextAt(*root, u"V"), "#{ x }");
+}
+
+TEST(ApplyParameters, InstanceHasItsNameAndItsVariable) {
+    auto root = MakeUnnamedRoot();
+    Load(*root, "<R><V>#{name} #{i} #{ j }</V></R>");
+    root->ApplyInstance(u"n", u"I", -5);
+    EXPECT_EQ(TextAt(*root, u"V"), "n -5 #{j}");
+}
+
+TEST(ApplyParameters, InstanceWithoutAVariableHasItsNameAlone) {
+    auto root = MakeUnnamedRoot();
+    Load(*root, "<R><V>#{name} #{i} #{}</V></R>");
+    root->ApplyInstance(u"n", u"", 5);
+    EXPECT_EQ(TextAt(*root, u"V"), "n #{i} #{}");
+}
+
+class ParametersOfFiles : public ResourceFiles {};
+
+TEST_F(ParametersOfFiles, DeferredContentsAreLoadedAndExpanded) {
+    Write("board.xml", "<Board><V>#{K}</V></Board>");
+    auto root = MakeUnnamedRoot();
+    Load(*root, "<R><A><S name='s'/></A></R>");
+    At(*root, u"A/s").SetProperty(u":DeferredLoadPath", u"board.xml");
+    ParameterMap values;
+    values.emplace(u"K", u"k");
+    root->ApplyParameters(MapParameters(std::move(values)));
+    EXPECT_EQ("\n" + DumpTree(*root), R"(
+R:R
+  A:A
+    s:S
+      V=k
+)");
+}
+
+}  // namespace
+}  // namespace zkhw
