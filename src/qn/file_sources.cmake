@@ -2,6 +2,7 @@
 target_sources(zkfpga PRIVATE
   ${CMAKE_CURRENT_LIST_DIR}/dsc/osdep/BinaryFile.cpp
   ${CMAKE_CURRENT_LIST_DIR}/dsc/osdep/CommandLine_linux.cpp
+  ${CMAKE_CURRENT_LIST_DIR}/dsc/osdep/CopyDirectoryTree.cpp
   ${CMAKE_CURRENT_LIST_DIR}/dsc/osdep/FileFinder.cpp
   ${CMAKE_CURRENT_LIST_DIR}/dsc/osdep/FileSystem.cpp
   ${CMAKE_CURRENT_LIST_DIR}/dsc/osdep/FileSystem_linux.cpp
@@ -13,4 +14,5 @@ target_sources(zkfpga PRIVATE
   ${CMAKE_CURRENT_LIST_DIR}/dsc/osdep/TextStream.cpp
   ${CMAKE_CURRENT_LIST_DIR}/dsc/osdep/TimeStamp.cpp
   ${CMAKE_CURRENT_LIST_DIR}/dsc/osdep/_GetExeFullPath.cpp
-  ${CMAKE_CURRENT_LIST_DIR}/dsc/osdep/path.cpp)
+  ${CMAKE_CURRENT_LIST_DIR}/dsc/osdep/path.cpp
+  ${CMAKE_CURRENT_LIST_DIR}/dsc/osdep/path_disk.cpp)

@@ -1,0 +1,140 @@
+#include <cerrno>
+#include <new>
+#include <string_view>
+#include <vector>
+
+#include "qn/dsc/exception/Exception.h"
+#include "qn/dsc/osdep/BinaryFile.h"
+#include "qn/dsc/osdep/Compare.h"
+#include "qn/dsc/osdep/FileSystem.h"
+#include "qn/dsc/osdep/path.h"
+
+namespace qn::dsc::osdep {
+
+namespace {
+
+using exception::ThrowAt;
+
+constexpr char module[] = "qn/dsc/osdep/path";
+constexpr char16_t separator = u'\\';
+
+bool ReadIsDirectory(const String& path) {
+    FileAttributes attributes;
+    return IsAbsolutePath(path) && GetFileSystem().ReadAttributes(path, attributes) == 0 && attributes.isDirectory;
+}
+
+// The folders that an absolute path asks for, from the top, as lengths of its start. Ends before a name that ends in
+// "."; `isSound` is then false.
+std::vector<uint32_t> LevelsOf(std::u16string_view path, bool& isSound) {
+    std::vector<uint32_t> levels;
+    size_t start = path.find(u':') + 2;
+    if (path[0] == separator) {
+        const size_t serverEnd = path.find(separator, 2);
+        if (serverEnd == std::u16string_view::npos) {
+            ThrowAt(exception::InvalidArgument(), module, __LINE__);
+        }
+        start = serverEnd + 1;
+    } else {
+        levels.push_back(static_cast<uint32_t>(start));
+    }
+    isSound = true;
+    for (size_t end = path.find(separator, start); end != std::u16string_view::npos;
+         end = path.find(separator, start)) {
+        if (end > start && path[end - 1] == u'.') {
+            isSound = false;
+            break;
+        }
+        if (end > start) {
+            levels.push_back(static_cast<uint32_t>(end));
+        }
+        start = end + 1;
+    }
+    return levels;
+}
+
+}  // namespace
+
+String GetCurrentDirectoryPath() {
+    String path;
+    return GetFileSystem().ReadWorkingFolder(path) == 0 ? path : String();
+}
+
+bool IsDirectory(const String& path) noexcept {
+    try {
+        return ReadIsDirectory(path);
+    } catch (const std::bad_alloc&) {
+        return false;
+    }
+}
+
+bool IsExistingFile(const String& path) {
+    if (!IsAbsolutePath(path)) {
+        ThrowAt(exception::InvalidArgument(), module, __LINE__);
+    }
+    FileAttributes attributes;
+    return GetFileSystem().ReadAttributes(path, attributes) == 0 && !attributes.isDirectory;
+}
+
+TimeStamp GetFileModificationTime(const String& path) {
+    FileAttributes attributes;
+    return GetFileSystem().ReadAttributes(path, attributes) == 0 ? TimeStamp::FromFileTime(attributes.lastWriteTime)
+                                                                 : TimeStamp();
+}
+
+void CopyFileTo(const String& source, const String& destination, bool overwrite) {
+    if (!IsAbsolutePath(source) || !IsAbsolutePath(destination)) {
+        ThrowAt(exception::InvalidArgument(), module, __LINE__);
+    }
+    if (!overwrite && IsExistingFile(destination)) {
+        ThrowAt(exception::FileAlreadyExists(), module, __LINE__);
+    }
+    if (Equal(source.View(), destination.View())) {
+        return;
+    }
+    BinaryFile from(source, BinaryMode::Read);
+    BinaryFile to(destination,
+                  BinaryMode::Create | BinaryMode::ReadWrite | (overwrite ? BinaryMode::Truncate : uint32_t{0}));
+    char block[4096];
+    int32_t got = from.Read(block, sizeof block);
+    while (got > 0) {
+        if (to.Write(block, static_cast<uint32_t>(got)) < got) {
+            ThrowAt(exception::FileWriteFailed(), module, __LINE__);
+        }
+        got = from.Read(block, sizeof block);
+    }
+    if (got < 0) {
+        ThrowAt(exception::FileReadFailed(), module, __LINE__);
+    }
+}
+
+void CreateDirectoryPath(const String& path) {
+    if (!IsAbsolutePath(path)) {
+        ThrowAt(exception::InvalidArgument(), module, __LINE__);
+    }
+    bool isSound = true;
+    const std::vector<uint32_t> levels = LevelsOf(path.View(), isSound);
+    // A folder that stands has all above it standing, so the first missing one is found from below, in one step for
+    // a new folder in an old one.
+    size_t missing = levels.size();
+    while (missing > 0 && !IsDirectory(path.Substring(0, levels[missing - 1]))) {
+        --missing;
+    }
+    for (; missing < levels.size(); ++missing) {
+        CreateOneDirectory(path.Substring(0, levels[missing]));
+    }
+    if (!isSound) {
+        ThrowAt(exception::InvalidArgument(), module, __LINE__);
+    }
+}
+
+void CreateOneDirectory(const String& path) {
+    const int error = GetFileSystem().MakeFolder(path);
+    if (error == EEXIST) {
+        ThrowAt(exception::ObjectAlreadyExists(), module, __LINE__);
+    }
+    if (error != 0) {
+        ThrowAt(exception::AccessDenied(path), module, __LINE__);
+    }
+}
+
+}  // namespace qn::dsc::osdep
