@@ -224,6 +224,7 @@ void ElementReader::MakeOrdinaryValue(String&& text, bool isReferenceList) {
 void ElementReader::StoreText(String&& text, EntryKind kind) {
     const ResTreeNode::Added added = node.AddTextEntry(frame.pendingName.Wide(), std::move(text), kind, Before());
     frame.position = added.entry;
+    // NOLINTNEXTLINE(bugprone-use-after-move): the text was taken only if an entry was made.
     if (!added.isNew && frame.mergeExisting && node.SetEntryText(added.entry, std::move(text)) &&
         kind == LocalizedTextEntry) {
         added.entry->SetTextKind(LocalizedTextEntry);
@@ -246,6 +247,7 @@ void ElementReader::MakeLink(String&& entryName, const String& text) {
     const ResTreeNode::Added added = node.AddLinkEntry(std::move(entryName), std::move(path), Before());
     frame.position = added.entry;
     if (!added.isNew && frame.mergeExisting) {
+        // NOLINTNEXTLINE(bugprone-use-after-move): the path was taken only if an entry was made.
         node.SetEntryText(added.entry, std::move(path));
     }
 }

@@ -43,7 +43,7 @@ ResTreeNode* NodeEntry::TakeChild() {
 
 void NodeEntry::ReleaseText() {
     kind = EmptyEntry;
-    static_cast<TextShape*>(this)->text.Erase(0, String::npos, 0);
+    static_cast<TextShape*>(this)->text.Erase(0, String::npos, false);
 }
 
 }  // namespace zkhw

@@ -80,6 +80,7 @@ class StringBase {
         other.capacityEnd = nullptr;
     }
 
+    // NOLINTNEXTLINE(bugprone-unhandled-self-assignment): the own text may be assigned, whole or in part.
     StringBase& operator=(const StringBase& other) {
         AssignUnits(other.begin, other.Size());
         return *this;

@@ -9,6 +9,7 @@ TimeStamp TimeStamp::FromFileTime(uint64_t ticks) {
     constexpr int64_t ticksPerSecond = 10000000;
     const auto ticksSince1904 = static_cast<int64_t>(ticks - ticksTo1904);
     const int64_t wholeSeconds = ticksSince1904 / ticksPerSecond;
+    // NOLINTNEXTLINE(bugprone-integer-division): the whole seconds, taken through double precision.
     const auto seconds = static_cast<int64_t>(static_cast<double>(wholeSeconds));
     const double part = static_cast<double>(ticksSince1904 % ticksPerSecond) / static_cast<double>(ticksPerSecond);
     const auto fraction = static_cast<uint64_t>(std::ldexp(std::fabs(part), 64));

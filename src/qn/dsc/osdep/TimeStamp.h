@@ -19,6 +19,7 @@ struct TimeStamp {
 
     // By the seconds, then by the fraction.
     std::strong_ordering operator<=>(const TimeStamp& other) const {
+        // NOLINTNEXTLINE(modernize-use-nullptr): clang-tidy takes the 0 of the rewritten comparison for a pointer.
         return seconds != other.seconds ? seconds <=> other.seconds : fraction <=> other.fraction;
     }
     bool operator==(const TimeStamp& other) const = default;
