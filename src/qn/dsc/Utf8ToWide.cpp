@@ -208,6 +208,11 @@ bool StringBase<char16_t>::TryFromUtf8(const char* bytes, uint32_t length, Strin
 template <>
 String StringBase<char16_t>::FromUtf8(const char* bytes, uint32_t length) {
     String text = WithoutBuffer();
+    if (bytes != nullptr && IsAscii(bytes, length)) [[likely]] {
+        text.SetFull(AllocateUnits(length), length);
+        WidenAscii(bytes, length, text.begin);
+        return text;
+    }
     if (!TryFromUtf8(bytes, length, text)) {
         exception::ThrowAt(exception::InvalidSequence(), moduleName, __LINE__);
     }

@@ -4,10 +4,12 @@
 
 #include <cerrno>
 #include <cstring>
+#include <new>
 #include <string>
 #include <thread>
 
 #include "qn/dsc/osdep/SystemError.h"
+#include "support/AllocationFaultScope.h"
 
 namespace qn::dsc::osdep {
 namespace {
@@ -134,6 +136,18 @@ TEST(WinError, IsCaughtAsAnExceptionOfTheSystem) {
         EXPECT_EQ(failure.GetErrorCode(), 1);
         EXPECT_EQ(failure.GetLine(), 10);
     }
+}
+
+TEST(WinError, WithoutMemoryIsABadAllocation) {
+    SetLastSystemError(2);
+    const support::AllocationFaultScope fault(1, true);
+    EXPECT_THROW(WinError(), std::bad_alloc);
+}
+
+TEST(PosixError, WithoutMemoryIsABadAllocation) {
+    errno = ENOENT;
+    const support::AllocationFaultScope fault(1, true);
+    EXPECT_THROW(PosixError(), std::bad_alloc);
 }
 
 TEST(PosixError, HasTheTextOfErrno) {
