@@ -45,10 +45,11 @@ void StringBase<Unit>::ReplaceBuffer(Unit* block, size_t count) {
 }
 
 template <typename Unit>
-void StringBase<Unit>::AssignUnits(const Unit* text, size_t count) {
+void StringBase<Unit>::AssignUnits(const Unit* text, size_t length) {
     if (text == begin && text != nullptr) {
         return;
     }
+    const size_t count = text == nullptr ? 0 : length;
     if (!KeepsBuffer(count)) {
         // A new block and not a reallocation: the old content needs no copy, and `text` may be a part of it.
         Unit* block = AllocateUnits(count);

@@ -129,7 +129,7 @@ class StringBase {
     // Replaces the text. The buffer stays if it is large enough and at least half of it will be filled; otherwise one
     // of the exact size takes its place. A null `text` is the empty text. A `text` that is this string's own CStr()
     // changes nothing, whatever the length; any other part of the own text may be assigned.
-    void Assign(const Unit* text, uint32_t length) { AssignUnits(text, text == nullptr ? 0 : length); }
+    void Assign(const Unit* text, uint32_t length) { AssignUnits(text, length); }
     void Assign(const Unit* text);
     void Assign(const StringBase& text) { AssignUnits(text.begin, text.Size()); }
     void Assign(UnitView text);
@@ -276,7 +276,7 @@ class StringBase {
         }
     }
 
-    void AssignUnits(const Unit* text, size_t count);
+    void AssignUnits(const Unit* text, size_t length);
     void AppendGrowing(UnitView text);
     void Grow(size_t count);
     void ReplaceBuffer(Unit* block, size_t count);

@@ -165,7 +165,7 @@ TEST(StringBase, AMovedFromStringMayBeAssigned) {
 TEST(StringBase, AMovedFromStringGetsABufferForTheEmptyText) {
     String text(u"first");
     const String taken(std::move(text));
-    text.Assign(nullptr, 0);
+    text.Assign(nullptr, 0);  // NOLINT(bugprone-use-after-move): the state after a move is the point.
     ASSERT_NE(text.CStr(), nullptr);
     EXPECT_EQ(*text.CStr(), u'\0');
     EXPECT_EQ(text.Length(), 0U);
@@ -174,7 +174,7 @@ TEST(StringBase, AMovedFromStringGetsABufferForTheEmptyText) {
 TEST(StringBase, AMovedFromStringMayBeSwapped) {
     String text(u"first");
     String taken(std::move(text));
-    text.Swap(taken);
+    text.Swap(taken);  // NOLINT(bugprone-use-after-move): the state after a move is the point.
     EXPECT_EQ(Units(text), u"first");
 }
 
