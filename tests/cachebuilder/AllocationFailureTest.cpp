@@ -63,7 +63,7 @@ void FailEachInTurn(bool fromThenOn) {
                     outcome == "failed copy")
             << "allocation " << nth << ": " << outcome;
         ASSERT_TRUE(wasReached) << "allocation " << nth;
-        failures += outcome == "0" ? 0 : 1;
+        failures += outcome == "0" ? 0U : 1U;
         ASSERT_EQ(installation.files.OpenFiles(), 0) << "allocation " << nth;
         ASSERT_EQ(installation.files.OpenSearches(), 0) << "allocation " << nth;
     }
@@ -87,7 +87,7 @@ TEST(ToolOutOfMemory, GivesOutOfMemoryWhenTheRootCannotBeAllocated) {
     uint64_t found = 0;
     for (uint64_t nth = 1; nth <= total && nth <= 100; ++nth) {
         const AllocationFaultScope fault(nth);
-        found += OutcomeOf(installation) == "out of memory" ? 1 : 0;
+        found += OutcomeOf(installation) == "out of memory" ? 1U : 0U;
     }
     EXPECT_EQ(found, 1U);
 }
