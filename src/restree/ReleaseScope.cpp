@@ -10,55 +10,72 @@ namespace zkhw {
 namespace {
 
 struct Kept {
-    uint32_t depth = 0;
     std::vector<ResTreeNode*> nodes;
     std::vector<NodeEntry*> entries;
 };
 
-thread_local Kept kept;
+constinit thread_local uint32_t depth = 0;
+
+// Null while nothing is kept. Neither is destroyed at the end of a thread: the tree of the process is taken down when
+// that of the main thread is over.
+constinit thread_local Kept* kept = nullptr;
+
+// Releasing a node may call an observer, which may remove more.
+void ReleaseKept(void (*release)(ResTreeNode*)) {
+    while (!(kept->nodes.empty() && kept->entries.empty())) {
+        if (!kept->nodes.empty()) {
+            ResTreeNode* node = kept->nodes.back();
+            kept->nodes.pop_back();
+            release(node);
+        } else {
+            NodeEntry* entry = kept->entries.back();
+            kept->entries.pop_back();
+            NodeEntry::Release(entry);
+        }
+    }
+}
 
 }  // namespace
 
 ReleaseScope::ReleaseScope() noexcept {
-    ++kept.depth;
+    ++depth;
 }
 
 ReleaseScope::~ReleaseScope() {
-    // The last scope stands until all is released: releasing a node may call an observer, which may remove more.
-    while (kept.depth == 1 && !(kept.nodes.empty() && kept.entries.empty())) {
-        if (!kept.nodes.empty()) {
-            ResTreeNode* node = kept.nodes.back();
-            kept.nodes.pop_back();
+    // The last scope stands until all is released.
+    if (depth == 1 && kept != nullptr) {
+        ReleaseKept([](ResTreeNode* node) {
             node->parent = nullptr;
             delete node;
-        } else {
-            NodeEntry* entry = kept.entries.back();
-            kept.entries.pop_back();
-            NodeEntry::Release(entry);
-        }
+        });
+        delete kept;
+        kept = nullptr;
     }
-    --kept.depth;
+    --depth;
 }
 
 bool ReleaseScope::IsActive() noexcept {
-    return kept.depth != 0;
+    return depth != 0;
 }
 
 void ReleaseScope::Reserve() {
-    if (kept.nodes.size() == kept.nodes.capacity()) {
-        kept.nodes.reserve(kept.nodes.size() * 2 + 8);
+    if (kept == nullptr) {
+        kept = new Kept;
     }
-    if (kept.entries.size() == kept.entries.capacity()) {
-        kept.entries.reserve(kept.entries.size() * 2 + 8);
+    if (kept->nodes.size() == kept->nodes.capacity()) {
+        kept->nodes.reserve(kept->nodes.size() * 2 + 8);
+    }
+    if (kept->entries.size() == kept->entries.capacity()) {
+        kept->entries.reserve(kept->entries.size() * 2 + 8);
     }
 }
 
 void ReleaseScope::Keep(ResTreeNode* node) noexcept {
-    kept.nodes.push_back(node);
+    kept->nodes.push_back(node);
 }
 
 void ReleaseScope::Keep(NodeEntry* entry) noexcept {
-    kept.entries.push_back(entry);
+    kept->entries.push_back(entry);
 }
 
 }  // namespace zkhw

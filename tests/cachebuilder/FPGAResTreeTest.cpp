@@ -222,6 +222,9 @@ TEST(FPGAResTreeSingleton, IsMadeOnce) {
 TEST(FPGAResTreeSingletonDeathTest, TakesItsTreeDownAtExit) {
     const Installation installation;
     installation.Write("x_resource.xml", "<Target name=\"X\"><Sub><K>v</K></Sub></Target>");
+    // The second file removes what the first one made.
+    installation.Write("y_resource.xml", "<Some><A name=\"Same\"><K>v</K></A></Some>");
+    installation.Write("z_resource.xml", "<Some><B name=\"Same\"><K>v</K></B></Some>");
     struct Farewell : ResTreeNodeChangeObserver {
         ~Farewell() override { std::fputs("gone", stderr); }
         void OnNodeChanged(ResTreeNode*, uint32_t, int32_t) override {}
