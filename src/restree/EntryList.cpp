@@ -79,6 +79,25 @@ EntryPosition EntryList::Locate(const NodeEntry* entry) const {
     return {0, static_cast<uint32_t>(std::find(items, items + count, entry) - items)};
 }
 
+bool EntryList::IsValid(EntryPosition position) const {
+    return isLong ? longForm->pieces.IsValid(position) : !position.IsEnd() && position.slot < count;
+}
+
+EntryPosition EntryList::Following(EntryPosition position, const NodeEntry* entry) const {
+    const bool isValid = IsValid(position);
+    if (isValid && At(position) == entry) {
+        return Next(position);
+    }
+    if (isLong) {
+        if (entry->piece != nullptr) {
+            return Next(Locate(entry));
+        }
+    } else if (const EntryPosition place = Locate(entry); place.slot < count) {
+        return Next(place);
+    }
+    return isValid ? position : EntryPosition{};
+}
+
 NodeEntry* EntryList::Find(std::u16string_view key) const {
     if (!ordered) {
         return FindPlace(key).entry;
@@ -170,11 +189,7 @@ EntryPosition EntryList::Insert(EntryPosition position, NodeEntry* entry) {
     const bool atEnd = position.IsEnd();
     const EntryPosition place = longForm->pieces.Insert(position, entry);
     if (longForm->index) {
-        try {
-            longForm->index->Add(entry, atEnd);
-        } catch (...) {
-            longForm->index.reset();  // It is built anew when next asked for.
-        }
+        AddToIndex(entry, atEnd);
     }
     ++count;
     return place;
@@ -198,8 +213,22 @@ EntryPosition EntryList::Detach(EntryPosition position) noexcept {
 }
 
 void EntryList::AssignKey(NodeEntry* entry, String&& key) noexcept {
-    DropIndex();
+    const bool isIndexed = isLong && longForm->index;
+    if (isIndexed) {
+        longForm->index->Remove(entry);
+    }
     entry->key.Swap(key);
+    if (isIndexed) {
+        AddToIndex(entry, false);
+    }
+}
+
+void EntryList::AddToIndex(NodeEntry* entry, bool atEnd) noexcept {
+    try {
+        longForm->index->Add(entry, atEnd);
+    } catch (...) {
+        longForm->index.reset();  // It is built anew when next asked for.
+    }
 }
 
 void EntryList::DropIndex() noexcept {

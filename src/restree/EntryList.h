@@ -49,6 +49,11 @@ class EntryList {
     // Where an entry of this list stands.
     EntryPosition Locate(const NodeEntry* entry) const;
 
+    // The position behind `entry`, which stood at `position` before the list may have changed. If the entry has left
+    // the list, what has moved up to its position; the end if there is nothing. Linear in the length of one piece
+    // where the list did change.
+    EntryPosition Following(EntryPosition position, const NodeEntry* entry) const;
+
     // The entry with this key, the first one in an ordered list; null if there is none. Throws bad_alloc when the
     // index of a long ordered list can't be built.
     NodeEntry* Find(std::u16string_view key) const;
@@ -67,7 +72,7 @@ class EntryList {
     // Takes an entry out without releasing it; gives the position of the one that followed it.
     EntryPosition Detach(EntryPosition position) noexcept;
 
-    // Swaps the key of an entry of an ordered list, or of one that has been taken out, for `key`.
+    // Swaps the key of an entry of an ordered list, or of one that has been taken out of a sorted list, for `key`.
     void AssignKey(NodeEntry* entry, String&& key) noexcept;
 
     // Forgets the index of the keys. Worth doing ahead of a removal of very many entries.
@@ -81,8 +86,10 @@ class EntryList {
 
     EntryPosition NextInPieces(EntryPosition position) const;
     NodeEntry* AtInPieces(EntryPosition position) const;
+    bool IsValid(EntryPosition position) const;
     NodeEntry* FindInIndex(std::u16string_view key) const;
     void InsertInArray(uint32_t slot, NodeEntry* entry);
+    void AddToIndex(NodeEntry* entry, bool atEnd) noexcept;
     void MakeLong();
     void ReleaseContainer() noexcept;
 

@@ -43,6 +43,9 @@ class EntryPieces {
     EntryPosition Last() const;
     EntryPosition Next(EntryPosition position) const;
     NodeEntry* At(EntryPosition position) const { return pieces[position.piece]->items[position.slot]; }
+    bool IsValid(EntryPosition position) const {
+        return position.piece < pieces.size() && position.slot < pieces[position.piece]->count;
+    }
 
     // Position to index and back: a walk over the pieces, not over the entries. An index behind the last is the end.
     uint32_t IndexOf(EntryPosition position) const;

@@ -1,0 +1,3 @@
+# The node and its entries.
+set(RESTREE_TREE_TESTS
+  ${CMAKE_CURRENT_LIST_DIR}/EntryListTest.cpp)
