@@ -16,7 +16,8 @@ struct ResTreeNode::MergeWalk {
     struct Level {
         ResTreeNode* target;
         ResTreeNode* source;
-        EntryPosition next;
+        EntryPosition position;
+        const NodeEntry* entry = nullptr;  // At `position`; null before the first.
         // Paths of the two, made for the first link.
         String sourcePath = String::WithoutBuffer();
         String targetPath = String::WithoutBuffer();
@@ -30,7 +31,7 @@ struct ResTreeNode::MergeWalk {
     void Run();
     void Enter(ResTreeNode& target, ResTreeNode& source) {
         if (&target != &source) {
-            levels.push_back({&target, &source, source.entries.Begin()});
+            levels.push_back({&target, &source, {}});
         }
     }
     void MergeText(ResTreeNode& target, const NodeEntry& entry);
@@ -45,12 +46,17 @@ struct ResTreeNode::MergeWalk {
 void ResTreeNode::MergeWalk::Run() {
     while (!levels.empty()) {
         Level& level = levels.back();
-        if (level.next.IsEnd()) {
+        // What was done for the last entry may have changed the source: observers do, and a source that stands below
+        // the target can be replaced or filled by the merge itself.
+        const EntryList& sourceEntries = level.source->entries;
+        level.position =
+            level.entry == nullptr ? sourceEntries.Begin() : sourceEntries.Following(level.position, level.entry);
+        if (level.position.IsEnd()) {
             levels.pop_back();
             continue;
         }
-        const NodeEntry& entry = *level.source->entries.At(level.next);
-        level.next = level.source->entries.Next(level.next);
+        level.entry = sourceEntries.At(level.position);
+        const NodeEntry& entry = *level.entry;
         if (entry.IsText()) {
             MergeText(*level.target, entry);
         } else if (entry.LinkPath() != nullptr) {

@@ -1,3 +1,4 @@
 # The node and its entries.
 set(RESTREE_TREE_TESTS
-  ${CMAKE_CURRENT_LIST_DIR}/EntryListTest.cpp)
+  ${CMAKE_CURRENT_LIST_DIR}/EntryListTest.cpp
+  ${CMAKE_CURRENT_LIST_DIR}/ResTreeNodeCopyTest.cpp)
