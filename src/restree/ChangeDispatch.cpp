@@ -21,9 +21,19 @@ void ChangeDispatch::Run(ResTreeNode& node, uint32_t mask) {
     }
 }
 
+ChangeDispatch::~ChangeDispatch() {
+    for (; !steps.empty(); steps.pop_back()) {
+        const Step& step = steps.back();
+        if (step.raised == 0 && step.node->attachments) {
+            step.node->attachments->dispatch = step.outer;
+        }
+    }
+}
+
 void ChangeDispatch::Open(ResTreeNode& node, uint32_t mask) {
-    steps.push_back({&node, 0, mask, 0, 0, 0, false});
+    steps.push_back({&node, 0, mask, 0, 0, 0, false, nullptr});
     if (node.attachments) {
+        steps.back().outer = node.attachments->dispatch;
         node.attachments->dispatch = this;
     }
     BeginPass(steps.back());
@@ -47,7 +57,8 @@ bool ChangeDispatch::EndPass(Step& step) const {
     ResTreeNode& node = *step.node;
     if (step.delivered != 0) {
         step.saved &= ~step.delivered;
-        if (node.attachments) {
+        // Not while an outer run goes through the same records: it does the sweep.
+        if (node.attachments && step.outer == nullptr) {
             auto& observers = node.attachments->observers;
             const auto removed = std::remove_if(observers.begin(), observers.end(), [](const ObserverRecord& record) {
                 return record.state == ObserverRecord::Removed;
@@ -62,13 +73,13 @@ bool ChangeDispatch::EndPass(Step& step) const {
     node.pendingChanges = static_cast<uint16_t>(node.pendingChanges | step.saved);
     node.suspendCount = step.wasSuspended ? 1 : 0;
     if (node.attachments) {
-        node.attachments->notifying = false;
+        node.attachments->notifying = step.outer != nullptr;
     }
     if (node.suspendCount == 0 && (node.pendingChanges & step.mask) != 0) {
         return false;
     }
     if (node.attachments) {
-        node.attachments->dispatch = nullptr;
+        node.attachments->dispatch = step.outer;
     }
     return true;
 }
@@ -113,10 +124,10 @@ void ChangeDispatch::Advance() {
         }
         // A watching node hears in two turns, names first: the top of the stack is next.
         if ((delivered & ReservationChanged) != 0) {
-            steps.push_back({record.chained, ReservationChanged, 0, 0, 0, 0, false});
+            steps.push_back({record.chained, ReservationChanged, 0, 0, 0, 0, false, nullptr});
         }
         if ((delivered & nameChanges) != 0) {
-            steps.push_back({record.chained, delivered & nameChanges, 0, 0, 0, 0, false});
+            steps.push_back({record.chained, delivered & nameChanges, 0, 0, 0, 0, false, nullptr});
         }
         return;
     }

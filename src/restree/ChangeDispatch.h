@@ -28,16 +28,22 @@ class ChangeDispatch {
         uint32_t delivered;  // What the pass delivers.
         size_t next;         // The record to call next.
         bool wasSuspended;
+        const ChangeDispatch* outer;  // The run that had the node open already: an observer has asked for this one.
     };
 
     ChangeDispatch() = default;
+    // If an observer throws, nodes are still open. They stay held back, but this run no longer has them.
+    ~ChangeDispatch();
+    ChangeDispatch(const ChangeDispatch&) = delete;
+    ChangeDispatch& operator=(const ChangeDispatch&) = delete;
+
     void Open(ResTreeNode& node, uint32_t mask);
     static void BeginPass(Step& step);
     bool EndPass(Step& step) const;
     void RaiseInTurn(ResTreeNode& node, uint32_t changes);
     void Advance();
 
-    const ReleaseScope scope;
+    const ReleaseScope scope;  // Outlives the steps.
     std::vector<Step> steps;
 };
 

@@ -288,7 +288,10 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     void FinishRemoval(NodeEntry* entry);
     std::vector<NodeEntry*> ChildEntriesInRemovalOrder() const;
     void RetireDescendants();
+    bool StillHolds(const NodeEntry* entry) const;
     void TearDown() noexcept;
+    void ReleaseLostEntries();
+    void ReleaseObservers();
     static void ReleaseNode(ResTreeNode* node) noexcept;
     static void DestroySubtree(ResTreeNode* top) noexcept;
 
@@ -303,6 +306,7 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
 
     int32_t LoadIncludedFile(const NarrowString& path, bool asChild, ResTreeNode** node, const LoadChain& includer);
     int32_t LoadFile(const NarrowString& path, bool asChild, ResTreeNode** node, const LoadChain& chain);
+    void TakeOrder(bool ordered);
     bool TakeDeferredPaths(std::vector<String>& paths);
 
     String name;

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <atomic>
+#include <typeinfo>
 #include <unordered_set>
 
 #include "restree/ChangeDispatch.h"
@@ -20,6 +21,12 @@ constexpr int32_t dependantContext = 2;  // The watching node reserves this one 
 constexpr uint32_t ancestorMask = NodeNameChanged | AncestorChanged;
 
 std::atomic<size_t> observerCount = 0;
+
+// The observer if it is a node and nothing more, so that what it does with a notice is known; else null.
+ResTreeNode* AsPlainNode(ResTreeNodeChangeObserver* observer) {
+    return observer != nullptr && typeid(*observer) == typeid(ResTreeNode) ? static_cast<ResTreeNode*>(observer)
+                                                                           : nullptr;
+}
 
 bool IsMatch(const ObserverRecord& record, const ResTreeNodeChangeObserver* observer, int32_t context) {
     return record.observer == observer && (context == anyContext || record.context == context);
@@ -101,7 +108,9 @@ bool ResTreeNode::Register(ResTreeNodeChangeObserver* observer, uint32_t mask, i
             return false;
         }
     }
-    own.observers.reserve(own.observers.size() + 1);
+    if (own.observers.size() == own.observers.capacity()) {
+        own.observers.reserve(own.observers.size() * 2 + 1);
+    }
     if (chained != nullptr) {
         chained->GetAttachments().watched.push_back(this);
     }
@@ -127,6 +136,7 @@ bool ResTreeNode::Unregister(ResTreeNodeChangeObserver* observer, int32_t contex
     if (found->chained != nullptr) {
         auto& watched = found->chained->attachments->watched;
         watched.erase(std::find(watched.begin(), watched.end(), this));
+        found->chained = nullptr;  // The node may be gone before the record is.
     }
     if (attachments->notifying) {
         found->state = ObserverRecord::Removed;
@@ -207,7 +217,10 @@ bool ResTreeNode::RemoveRecords(ResTreeNode& node, ResTreeNodeChangeObserver* ob
 }
 
 bool ResTreeNode::AddObserver(ResTreeNodeChangeObserver* observer, uint32_t mask, int32_t context) {
-    bool anyNew = Register(observer, mask, context, nullptr);
+    if (isDefunct) {
+        return false;
+    }
+    bool anyNew = Register(observer, mask, context, AsPlainNode(observer));
     if ((mask & AncestorChanged) != 0) {
         anyNew |= WatchAncestors();
     }

@@ -6,6 +6,7 @@
 
 #include <algorithm>
 #include <optional>
+#include <unordered_set>
 #include <utility>
 #include <vector>
 
@@ -38,24 +39,52 @@ void ResTreeNode::TearDown() noexcept {
     }
     isDefunct = true;
     if (attachments) {
-        for (NodeEntry* entry : attachments->lostEntries) {
-            if (entry->Child() != nullptr) {
-                delete entry->TakeChild();
-            }
-            NodeEntry::Release(entry);
-        }
-        const std::vector<ObserverRecord> observers = std::move(attachments->observers);
-        ObserverCount::Subtract(observers.size());
-        for (const ObserverRecord& record : observers) {
-            if (record.chained != nullptr) {
-                std::erase(record.chained->attachments->watched, this);
-            } else if (record.state != ObserverRecord::Removed && record.observer->DeleteWithNode()) {
-                delete record.observer;
-            }
-        }
+        ReleaseLostEntries();
+        ReleaseObservers();
         attachments.reset();
     }
     parent = nullptr;
+}
+
+void ResTreeNode::ReleaseLostEntries() {
+    std::optional<ReleaseScope> scope;
+    if (!ObserverCount::IsZero()) {
+        scope.emplace();
+    }
+    for (NodeEntry* entry : std::exchange(attachments->lostEntries, {})) {
+        if (entry->Child() != nullptr) {
+            ResTreeNode* child = entry->TakeChild();
+            if (ReleaseScope::IsActive()) {
+                // Destroyed when the scope ends, so that nodes lost inside each other need no stack.
+                child->parent = nullptr;
+                ReleaseScope::Reserve();
+                ReleaseScope::Keep(child);
+            } else {
+                DestroySubtree(child);
+            }
+        }
+        NodeEntry::Release(entry);
+    }
+}
+
+void ResTreeNode::ReleaseObservers() {
+    std::vector<ObserverRecord>& observers = attachments->observers;
+    std::unordered_set<const ResTreeNodeChangeObserver*> deleted;
+    // An observer that dies here may take itself or others off the list: their records are only marked then.
+    attachments->notifying = true;
+    for (size_t i = 0; i < observers.size(); ++i) {
+        const ObserverRecord record = observers[i];
+        if (record.state == ObserverRecord::Removed || deleted.count(record.observer) != 0) {
+            continue;
+        }
+        if (record.chained != nullptr) {
+            std::erase(record.chained->attachments->watched, this);
+        } else if (record.observer != nullptr && record.observer->DeleteWithNode()) {
+            deleted.insert(record.observer);
+            delete record.observer;
+        }
+    }
+    ObserverCount::Subtract(observers.size());
 }
 
 // Destroys a subtree that nobody observes. The nodes still to come are threaded through their parent pointers.
@@ -70,6 +99,15 @@ void ResTreeNode::DestroySubtree(ResTreeNode* top) noexcept {
                 ResTreeNode* child = entry->TakeChild();
                 child->parent = pending;
                 pending = child;
+            }
+        }
+        if (node->attachments) {
+            for (NodeEntry* entry : node->attachments->lostEntries) {
+                if (entry->Child() != nullptr) {
+                    ResTreeNode* child = entry->TakeChild();
+                    child->parent = pending;
+                    pending = child;
+                }
             }
         }
         node->parent = nullptr;
@@ -110,9 +148,18 @@ void ResTreeNode::RemoveEntry(NodeEntry* entry) {
     child->Raise(NodeDeleting);
     child->RetireDescendants();
     child->Raise(NodeDeleted);
-    if (entry->Kind() != EmptyEntry) {
+    if (StillHolds(entry)) {
         FinishRemoval(entry);
     }
+}
+
+// False if an observer has removed the entry meanwhile, or lost it by renaming it over another one.
+bool ResTreeNode::StillHolds(const NodeEntry* entry) const {
+    if (entry->Kind() == EmptyEntry) {
+        return false;
+    }
+    return !attachments || std::find(attachments->lostEntries.begin(), attachments->lostEntries.end(), entry) ==
+                               attachments->lostEntries.end();
 }
 
 // The removal itself, when all who watch a child have been told.
@@ -171,10 +218,12 @@ void ResTreeNode::RetireDescendants() {
     while (true) {
         Level& level = levels.back();
         if (level.next < level.children.size()) {
+            ResTreeNode* node = level.node;
             NodeEntry* entry = level.children[level.next++];
-            if (ResTreeNode* child = entry->Child()) {
+            if (node->StillHolds(entry)) {
+                ResTreeNode* child = entry->Child();
                 child->Raise(NodeDeleting);
-                if (entry->Kind() != EmptyEntry) {
+                if (node->StillHolds(entry)) {
                     levels.push_back({child, entry, child->ChildEntriesInRemovalOrder()});
                 }
             }
@@ -187,7 +236,7 @@ void ResTreeNode::RetireDescendants() {
         NodeEntry* entry = level.entry;
         levels.pop_back();
         node->Raise(NodeDeleted);
-        if (entry->Kind() != EmptyEntry) {
+        if (levels.back().node->StillHolds(entry)) {
             levels.back().node->FinishRemoval(entry);
         }
     }
