@@ -1,6 +1,8 @@
 // From a path to a node and back.
 
 #include <algorithm>
+#include <memory>
+#include <utility>
 #include <vector>
 
 #include "qn/dsc/osdep/Compare.h"
@@ -108,43 +110,53 @@ std::vector<ResTreeNode*> WayFromRoot(const ResTreeNode* node) {
     return way;
 }
 
-// What JoinEscapedPath gives, in place.
-void AppendToPath(String& path, std::u16string_view part) {
-    // A path that counts as "/" alone, such as "/" and ignorable units, is replaced.
-    if (Compare(path.View(), u"/") == 0) {
-        path.Assign(u"/", 1);
-    } else {
-        path.Append(u"/");
+// A path that is built from the root downward, as JoinEscapedPath does it, but in place.
+class GrowingPath {
+  public:
+    void Append(std::u16string_view part) {
+        if (isRoot) {
+            // A path that counts as "/" alone, such as "/" and ignorable units, is replaced.
+            path.Assign(u"/", 1);
+        } else {
+            path.Append(u"/");
+        }
+        if (part.find_first_of(u"/\\") == std::u16string_view::npos) {
+            path.Append(part);
+        } else {
+            path.Append(EscapeText(String(part), u'/').View());
+        }
+        // With a second slash a path is never "/" again, so the comparisons are linear in all.
+        isRoot = isRoot && Compare(path.View(), u"/") == 0;
     }
-    if (part.find_first_of(u"/\\") == std::u16string_view::npos) {
-        path.Append(part);
-    } else {
-        path.Append(EscapeText(String(part), u'/').View());
-    }
-}
+    String Take() { return std::move(path); }
+
+  private:
+    String path{u"/"};
+    bool isRoot = true;
+};
 
 }  // namespace
 
 String ResTreeNode::GetPath() const {
-    String path(u"/");
+    GrowingPath path;
     for (const ResTreeNode* node : WayFromRoot(this)) {
-        AppendToPath(path, node->name.View());
+        path.Append(node->name.View());
     }
-    return path;
+    return path.Take();
 }
 
 String ResTreeNode::GetDisplayPath() {
     const ReleaseScope scope;
-    String path(u"/");
+    GrowingPath path;
     for (ResTreeNode* node : WayFromRoot(this)) {
         const String* displayName = node->GetProperty(displayNameKey);
         if (displayName == nullptr) {
-            AppendToPath(path, node->name.View());
+            path.Append(node->name.View());
         } else if (!displayName->IsEmpty()) {
-            AppendToPath(path, displayName->View());
+            path.Append(displayName->View());
         }
     }
-    return path;
+    return path.Take();
 }
 
 String ResTreeNode::GetEntryDisplayPath(EntryIterator iterator, const String& parentDisplayPath) {
