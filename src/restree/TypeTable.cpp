@@ -31,7 +31,8 @@ void TypeTable::AddTypeRelation(std::u16string_view type, std::u16string_view ba
     if (found == records.end()) {
         found = records.emplace(String(type), std::make_unique<TypeRecord>(type)).first;
     }
-    if (const TypeRecord* baseRecord = Find(base)) {
+    // An empty base is none, also where there is a type without a name.
+    if (const TypeRecord* baseRecord = base.empty() ? nullptr : Find(base)) {
         found->second->bases.push_back(baseRecord);
     }
 }

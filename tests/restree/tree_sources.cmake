@@ -1,9 +1,12 @@
 # The node and its entries.
 set(RESTREE_TREE_TESTS
   ${CMAKE_CURRENT_LIST_DIR}/DeepTreeTest.cpp
+  ${CMAKE_CURRENT_LIST_DIR}/DeferredLoadTest.cpp
   ${CMAKE_CURRENT_LIST_DIR}/EntryListTest.cpp
   ${CMAKE_CURRENT_LIST_DIR}/ObserverTest.cpp
   ${CMAKE_CURRENT_LIST_DIR}/ResTreeNodeChangesTest.cpp
   ${CMAKE_CURRENT_LIST_DIR}/ResTreeNodeCopyTest.cpp
+  ${CMAKE_CURRENT_LIST_DIR}/ResTreeNodeEntriesTest.cpp
   ${CMAKE_CURRENT_LIST_DIR}/ResTreeNodePathTest.cpp
-  ${CMAKE_CURRENT_LIST_DIR}/ResTreeNodeRemovalTest.cpp)
+  ${CMAKE_CURRENT_LIST_DIR}/ResTreeNodeRemovalTest.cpp
+  ${CMAKE_CURRENT_LIST_DIR}/ResTreeNodeTypesTest.cpp)

@@ -1,0 +1,204 @@
+// Nodes whose contents are read on the first lookup that misses.
+
+#include <cerrno>
+#include <string>
+
+#include <gtest/gtest.h>
+
+#include "restree/ReadTree.h"
+
+namespace zkhw {
+namespace {
+
+using qn::dsc::osdep::FileCall;
+
+class DeferredLoad : public ResourceFiles {
+  protected:
+    DeferredLoad() : root(MakeUnnamedRoot()) { Load(*root, "<R><A name='a'><S name='s'><U>0</U></S></A></R>"); }
+
+    ResTreeNode& Stub() { return At(*root, u"a/s"); }
+    ResTreeNode& Above() { return At(*root, u"a"); }
+    uint64_t OpenedFiles() { return files.Count(FileCall::OpenText); }
+    static void Defer(ResTreeNode& node, const char16_t* paths) { node.SetProperty(u":DeferredLoadPath", paths); }
+
+    std::unique_ptr<ResTreeNode> root;
+};
+
+TEST_F(DeferredLoad, MergesTheFileIntoTheStub) {
+    Write("board.xml", "<Other name='other' ordered='true'><V>1</V><U>1</U><C name='c'/></Other>");
+    ResTreeNode& stub = Stub();
+    Defer(stub, u"board.xml");
+    EXPECT_FALSE(stub.EnsureDeferredLoaded());
+    EXPECT_EQ(DumpTree(stub), "s:S\n  c:C\n  U=1\n  V=1\n");
+}
+
+TEST_F(DeferredLoad, FiresOnALookupThatMissesAlone) {
+    Write("board.xml", "<B><V>1</V></B>");
+    ResTreeNode& stub = Stub();
+    Defer(stub, u"board.xml");
+    EXPECT_EQ(TextAt(stub, u"U"), "0");
+    EXPECT_EQ(OpenedFiles(), 0u);
+    EXPECT_EQ(TextAt(stub, u"V"), "1");
+    EXPECT_EQ(OpenedFiles(), 1u);
+}
+
+TEST_F(DeferredLoad, ReadsTheFilesOnce) {
+    Write("board.xml", "<B><V>1</V></B>");
+    ResTreeNode& stub = Stub();
+    Defer(stub, u"board.xml");
+    EXPECT_EQ(stub.GetProperty(u"missing"), nullptr);
+    EXPECT_EQ(stub.GetProperty(u"missing"), nullptr);
+    EXPECT_TRUE(stub.EnsureDeferredLoaded());
+    EXPECT_EQ(OpenedFiles(), 1u);
+    EXPECT_EQ(stub.FindRaw(u":DeferredLoadPath"), nullptr);
+}
+
+TEST_F(DeferredLoad, StartsAtTheFolderOfTheExecutable) {
+    Write("x/y/board.xml", "<B><V>1</V></B>");
+    ResTreeNode& stub = Stub();
+    Defer(stub, u"x\\y\\board.xml");
+    EXPECT_FALSE(stub.EnsureDeferredLoaded());
+    Defer(stub, folder.System(u"x\\y\\board.xml").CStr());
+    EXPECT_FALSE(stub.EnsureDeferredLoaded());
+}
+
+TEST_F(DeferredLoad, ReadsItsFilesInOrder) {
+    Write("one.xml", "<B><V>1</V><W>1</W></B>");
+    Write("two.xml", "<B><V>2</V></B>");
+    ResTreeNode& stub = Stub();
+    Defer(stub, u" one.xml , two.xml ");
+    EXPECT_FALSE(stub.EnsureDeferredLoaded());
+    EXPECT_EQ(DumpTree(stub), "s:S\n  U=0\n  V=2\n  W=1\n");
+}
+
+TEST_F(DeferredLoad, FailureEndsTheWalk) {
+    Write("one.xml", "<B><V>1</V></B>");
+    Write("two.xml", "<B><V>2</V></B>");
+    ResTreeNode& stub = Stub();
+    Defer(stub, u"one.xml,missing.xml,two.xml");
+    EXPECT_FALSE(stub.EnsureDeferredLoaded());
+    EXPECT_EQ(DumpTree(stub), "s:S\n  U=0\n  V=1\n");
+    Defer(stub, u"missing.xml,two.xml");
+    EXPECT_TRUE(stub.EnsureDeferredLoaded());
+    EXPECT_EQ(DumpTree(stub), "s:S\n  U=0\n  V=1\n");
+}
+
+TEST_F(DeferredLoad, MissingFileLeavesTheStubWithoutAReport) {
+    ResTreeNode& stub = Stub();
+    Defer(stub, u"missing.xml");
+    EXPECT_EQ(stub.GetProperty(u"V"), nullptr);
+    EXPECT_EQ(DumpTree(stub), "s:S\n  U=0\n");
+}
+
+TEST_F(DeferredLoad, MalformedFileIsReportedOnTheStub) {
+    Write("board.xml", "<B><V>1</V><W></B>");
+    ResTreeNode& stub = Stub();
+    Defer(stub, u"board.xml");
+    EXPECT_TRUE(stub.EnsureDeferredLoaded());
+    EXPECT_EQ(Errors(stub), "Error on line 1 at column 16 of file" + Shown(u"board.xml") +
+                                "\n   mismatched tag\n   <B><V>1</V><W></B>\n");
+    EXPECT_EQ(TextAt(stub, u"V"), "1");
+}
+
+TEST_F(DeferredLoad, DotsPassTheRequestToTheParent) {
+    Write("above.xml", "<B><X><V>1</V></X><S name='s'><V>2</V></S></B>");
+    Write("own.xml", "<B><V>3</V></B>");
+    Defer(Above(), u"above.xml");
+    ResTreeNode& stub = Stub();
+    Defer(stub, u"..,own.xml");
+    EXPECT_EQ(TextAt(stub, u"V"), "3");
+    EXPECT_EQ(DumpTree(Above()), "a:A\n  s:S\n    U=0\n    V=3\n  X:X\n    V=1\n");
+}
+
+TEST_F(DeferredLoad, DotsAloneAreNoSuccessOfTheStub) {
+    Write("above.xml", "<B><S name='s'><V>2</V></S></B>");
+    Defer(Above(), u"above.xml");
+    ResTreeNode& stub = Stub();
+    Defer(stub, u"..");
+    EXPECT_TRUE(stub.EnsureDeferredLoaded());
+    EXPECT_EQ(TextAt(stub, u"V"), "2");
+}
+
+TEST_F(DeferredLoad, DotsOfTheRootAreSkipped) {
+    Write("own.xml", "<B><V>3</V></B>");
+    Defer(*root, u"..,own.xml");
+    EXPECT_FALSE(root->EnsureDeferredLoaded());
+    EXPECT_EQ(TextAt(*root, u"V"), "3");
+}
+
+TEST_F(DeferredLoad, FailureOfTheParentDoesNotEndTheWalkOfTheStub) {
+    Write("own.xml", "<B><V>3</V></B>");
+    Defer(Above(), u"missing.xml,own.xml");
+    ResTreeNode& stub = Stub();
+    Defer(stub, u"..,own.xml");
+    EXPECT_FALSE(stub.EnsureDeferredLoaded());
+    EXPECT_EQ(TextAt(stub, u"V"), "3");
+    EXPECT_EQ(Above().FindRaw(u"V"), nullptr);
+}
+
+TEST_F(DeferredLoad, FailureOfTheSystemEndsTheWalkSilently) {
+    Write("own.xml", "<B><V>3</V></B>");
+    ResTreeNode& stub = Stub();
+    Defer(stub, u"own.xml,own.xml");
+    files.Fail(FileCall::ReadExecutablePath, 1, EIO);
+    EXPECT_TRUE(stub.EnsureDeferredLoaded());
+    EXPECT_EQ(DumpTree(stub), "s:S\n  U=0\n");
+}
+
+TEST_F(DeferredLoad, EntryThatIsNoTextIsLeftAlone) {
+    ResTreeNode& stub = Stub();
+    ResTreeNode* child = nullptr;
+    stub.AddChildEntry(u":DeferredLoadPath", u"X", false, child);
+    EXPECT_TRUE(stub.EnsureDeferredLoaded());
+    EXPECT_NE(stub.FindRaw(u":DeferredLoadPath"), nullptr);
+}
+
+TEST_F(DeferredLoad, EmptyEntryIsRemoved) {
+    ResTreeNode& stub = Stub();
+    Defer(stub, u"");
+    EXPECT_TRUE(stub.EnsureDeferredLoaded());
+    EXPECT_EQ(stub.FindRaw(u":DeferredLoadPath"), nullptr);
+}
+
+TEST_F(DeferredLoad, FileThatDefersToItselfEnds) {
+    // The lookup of the prototype misses while the file is being read, and asks for it once more.
+    Write("self.xml",
+          "<B><:DeferredLoadPath type='text'>self.xml</:DeferredLoadPath><Q prototype='nowhere'/><V>1</V></B>");
+    ResTreeNode& stub = Stub();
+    Defer(stub, u"self.xml");
+    EXPECT_EQ(TextAt(stub, u"V"), "1");
+    EXPECT_NE(stub.FindRaw(u"Q"), nullptr);
+}
+
+TEST_F(DeferredLoad, CanRemoveTheVeryStub) {
+    // What is read into the parent replaces the stub that asked for it.
+    Write("above.xml", "<B><S name='s' replace='true'><V>new</V></S></B>");
+    Defer(Above(), u"above.xml");
+    ResTreeNode& stub = Stub();
+    Defer(stub, u"..");
+    EXPECT_EQ(At(*root, u"a").Lookup(u"s/x", nullptr), nullptr);
+    EXPECT_EQ(DumpTree(Above()), "a:A\n  s:S\n    V=new\n");
+}
+
+TEST_F(DeferredLoad, ThousandsOfParentsInARowAreAskedWithoutTheStack) {
+    std::string document;
+    for (int i = 0; i < 2000; ++i) {
+        document += "<N><:DeferredLoadPath type='text'>..</:DeferredLoadPath>";
+    }
+    for (int i = 0; i < 2000; ++i) {
+        document += "</N>";
+    }
+    Write("top.xml", "<T><V>top</V></T>");
+    auto deep = MakeRoot();
+    LoadChild(*deep, document);
+    Defer(*deep, u"top.xml");
+    ResTreeNode* innermost = deep.get();
+    while (const NodeEntry* entry = innermost->FindRaw(u"N")) {
+        innermost = entry->Child();
+    }
+    EXPECT_TRUE(innermost->EnsureDeferredLoaded());
+    EXPECT_EQ(TextAt(*deep, u"V"), "top");
+}
+
+}  // namespace
+}  // namespace zkhw
