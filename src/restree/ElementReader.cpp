@@ -130,7 +130,7 @@ void ElementReader::BindDocumentElement(String&& entryName, String&& elementName
     if (node.type.IsEmpty()) {
         node.name = std::move(entryName);
         node.type = std::move(elementName);
-        node.SetOrdered(isOrdered);
+        node.TakeOrder(isOrdered);
     }
     frame.rootTypeKnown = !node.type.IsEmpty();
     stack.NoteNode(node);

@@ -12,6 +12,7 @@
 #include "qn/dsc/osdep/_GetExeFullPath.h"
 #include "qn/dsc/osdep/path.h"
 #include "restree/LoadChain.h"
+#include "restree/NodeAttachments.h"
 #include "restree/ParseStack.h"
 #include "restree/ReleaseScope.h"
 #include "restree/ResTreeNode.h"
@@ -155,6 +156,32 @@ void ResTreeNode::ReportParseError(const ParseStack& stack, const NarrowString* 
         // In place: with many reports a copy of them all for each would take quadratic time.
         reports->Append(report);
         Raise(PropertyChanged);
+    }
+}
+
+// Gives a node that has got its type from a document the order that goes with it. A node without a type may have
+// entries all the same: the reports of failed loads, and the values of documents that held nothing else. They stay. Of
+// equal keys in an ordered node that is ordered no more the first stays; the others are out of reach from then on.
+void ResTreeNode::TakeOrder(bool ordered) {
+    if (ordered == IsOrdered()) {
+        return;
+    }
+    std::vector<NodeEntry*> kept;
+    for (EntryIterator entry = Begin(); !entry.IsEnd(); ++entry) {
+        kept.push_back(&*entry);
+    }
+    std::vector<NodeEntry*>& lost = GetAttachments().lostEntries;
+    lost.insert(lost.end(), kept.rbegin(), kept.rend());
+    SetOrdered(ordered);
+    // Each is taken back from the lost ones when it has its new place.
+    size_t at = lost.size();
+    for (NodeEntry* entry : kept) {
+        --at;
+        const EntryList::Place place = ordered ? EntryList::Place{} : entries.FindPlace(entry->Key().View());
+        if (place.entry == nullptr) {
+            entries.Insert(place.position, entry);
+            lost.erase(lost.begin() + static_cast<ptrdiff_t>(at));
+        }
     }
 }
 

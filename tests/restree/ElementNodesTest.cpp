@@ -213,6 +213,43 @@ TEST(ElementNodes, DocumentElementThatIsAValueLeavesTheNodeUnnamed) {
 )");
 }
 
+TEST(ElementNodes, ValuesOfAnUntypedNodeStayWhenItGetsAType) {
+    auto root = MakeUnnamedRoot();
+    Load(*root, "<B>2</B>");
+    Load(*root, "<A>1</A>");
+    EXPECT_EQ(Load(*root, "<RList><A>3</A></RList>"), R"(
+RList:RList ordered
+  A=1
+  B=2
+  A=3
+)");
+    auto same = MakeUnnamedRoot();
+    Load(*same, "<B>2</B>");
+    EXPECT_EQ(Load(*same, "<R><A>1</A></R>"), R"(
+R:R
+  A=1
+  B=2
+)");
+}
+
+TEST(ElementNodes, OfEqualKeysOfAnUntypedNodeTheFirstStaysWhenItsOrderGoes) {
+    ResTreeNode root(u"", u"", true);
+    for (int i = 200; i > 0; --i) {
+        Load(root, "<V" + std::to_string(i % 100) + ">" + std::to_string(i) + "</V" + std::to_string(i % 100) + ">");
+    }
+    EXPECT_EQ(root.IsOrdered(), true);
+    Load(root, "<R name='r'/>");
+    EXPECT_EQ(root.IsOrdered(), false);
+    int count = 0;
+    for (EntryIterator entry = root.Begin(); !entry.IsEnd(); ++entry) {
+        ++count;
+    }
+    EXPECT_EQ(count, 100);
+    EXPECT_EQ(TextAt(root, u"V0"), "200");
+    EXPECT_EQ(TextAt(root, u"V1"), "101");
+    EXPECT_EQ(TextAt(root, u"V99"), "199");
+}
+
 TEST(ElementNodes, DocumentElementThatIsAValueLandsInANamedNode) {
     ASSERT_CHILD_TREE("<A>text</A>", R"(
 Root:Root
