@@ -387,6 +387,7 @@ TEST_F(TreeWriterLoad, SiblingThatGoesDuringALoadIsNotWritten) {
     Remover remover(*root, u"B");
     stub.AddObserver(&remover, PropertyAdded, 7);
     EXPECT_EQ(Written(*root), "\n<R>\n   <T name=\"A\">\n      <K>v</K>\n   </T>\n</R>");
+    stub.RemoveObserver(&remover, 7, false);
 }
 
 TEST_F(TreeWriterLoad, NodeThatGoesDuringItsOwnLoadIsClosedAndTheWalkGoesOn) {
@@ -419,6 +420,7 @@ TEST_F(TreeWriterLoad, ManySiblingsMayGoDuringALoad) {
     } remover(*root);
     stub.AddObserver(&remover, PropertyAdded, 7);
     EXPECT_TRUE(Written(*root).ends_with("</Before>\n   <T name=\"S\">\n      <K>v</K>\n   </T>\n</R>"));
+    stub.RemoveObserver(&remover, 7, false);
 }
 
 TEST(TreeWriter, DepthTakesNoStack) {
