@@ -229,6 +229,16 @@ TEST_F(TargetScan, FileThatCannotBeOpenedLeavesNoTrace) {
     EXPECT_EQ(Text(u"D", u"TargetClass"), "COM.QN.FPGA.D");
 }
 
+TEST_F(TargetScan, NodeThatItsOwnDocumentReplacedIsNotStamped) {
+    // The second level of the xml value ends it early, so that W is read beside the target and takes its place.
+    installation.Write("a_resource.xml",
+                       "<Target name=\"B\"><V type=\"xml\"><d><e></e></d></V><W name=\"B\"></W></Target>");
+    installation.Write("b_resource.xml", "<Target name=\"C\"><K>v</K></Target>");
+    Scan();
+    EXPECT_EQ(Dump(u"B"), "B:W\n");
+    EXPECT_EQ(Text(u"C", u"TargetClass"), "COM.QN.FPGA.C");
+}
+
 TEST_F(TargetScan, DocumentThatIsAValueLeavesItsTextOnTheRoot) {
     installation.Write("a_resource.xml", "<Some>text</Some>");
     Scan();
