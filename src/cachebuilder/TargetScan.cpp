@@ -6,7 +6,6 @@
 #include "cachebuilder/SourceLists.h"
 #include "cachebuilder/TargetDiscovery.h"
 #include "qn/dsc/osdep/path.h"
-#include "restree/ReleaseScope.h"
 #include "restree/ResTreeNode.h"
 #include "restree/ResultCode.h"
 
@@ -46,8 +45,6 @@ int32_t FPGAResTree::ScanTargets(const String& directory, ResTreeNode& root) {
     const String installRoot = GetInstallRoot();
     SourceLists sources;
     for (const String& file : files) {
-        // A file can remove the node of its own document element. It is kept here until it has been looked at.
-        const ReleaseScope scope;
         ResTreeNode* node = nullptr;
         root.LoadResourceFile(NarrowString(file), true, &node);
         if (node == nullptr) {

@@ -45,6 +45,25 @@ int32_t WithChangesHeldBack(ResTreeNode& node, Load load) {
     return result;
 }
 
+// The node of a document element, or null if it has left the tree meanwhile. An end tag too many puts what follows
+// beside the document element, and there it may take its place; so may an observer that was told of the load. Only
+// while a ReleaseScope stands.
+ResTreeNode* StandingChild(const ResTreeNode& parent, ResTreeNode* child) {
+    if (child == nullptr) {
+        return nullptr;
+    }
+    if (!parent.IsOrdered()) {
+        const NodeEntry* entry = parent.FindRaw(child->GetName().View());
+        return entry != nullptr && entry->Child() == child ? child : nullptr;
+    }
+    for (ConstEntryIterator entry = parent.Begin(); !entry.IsEnd(); ++entry) {
+        if (entry->Child() == child) {
+            return child;
+        }
+    }
+    return nullptr;
+}
+
 bool ParseFile(qn::dsc::osdep::TextStream& file, ParseStack& stack) {
     constexpr size_t blockSize = 4096;
     const auto block = std::make_unique<char[]>(blockSize);
@@ -63,7 +82,12 @@ bool ParseFile(qn::dsc::osdep::TextStream& file, ParseStack& stack) {
 }  // namespace
 
 int32_t ResTreeNode::LoadResourceFile(const NarrowString& path, bool asChild, ResTreeNode** node) {
-    return LoadFile(path, asChild, node, LoadChain(&path, nullptr));
+    const ReleaseScope scope;
+    const int32_t result = LoadFile(path, asChild, node, LoadChain(&path, nullptr));
+    if (asChild && node != nullptr) {
+        *node = StandingChild(*this, *node);
+    }
+    return result;
 }
 
 int32_t ResTreeNode::LoadIncludedFile(const NarrowString& path, bool asChild, ResTreeNode** node,
@@ -102,7 +126,8 @@ int32_t ResTreeNode::LoadFile(const NarrowString& path, bool asChild, ResTreeNod
 }
 
 int32_t ResTreeNode::LoadResourceText(const String& text, bool asChild, ResTreeNode** node) {
-    return WithChangesHeldBack(*this, [&] {
+    const ReleaseScope scope;
+    const int32_t result = WithChangesHeldBack(*this, [&] {
         if (node != nullptr) {
             *node = nullptr;
         }
@@ -121,6 +146,10 @@ int32_t ResTreeNode::LoadResourceText(const String& text, bool asChild, ResTreeN
         }
         return success;
     });
+    if (asChild && node != nullptr) {
+        *node = StandingChild(*this, *node);
+    }
+    return result;
 }
 
 void ResTreeNode::ReportParseError(const ParseStack& stack, const NarrowString* fileName, const String* message) {
