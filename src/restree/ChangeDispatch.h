@@ -15,6 +15,9 @@ class ResTreeNode;
 
 class ChangeDispatch {
   public:
+    ChangeDispatch(const ChangeDispatch&) = delete;
+    ChangeDispatch& operator=(const ChangeDispatch&) = delete;
+
     // Delivers what is pending of `mask` on `node`, and all that follows from it.
     static void Run(ResTreeNode& node, uint32_t mask);
 
@@ -34,9 +37,6 @@ class ChangeDispatch {
     ChangeDispatch() = default;
     // If an observer throws, nodes are still open. They stay held back, but this run no longer has them.
     ~ChangeDispatch();
-    ChangeDispatch(const ChangeDispatch&) = delete;
-    ChangeDispatch& operator=(const ChangeDispatch&) = delete;
-
     void Open(ResTreeNode& node, uint32_t mask);
     static void BeginPass(Step& step);
     bool EndPass(Step& step) const;

@@ -14,6 +14,12 @@ namespace {
 constexpr XML_Memory_Handling_Suite memorySuite = {qn::dsc::osdep::TaskMemAlloc, qn::dsc::osdep::TaskMemRealloc,
                                                    qn::dsc::osdep::TaskMemFree};
 
+// Whether libexpat takes a document with this beginning for UTF-16. In UTF-8 the first NUL is a fault.
+bool IsUtf16(std::string_view beginning) {
+    const auto first = static_cast<unsigned char>(beginning[0]);
+    return first >= 0xFE || first == 0 || (beginning.size() > 1 && beginning[1] == 0);
+}
+
 }  // namespace
 
 struct ExPatHandler::Callbacks {
@@ -74,6 +80,10 @@ ExPatHandler::~ExPatHandler() {
 }
 
 bool ExPatHandler::Parse(const char* bytes, size_t count, bool isFinal) {
+    if (!hasBegun && count != 0) {
+        hasBegun = true;
+        mayHoldNul = IsUtf16({bytes, count});
+    }
     const XML_Status status = XML_Parse(parser, bytes, static_cast<int>(count), isFinal ? 1 : 0);
     if (failure) {
         std::rethrow_exception(std::exchange(failure, nullptr));
@@ -88,21 +98,26 @@ bool ExPatHandler::Parse(const char* bytes, size_t count, bool isFinal) {
 namespace {
 
 // The end of `before` that shows the line at fault and the one ahead of it, with the line feed that it starts with.
-std::u16string_view ContextTail(const String& before) {
-    uint32_t start = before.FindLast(u'\n');
-    if (start != String::npos && start != 0) {
-        start = before.FindLast(u'\n', start - 1);
+std::string_view ContextTail(std::string_view before) {
+    size_t start = before.rfind('\n');
+    if (start != std::string_view::npos && start != 0) {
+        start = before.rfind('\n', start - 1);
     }
-    return before.View().substr(start == String::npos ? 0 : start);
+    return before.substr(start == std::string_view::npos ? 0 : start);
 }
 
-// The beginning of `after` up to its second line feed.
-std::u16string_view ContextHead(const String& after) {
-    uint32_t end = after.Find(u'\n');
-    if (end != String::npos) {
-        end = after.Find(u'\n', end + 1);
+// The beginning of `after` up to its second line feed, or to its first NUL.
+std::string_view ContextHead(std::string_view after) {
+    size_t end = after.find('\n');
+    if (end != std::string_view::npos) {
+        end = after.find('\n', end + 1);
     }
-    return after.View().substr(0, end == String::npos ? end : end + 1);
+    const std::string_view head = after.substr(0, end == std::string_view::npos ? end : end + 1);
+    return head.substr(0, head.find('\0'));
+}
+
+String WidenContext(std::string_view bytes) {
+    return String(bytes.data(), static_cast<uint32_t>(bytes.size()));
 }
 
 }  // namespace
@@ -119,10 +134,13 @@ void ExPatHandler::GetErrorInfo(String& message, uint32_t& line, uint32_t& colum
         context = String();
         return;
     }
-    const String before(buffer, static_cast<uint32_t>(offset));
-    const String after(buffer + offset, static_cast<uint32_t>(size - offset));
-    context = String(ContextTail(before));
-    context.Append(ContextHead(after));
+    // Only what is shown is widened and searched: a long text may have a report on each of its lines.
+    std::string_view before(buffer, static_cast<size_t>(offset));
+    if (mayHoldNul) {
+        before = before.substr(0, before.find('\0'));
+    }
+    context = WidenContext(ContextTail(before));
+    context.Append(WidenContext(ContextHead({buffer + offset, static_cast<size_t>(size - offset)})));
 }
 
 }  // namespace zkhw

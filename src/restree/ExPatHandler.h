@@ -51,6 +51,8 @@ class ExPatHandler {
     struct Callbacks;
 
     XML_ParserStruct* parser;
+    bool hasBegun = false;
+    bool mayHoldNul = false;     // Bytes of value 0 may stand ahead of where the parser is.
     std::exception_ptr failure;  // Kept while libexpat, which knows no exceptions, is on the stack.
 };
 
