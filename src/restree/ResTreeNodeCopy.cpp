@@ -76,7 +76,6 @@ void ResTreeNode::MergeWalk::MergeText(ResTreeNode& target, const NodeEntry& ent
     const Added added = target.AddTextEntry(String(entry.Key()), std::move(text), entry.Kind());
     if (!added.isNew && overwrite) {
         // NOLINTNEXTLINE(bugprone-use-after-move): the text was taken only if an entry was made.
-        // NOLINTNEXTLINE(bugprone-use-after-move): the text was taken only if an entry was made.
         target.SetEntryText(added.entry, std::move(text));
     }
 }
@@ -92,7 +91,6 @@ void ResTreeNode::MergeWalk::MergeLink(Level& level, const NodeEntry& entry) {
     String path = MakeRelativeNodePath(linkTarget, level.targetPath);
     const Added added = level.target->AddLinkEntry(String(entry.Key()), std::move(path));
     if (!added.isNew && overwrite) {
-        // NOLINTNEXTLINE(bugprone-use-after-move): the path was taken only if an entry was made.
         // NOLINTNEXTLINE(bugprone-use-after-move): the path was taken only if an entry was made.
         level.target->SetEntryText(added.entry, std::move(path));
     }

@@ -49,8 +49,9 @@ int32_t WithChangesHeldBack(ResTreeNode& node, Load load) {
 // beside the document element, and there it may take its place; so may an observer that was told of the load. Only
 // while a ReleaseScope stands.
 ResTreeNode* StandingChild(const ResTreeNode& parent, ResTreeNode* child) {
-    if (child == nullptr) {
-        return nullptr;
+    // In a node without a type the document element stands for the node itself.
+    if (child == nullptr || child == &parent) {
+        return child;
     }
     if (!parent.IsOrdered()) {
         const NodeEntry* entry = parent.FindRaw(child->GetName().View());
