@@ -1,71 +1,72 @@
 #include "hostbridge/HostFunctions.h"
 
-#include <cstdio>
-
-#include "hostbridge/RuntimeModule.h"
-#include "qn/dsc/osdep/FatalError.h"
+#include "hostbridge/HostFunctionTable.h"
 
 namespace zkhw {
 
-using qn::dsc::osdep::FatalError;
-using qn::dsc::osdep::FindExport;
-
 namespace {
 
-// Calls the function of a record with the parameters of the stub that stands for it.
+// What all stubs have in common. The host's function is called last and its result given as it comes, so the compiler
+// makes that call a jump: the function returns straight to the stub's caller.
 template <typename Result, typename... Parameters>
-Result Call(HostFunctionRecord& record, Parameters... parameters) {
+inline Result Call(HostFunction function, Parameters... parameters) {
+    HostFunctionRecord& record = RecordOf(function);
     ResolveHostFunction(record);
     return reinterpret_cast<Result (*)(Parameters...)>(record.function)(parameters...);
 }
 
 }  // namespace
 
-void ResolveHostFunction(HostFunctionRecord& record) {
-    const ModuleHandle module = FindRuntimeModule();
-    if (module == nullptr) {
-        FatalError("ZARVIKV.LIB was not called from a Zarvik process.");
-    }
-    if (module != record.module || record.function == nullptr) {
-        record.function = FindExport(module, record.name);
-        record.module = module;
-    }
-    if (record.function != nullptr) {
-        return;
-    }
-    char message[300];
-    std::snprintf(message, sizeof message, "ZARVIKV.LIB could not locate \"%s\".", record.name);
-    FatalError(message);
+int32_t HostSetHandleSizeClear(HostHandle handle, size_t size) {
+    return Call<int32_t>(HostFunction::HostSetHandleSizeClear, handle, size);
 }
 
 int32_t HostDisposeHandle(HostHandle handle) {
-    static HostFunctionRecord record{nullptr, nullptr, "HostDisposeHandle"};
-    return Call<int32_t>(record, handle);
+    return Call<int32_t>(HostFunction::HostDisposeHandle, handle);
+}
+
+HostHandle HostNewHandleClear(size_t size) {
+    return Call<HostHandle>(HostFunction::HostNewHandleClear, size);
+}
+
+uint8_t HostGetErrorText(int32_t code, HostHandle* text) {
+    return Call<uint8_t>(HostFunction::HostGetErrorText, code, text);
+}
+
+int32_t HostResizeArray(int32_t typeCode, int32_t dimensions, HostHandle* array, size_t size) {
+    return Call<int32_t>(HostFunction::HostResizeArray, typeCode, dimensions, array, size);
 }
 
 void HostGetLanguageName(unsigned char* buffer) {
-    static HostFunctionRecord record{nullptr, nullptr, "HostGetLanguageName"};
-    Call<void>(record, buffer);
+    Call<void>(HostFunction::HostGetLanguageName, buffer);
+}
+
+int32_t QueryInterfaceForZKRefNum(uint32_t refNum, qn::dsc::Guid interfaceId, void** result) {
+    return Call<int32_t>(HostFunction::QueryInterfaceForZKRefNum, refNum, interfaceId, result);
 }
 
 HostPathReference HostEmptyPath(HostPathReference path) {
-    static HostFunctionRecord record{nullptr, nullptr, "HostEmptyPath"};
-    return Call<HostPathReference>(record, path);
-}
-
-void HostDestroyPath(HostPathReference path) {
-    static HostFunctionRecord record{nullptr, nullptr, "HostDestroyPath"};
-    Call<void>(record, path);
+    return Call<HostPathReference>(HostFunction::HostEmptyPath, path);
 }
 
 int32_t HostPathToString(HostPathReference path, HostHandle* text) {
-    static HostFunctionRecord record{nullptr, nullptr, "HostPathToString"};
-    return Call<int32_t>(record, path, text);
+    return Call<int32_t>(HostFunction::HostPathToString, path, text);
 }
 
 int32_t HostGetSpecialDir(int32_t code, HostPathReference path) {
-    static HostFunctionRecord record{nullptr, nullptr, "HostGetSpecialDir"};
-    return Call<int32_t>(record, code, path);
+    return Call<int32_t>(HostFunction::HostGetSpecialDir, code, path);
+}
+
+void HostDestroyPath(HostPathReference path) {
+    Call<void>(HostFunction::HostDestroyPath, path);
+}
+
+int32_t HostTextToPath(const char* text, size_t length, HostPathReference path) {
+    return Call<int32_t>(HostFunction::HostTextToPath, text, length, path);
+}
+
+int32_t HostSystemTextToPath(const char* text, HostPathReference path) {
+    return Call<int32_t>(HostFunction::HostSystemTextToPath, text, path);
 }
 
 }  // namespace zkhw

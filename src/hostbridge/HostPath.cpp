@@ -1,12 +1,14 @@
 #include "hostbridge/HostPath.h"
 
-#include <cstring>
 #include <iterator>
+#include <new>
 
+#include "hostbridge/HostString.h"
 #include "hostbridge/RuntimeModule.h"
 #include "qn/dsc/osdep/CommandLine.h"
 #include "qn/dsc/osdep/_GetExeFullPath.h"
 #include "qn/dsc/osdep/path.h"
+#include "qn/dsc/zk/ThrowIfZKError.h"
 
 namespace zkhw {
 
@@ -15,6 +17,8 @@ using qn::dsc::String;
 using qn::dsc::osdep::GetExecutableDir;
 using qn::dsc::osdep::JoinPath;
 using qn::dsc::osdep::PathFromArgument;
+using qn::dsc::zk::ThrowIfZKError;
+using qn::dsc::zk::ZKErrorException;
 
 namespace {
 
@@ -23,19 +27,29 @@ constexpr int32_t specialDirectoryCodes[] = {0,  1,  3,  4,  5,  6,  7,  8,  9, 
                                              16, 17, 18, 19, 21, 22, 23, 24, 25, 26, 27, 28};
 constexpr uint32_t targetsDirectory = 24;
 
-// A 32-bit length, and that many bytes.
-NarrowString TextOf(HostHandle handle) {
-    if (handle == nullptr) {
-        return {};
-    }
-    int32_t length = 0;
-    std::memcpy(&length, *handle, sizeof length);
-    return NarrowString(*handle + sizeof length, static_cast<uint32_t>(length));
-}
-
 }  // namespace
 
+void StoreInHostPath(const String& text, HostPathForm form, HostPathReference path) {
+    const NarrowString narrow(text);
+    ThrowIfZKError(form == HostPathForm::FileSystem ? HostSystemTextToPath(narrow.CStr(), path)
+                                                    : HostTextToPath(narrow.CStr(), narrow.Length(), path));
+}
+
 HostPath::HostPath() : path(HostEmptyPath(nullptr)) {}
+
+// The other constructor has run: an exception that leaves this one gives the path back as well.
+HostPath::HostPath(const String& text) : HostPath() {
+    if (text.IsEmpty()) {
+        return;
+    }
+    try {
+        StoreInHostPath(text, HostPathForm::FileSystem, path);
+    } catch (const ZKErrorException&) {
+        // The path stays empty.
+    } catch (const std::bad_alloc&) {
+        // The path stays empty.
+    }
+}
 
 HostPath::~HostPath() {
     if (text != nullptr) {
@@ -49,7 +63,7 @@ bool HostPath::GetText(String& result) {
         return false;
     }
     // A host may speak of native paths.
-    result = PathFromArgument(TextOf(text).CStr());
+    result = PathFromArgument(HostStringToNarrow(text).CStr());
     return true;
 }
 

@@ -1,6 +1,7 @@
 #pragma once
 
-// Paths of the host. Only where there is a host: every operation calls its run-time (HostFunctions.h).
+// Paths of the host. Only where there is a host: every operation but GetHostSpecialDir calls its run-time whatever the
+// setting, and so may end the process (HostFunctions.h).
 
 #include <cstdint>
 
@@ -9,10 +10,26 @@
 
 namespace zkhw {
 
-// Owns an empty path of the host, to be written to, and the host's text of it.
+enum class HostPathForm {
+    FileSystem,  // As the file system has it.
+    Host,        // The host's own.
+};
+
+// Makes `path` the one that `text` names in the form given; the text goes through the system's default code page.
+// qn::dsc::zk::ZKErrorException, and `path` is as it was, if the host takes it for no path.
+void StoreInHostPath(const qn::dsc::String& text, HostPathForm form, HostPathReference path);
+
+// Owns a path of the host, and the host's text of it.
 class HostPath {
   public:
+    // An empty path.
     HostPath();
+
+    // The path that `text` names in the form of the file system; an empty one if the host takes it for no path or there
+    // is no memory.
+    explicit HostPath(const qn::dsc::String& text);
+
+    // Gives both back to the host, whose answers are not looked at.
     ~HostPath();
     HostPath(const HostPath&) = delete;
     HostPath& operator=(const HostPath&) = delete;

@@ -6,7 +6,7 @@
 
 #include "cachebuilder/Installation.h"
 #include "cachebuilder/Tool.h"
-#include "hostbridge/LoadedRuntime.h"
+#include "host/LoadedRuntime.h"
 #include "restree/ResTreeNode.h"
 #include "support/AllocationFaultScope.h"
 #include "support/ExactText.h"
@@ -193,8 +193,7 @@ TEST_F(FPGAResTreeOf, HostWithoutTargetsIsToldOnceAndGoesOnWithAnEmptyTree) {
 TEST_F(FPGAResTreeOf, HostRuntimeSaysWhereTheTargetsAre) {
     installation.Write("x_resource.xml", "<Target name=\"X\"/>");
     EXPECT_IN_CHILD([&] {
-        const std::string directory = installation.Root().Native("Targets");
-        LoadFakeRuntime().directory = directory.c_str();
+        LoadStandInRuntime().specialDirectories[28] = installation.Root().Native("Targets");
         FPGAResTree owner;
         ResTreeNode* node = nullptr;
         return owner.GetRootNode(node) == 0 && node->FindRaw(u"X") != nullptr;
@@ -204,7 +203,7 @@ TEST_F(FPGAResTreeOf, HostRuntimeSaysWhereTheTargetsAre) {
 TEST_F(FPGAResTreeOf, HostRuntimeWithoutAnAnswerLeavesAPathBelowTheWorkingFolder) {
     installation.Write("x_resource.xml", "<Target name=\"X\"/>");
     EXPECT_IN_CHILD([&] {
-        LoadFakeRuntime().specialDirectoryError = 7;
+        LoadStandInRuntime().Fail("HostGetSpecialDir", 7);
         const WorkingFolderScope folder(installation.Root().Native("Targets"));
         FPGAResTree owner;
         ResTreeNode* node = nullptr;

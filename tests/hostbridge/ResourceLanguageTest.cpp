@@ -1,6 +1,6 @@
 #include "hostbridge/ResourceLanguage.h"
 
-#include "hostbridge/LoadedRuntime.h"
+#include "host/LoadedRuntime.h"
 #include "support/ExactText.h"
 
 namespace zkhw {
@@ -9,8 +9,8 @@ namespace {
 using qn::dsc::ExactText;
 
 // The process remembers its language, so each test asks in one of its own.
-std::string LanguageOfHost(const char* name) {
-    LoadFakeRuntime().language = name;
+std::string LanguageOfHost(const std::string& name) {
+    LoadStandInRuntime().language = name;
     return ExactText(GetResourceLanguage());
 }
 
@@ -43,25 +43,25 @@ TEST(ResourceLanguage, IsEnglishForAnyOtherHost) {
 }
 
 TEST(ResourceLanguage, NameMayHave255Bytes) {
-    EXPECT_IN_CHILD([] { return LanguageOfHost(std::string(255, 'x').c_str()) == "eng"; });
+    EXPECT_IN_CHILD([] { return LanguageOfHost(std::string(255, 'x')) == "eng"; });
 }
 
 TEST(ResourceLanguage, IsAskedForOnce) {
     EXPECT_IN_CHILD([] {
-        FakeRuntime& runtime = LoadFakeRuntime();
+        StandInRuntime& runtime = LoadStandInRuntime();
         runtime.language = "Japanese";
         GetResourceLanguage();
         runtime.language = "English";
-        return ExactText(GetResourceLanguage()) == "jpn" && runtime.languageCalls == 1;
+        return ExactText(GetResourceLanguage()) == "jpn" && runtime.Count("HostGetLanguageName") == 1;
     });
 }
 
 TEST(ResourceLanguage, HostThatComesLaterChangesNothing) {
     EXPECT_IN_CHILD([] {
         const bool wasEnglish = ExactText(GetResourceLanguage()) == "eng";
-        FakeRuntime& runtime = LoadFakeRuntime();
+        StandInRuntime& runtime = LoadStandInRuntime();
         runtime.language = "Japanese";
-        return wasEnglish && ExactText(GetResourceLanguage()) == "eng" && runtime.languageCalls == 0;
+        return wasEnglish && ExactText(GetResourceLanguage()) == "eng" && runtime.Count("HostGetLanguageName") == 0;
     });
 }
 

@@ -4,7 +4,7 @@
 
 #include <pthread.h>
 
-#include "hostbridge/LoadedRuntime.h"
+#include "host/LoadedRuntime.h"
 #include "support/RunProgram.h"
 
 namespace zkhw {
@@ -32,7 +32,7 @@ TEST(RuntimeModule, ThereIsNoneInAPlainProcess) {
 
 TEST(RuntimeModule, TheOneThatTheHostNamedWinsOverLoadedOnes) {
     EXPECT_IN_CHILD([] {
-        LoadModule(FAKE_RUNTIME);
+        LoadModule(STAND_IN_RUNTIME);
         runtimeModule = &first;
         return FindRuntimeModule() == &first;
     });
@@ -66,7 +66,7 @@ TEST(RuntimeModule, EachThreadHasItsOwn) {
 
 TEST(RuntimeModule, LoadedZkrtIsFound) {
     EXPECT_IN_CHILD([] {
-        void* module = LoadModule(FAKE_RUNTIME);
+        void* module = LoadModule(STAND_IN_RUNTIME);
         return FindRuntimeModule() == module;
     });
 }
@@ -81,14 +81,14 @@ TEST(RuntimeModule, LoadedZkffrtIsFound) {
 TEST(RuntimeModule, ZkrtComesBeforeZkffrt) {
     EXPECT_IN_CHILD([] {
         LoadModule(POOR_RUNTIME);
-        void* module = LoadModule(FAKE_RUNTIME);
+        void* module = LoadModule(STAND_IN_RUNTIME);
         return FindRuntimeModule() == module;
     });
 }
 
 TEST(RuntimeModule, LookingKeepsNoModuleLoaded) {
     EXPECT_IN_CHILD([] {
-        void* module = LoadModule(FAKE_RUNTIME);
+        void* module = LoadModule(STAND_IN_RUNTIME);
         const bool found = FindRuntimeModule() == module && FindRuntimeModule() == module;
         dlclose(module);
         return found && FindRuntimeModule() == nullptr;

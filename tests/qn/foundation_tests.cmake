@@ -1,4 +1,4 @@
-# Strings, exceptions, task memory and checked integers.
+# Strings, exceptions, task memory, checked integers and host error codes.
 set(QN_FOUNDATION_TESTS
   dsc/NumericCastTest.cpp
   dsc/SafeIntegerTest.cpp
@@ -13,4 +13,5 @@ set(QN_FOUNDATION_TESTS
   dsc/osdep/PoolAllocatorTest.cpp
   dsc/osdep/SizeClassTest.cpp
   dsc/osdep/TaskMemoryTest.cpp
+  dsc/zk/ThrowIfZKErrorTest.cpp
 )

@@ -1,14 +1,18 @@
 #pragma once
 
 // Run-time modules for a test, and a process of its own for it: what is loaded, bound and remembered there is gone at
-// its end.
+// its end. The modules, by the names of their files (zkfpga_use_stand_in_runtime gives them to a test program):
+//
+//     STAND_IN_RUNTIME    StandInRuntime.h as libzkrt.so, which is found once it is loaded
+//     UNNAMED_RUNTIME     the same under a name that isn't looked for
+//     POOR_RUNTIME        libzkffrt.so, without any of the host's functions
 
 #include <cstdlib>
 
 #include <dlfcn.h>
 #include <gtest/gtest.h>
 
-#include "hostbridge/FakeRuntime.h"
+#include "host/StandInRuntime.h"
 
 template <typename Check>
 [[noreturn]] void ExitWith(Check check) {
@@ -26,6 +30,10 @@ inline void* LoadModule(const char* file) {
     return module;
 }
 
-inline FakeRuntime& LoadFakeRuntime() {
-    return *static_cast<FakeRuntime*>(dlsym(LoadModule(FAKE_RUNTIME), "fakeRuntime"));
+inline StandInRuntime& StandInOf(void* module) {
+    return *static_cast<StandInRuntime*>(dlsym(module, "standInRuntime"));
+}
+
+inline StandInRuntime& LoadStandInRuntime() {
+    return StandInOf(LoadModule(STAND_IN_RUNTIME));
 }

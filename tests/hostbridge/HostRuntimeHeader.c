@@ -1,0 +1,7 @@
+/* The header is plain C99 and stands alone. */
+#include "zkfpga/host_runtime.h"
+
+int32_t CallFromC(ZkHandle handle);
+int32_t CallFromC(ZkHandle handle) {
+    return HostDisposeHandle(handle);
+}
