@@ -18,7 +18,7 @@ using HostHandle = char**;
 // A path of the host.
 using HostPathReference = void*;
 
-static_assert(std::is_trivially_copyable_v<qn::dsc::Guid>, "a GUID is passed in registers, as C passes it");
+static_assert(std::is_trivially_copyable_v<qn::dsc::Guid>, "passed by value as C passes a GUID");
 
 // Makes the block `size` bytes; new ones are 0. 0 or the host's error code, as all results called codes below.
 int32_t HostSetHandleSizeClear(HostHandle handle, size_t size);

@@ -19,8 +19,8 @@ template <typename Check>
     std::_Exit(check() ? 0 : 9);
 }
 
-// Runs a lambda, which gives whether all is well, in a process of its own.
-#define EXPECT_IN_CHILD(...) EXPECT_EXIT(ExitWith(__VA_ARGS__), testing::ExitedWithCode(0), "")
+// Runs a lambda, which gives whether all is well, in a process of its own, which must have nothing to say.
+#define EXPECT_IN_CHILD(...) EXPECT_EXIT(ExitWith(__VA_ARGS__), testing::ExitedWithCode(0), "^$")
 
 inline void* LoadModule(const char* file) {
     void* module = dlopen(file, RTLD_NOW | RTLD_LOCAL);

@@ -95,12 +95,36 @@ TEST(RuntimeModule, LookingKeepsNoModuleLoaded) {
     });
 }
 
+TEST(RuntimeModule, EachIsFoundOnceThoseBeforeItHaveGone) {
+    EXPECT_IN_CHILD([] {
+        void* zkffrt = LoadModule(POOR_RUNTIME);
+        void* zkrt = LoadModule(STAND_IN_RUNTIME);
+        runtimeModule = &first;
+        runtimeTlsIndex = MakeSlot(&second);
+        bool found = FindRuntimeModule() == &second;
+        pthread_setspecific(runtimeTlsIndex, nullptr);
+        found = found && FindRuntimeModule() == &first;
+        runtimeModule = nullptr;
+        found = found && FindRuntimeModule() == zkrt;
+        dlclose(zkrt);
+        found = found && FindRuntimeModule() == zkffrt;
+        dlclose(zkffrt);
+        return found && FindRuntimeModule() == nullptr;
+    });
+}
+
 TEST(RuntimeModule, MainModuleThatExportsAVersionIsTheRuntime) {
     EXPECT_EQ(RunProgram(MAIN_MODULE_PROBES "/main_module_gZKRTVersion", {}, "/").end, "exit 0");
 }
 
 TEST(RuntimeModule, MainModuleThatMakesHandlesIsTheRuntime) {
     EXPECT_EQ(RunProgram(MAIN_MODULE_PROBES "/main_module_HostNewHandle", {}, "/").end, "exit 0");
+}
+
+TEST(RuntimeModule, MainModuleThatIsTheRuntimeComesBeforeLoadedOnes) {
+    EXPECT_EQ(RunProgram(MAIN_MODULE_PROBES "/main_module_gZKRTVersion", {STAND_IN_RUNTIME}, "/").end, "exit 0");
+    EXPECT_EQ(RunProgram(MAIN_MODULE_PROBES "/main_module_HostNewHandle", {STAND_IN_RUNTIME}, "/").end, "exit 0");
+    EXPECT_EQ(RunProgram(MAIN_MODULE_PROBES "/main_module_OtherName", {STAND_IN_RUNTIME}, "/").end, "exit 3");
 }
 
 TEST(RuntimeModule, MainModuleThatExportsSomethingElseIsNot) {
