@@ -7,6 +7,7 @@
 #include <vector>
 
 #include "restree/ResTreeNode.h"
+#include "restree/ReservationList.h"
 
 namespace zkhw {
 
@@ -26,6 +27,8 @@ struct ResTreeNode::Attachments {
     // Entries that a renaming over a sibling took from the collection. They live on, out of reach of any lookup, for
     // as long as this node does.
     std::vector<NodeEntry*> lostEntries;
+
+    std::unique_ptr<ReservationList> reservations;  // Null until the first reservation.
 };
 
 // How many observer records there are in the process. While there are none, nodes come and go without notices.

@@ -43,8 +43,15 @@ class NodeEntry {
     bool IsText() const { return kind == TextEntry || kind == LocalizedTextEntry; }
 
     // The value of a text entry of either kind; null for any other.
-    String* Text() { return IsText() ? &Payload() : nullptr; }
+    String* Text() {
+        textMarked = false;
+        return IsText() ? &Payload() : nullptr;
+    }
     const String* Text() const { return IsText() ? &Payload() : nullptr; }
+
+    // A mark on the text as it stands: it is gone as soon as the text is asked for in a form for writing.
+    void MarkText() { textMarked = true; }
+    bool IsTextMarked() const { return textMarked; }
 
     // The path of a link; null for any other kind.
     const String* LinkPath() const { return kind == LinkEntry ? &Payload() : nullptr; }
@@ -81,6 +88,7 @@ class NodeEntry {
     EntryPiece* piece = nullptr;  // The piece of a long list that holds the entry; null in a short list.
     EntryKind kind;
     bool textShape;  // Which shape was allocated; the kind may have become EmptyEntry since.
+    bool textMarked = false;
 };
 
 struct NodeEntry::TextShape : NodeEntry {

@@ -12,6 +12,7 @@ namespace {
 struct Kept {
     std::vector<ResTreeNode*> nodes;
     std::vector<NodeEntry*> entries;
+    bool hasWholeNodes = false;
 };
 
 constinit thread_local uint32_t depth = 0;
@@ -70,7 +71,13 @@ void ReleaseScope::Reserve() {
     }
 }
 
+bool ReleaseScope::HoldsWholeNodes() noexcept {
+    return kept != nullptr && kept->hasWholeNodes;
+}
+
 void ReleaseScope::Keep(ResTreeNode* node) noexcept {
+    node->isKept = true;
+    kept->hasWholeNodes |= !node->isDefunct;
     kept->nodes.push_back(node);
 }
 

@@ -20,6 +20,9 @@ class ReleaseScope {
 
     static bool IsActive() noexcept;
 
+    // True if a node that left a tree is kept whole.
+    static bool HoldsWholeNodes() noexcept;
+
     // Make sure that the next Keep can't fail. Throws bad_alloc.
     static void Reserve();
 

@@ -9,6 +9,7 @@
 
 #include <cstdint>
 #include <memory>
+#include <set>
 #include <string_view>
 #include <vector>
 
@@ -18,6 +19,7 @@
 #include "restree/EntryList.h"
 #include "restree/NodeEntry.h"
 #include "restree/ResTreeNodeChangeObserver.h"
+#include "restree/Reservation.h"
 #include "restree/TypeTable.h"
 
 namespace zkhw {
@@ -28,6 +30,7 @@ class ElementReader;
 class LoadChain;
 class Parameters;
 class ParseStack;
+class ReservationList;
 
 struct ObserverRecord {
     enum State : uint8_t {
@@ -224,8 +227,70 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     // A watched node changed: raises on this node what concerns it.
     void OnNodeChanged(ResTreeNode* node, uint32_t changes, int32_t context) override;
 
+    // --- Reservations ---
+    //
+    // A node can be held by several owners. The nodes that its "Reserves" names are its dependants: they are taken
+    // along, before it, and so are theirs. A node that a walk over dependants is just about is not entered again, so
+    // lists that lead round in a circle are harmless. The text "ZKHWReservation" shows who holds the node; it is
+    // there as long as anybody does, and changes without a notice of its own: ReservationChanged tells of it.
+    //
+    // Results of type uint32_t are sets of ReservationFlags. An owner may be any text; two that differ in case alone
+    // are one. A refusal tells nobody why. A throw (no memory, an observer) leaves what was taken until then taken:
+    // Release drops it; each single node is either changed or as it was. Observers may do what they like from inside:
+    // a node that has left its tree when its turn comes is passed over, and one that leaves while its dependants are
+    // taken counts as refused. A record costs logarithmic time to find, and where it isn't the last one, the time to
+    // move what follows it in "ZKHWReservation".
+
+    // Takes the node and its dependants, or nothing. Gives what ReserveOne gives for the node; 0 for a refusal, and
+    // then `owner` holds nothing any more on the nodes that were taken, not even what it had held there before.
+    uint32_t Reserve(const String& owner, uint32_t mode);
+
+    // Takes this node alone. 0, and nothing changes, if it is held exclusively, or written by anybody (also `owner`)
+    // and `mode` has ReserveWrite. ReserveExclusive drops all holders and gives `mode`. Otherwise `mode` replaces what
+    // `owner` had, and the result is that of all holders before, with `mode`. A `mode` of 0 on a node that nobody
+    // holds gives 0 all the same, but leaves a record, which the text shows from its next change on.
+    uint32_t ReserveOne(const String& owner, uint32_t mode);
+
+    // Takes the dependants, or nothing; false for a refusal. True also if there are none.
+    bool ReserveDependants(const String& owner, uint32_t mode);
+
+    // Takes all of CollectMatchingDescendants with their dependants, or nothing; false for a refusal.
+    bool ReserveAll(const String& owner, uint32_t mode, const String& filter);
+
+    // Drop what `owner` holds: here and on the dependants, from the last to the first; here alone; on the dependants
+    // alone; on all of CollectMatchingDescendants with their dependants. True if there was anything. Looking for
+    // "Reserves" never loads, and of the four only ReleaseAll loads what it walks over.
+    bool Release(const String& owner);
+    bool ReleaseOne(const String& owner);
+    bool ReleaseDependants(const String& owner);
+    bool ReleaseAll(const String& owner, const String& filter);
+
+    // How this node and all dependants are held: GetOwnReservationFlags of each, in one set. `owners` is a comma list,
+    // or null. May load.
+    uint32_t GetReservationFlags(const String* owners, bool except);
+
+    // How this node is held: by everybody, if `owners` is null; else the mode of the first record, and of that alone,
+    // whose owner is one of them, or with `except` is none of them. 0 if there is none.
+    uint32_t GetOwnReservationFlags(const std::set<String>* owners, bool except) const;
+
+    // Appends the owners of this node in order of their arrival or, if that gives nothing, those of the first
+    // dependant that has any; nothing if `list` isn't empty. With `activeOnly` without those whose mode has no flag.
+    // May load.
+    void GetReservationOwners(std::vector<String>& list, bool activeOnly);
+
+    // The records of this node, in order of arrival. Good until the next change of them.
+    const std::vector<Reservation>& GetReservations() const;
+
     // Appends the nodes that "Reserves" names; paths that lead nowhere are left out. Unless `raw`, a miss may load.
     void GetDependants(std::vector<ResTreeNode*>& list, bool raw);
+
+    // Appends the child nodes that support `filter` (see Supports; all of them if it is empty) and, below each of
+    // these, the same again, parents first. Links are not followed. Loads.
+    void CollectMatchingDescendants(const String& filter, std::vector<ResTreeNode*>& list);
+
+    // Makes "ZKHWReservation" show the records, or removes it if there are none. An entry of that name that is no text
+    // stays as it is while there are records. Whatever this raises on the node goes unreported.
+    void RefreshReservationProperty();
 
     // --- Paths ---
 
@@ -270,6 +335,7 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     friend class ChangeDispatch;
     friend class ElementReader;
     friend class ReleaseScope;
+    friend class ReservationWalk;
     struct Attachments;
     struct MergeWalk;
 
@@ -295,6 +361,15 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     static void ReleaseNode(ResTreeNode* node) noexcept;
     static void DestroySubtree(ResTreeNode* top) noexcept;
 
+    bool HasLeft() const;
+    ReservationList& MakeReservations();
+    ReservationList* OwnReservations() const;
+    void MirrorReservations();
+    template <typename Undo>
+    void RefreshReservations(Undo undo);
+    template <typename Visit>
+    static void VisitWithDependants(ResTreeNode& top, Visit visit);
+
     void RaiseObserved(uint32_t changes);
     bool Register(ResTreeNodeChangeObserver* observer, uint32_t mask, int32_t context, ResTreeNode* chained);
     bool Unregister(ResTreeNodeChangeObserver* observer, int32_t context);
@@ -317,6 +392,7 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     uint32_t suspendCount = 0;                 // Nonzero while delivery is held back.
     uint16_t pendingChanges = 0;               // ChangeFlags raised and not yet delivered.
     bool isDefunct = false;                    // Torn down; only the memory is left (ReleaseScope).
+    bool isKept = false;                       // Has left its tree, whole or torn down, and is kept by a ReleaseScope.
 };
 
 }  // namespace zkhw

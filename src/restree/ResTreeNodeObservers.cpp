@@ -259,18 +259,23 @@ void ResTreeNode::ForgetWatching() noexcept {
 
 void ResTreeNode::GetDependants(std::vector<ResTreeNode*>& list, bool raw) {
     constexpr std::u16string_view key = u"Reserves";
+    const ReleaseScope scope;
     const NodeEntry* entry = raw ? FindRaw(key) : Find(key);
     if (entry == nullptr || !entry->IsText()) {
         return;
     }
     std::vector<String> paths;
     SplitList(entry->Text()->View(), u',', paths, true);
-    const ReleaseScope scope;
+    const auto first = static_cast<std::ptrdiff_t>(list.size());
     for (const String& path : paths) {
         if (ResTreeNode* node = Lookup(path.View(), nullptr)) {
             list.push_back(node);
         }
     }
+    // A lookup may load, and so remove what an earlier one has found.
+    const auto left =
+        std::remove_if(list.begin() + first, list.end(), [](const ResTreeNode* node) { return node->HasLeft(); });
+    list.erase(left, list.end());
 }
 
 }  // namespace zkhw

@@ -115,6 +115,18 @@ void ResTreeNode::DestroySubtree(ResTreeNode* top) noexcept {
     }
 }
 
+// True if the node, or one above it, has left its tree since the outermost ReleaseScope began.
+bool ResTreeNode::HasLeft() const {
+    if (isDefunct || !ReleaseScope::HoldsWholeNodes()) {
+        return isDefunct;
+    }
+    const ResTreeNode* node = this;
+    while (node != nullptr && !node->isKept) {
+        node = node->parent;
+    }
+    return node != nullptr;
+}
+
 void ResTreeNode::ReleaseNode(ResTreeNode* node) noexcept {
     if (ObserverCount::IsZero()) {
         if (ReleaseScope::IsActive()) {
