@@ -39,6 +39,11 @@ void EntryList::ReleaseContainer() noexcept {
 }
 
 void EntryList::Reset(bool newOrdered) noexcept {
+    if (isLong) {
+        for (EntryPosition position = Begin(); !position.IsEnd(); position = Next(position)) {
+            At(position)->piece = nullptr;
+        }
+    }
     ReleaseContainer();
     ordered = newOrdered;
 }

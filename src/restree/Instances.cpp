@@ -5,17 +5,23 @@ namespace zkhw {
 void ReplicateInstances(ParseFrame& frame) {
     ResTreeNode& node = *frame.node;
     frame.position = nullptr;
-    EntryIterator last = node.FindEntry(frame.instances.front().name.View());
-    ResTreeNode* pattern = last.IsEnd() ? nullptr : last->Child();
+    const NodeEntry* last = node.Find(frame.instances.front().name.View());
+    ResTreeNode* pattern = last == nullptr ? nullptr : last->Child();
     if (pattern == nullptr) {
         return;
     }
     for (size_t i = 1; i < frame.instances.size(); ++i) {
         const InstanceRecord& record = frame.instances[i];
+        // Found anew each time: observers and deferred loads may have changed the node since.
+        EntryIterator behind = node.PositionOf(last);
+        if (!behind.IsEnd()) {
+            ++behind;
+        }
         ResTreeNode* copy = nullptr;
-        ++last;
-        last = node.CloneSubtreeInto(last, record.name.View(), *pattern, frame.mergeExisting, copy);
+        const EntryIterator placed =
+            node.CloneSubtreeInto(behind, record.name.View(), *pattern, frame.mergeExisting, copy);
         if (copy != nullptr) {
+            last = &*placed;
             copy->ApplyInstance(record.name, record.variable, record.index);
         }
     }

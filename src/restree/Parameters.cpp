@@ -6,6 +6,7 @@
 
 #include "qn/dsc/osdep/Compare.h"
 #include "qn/dsc/osdep/IntegerToString.h"
+#include "restree/EntryWalk.h"
 #include "restree/ParseStack.h"
 #include "restree/ReleaseScope.h"
 #include "restree/TextList.h"
@@ -169,27 +170,24 @@ String ExpandVariables(const String& text, const Parameters& parameters) {
 void ResTreeNode::ApplyParameters(const Parameters& parameters) {
     struct Level {
         ResTreeNode* node;
-        EntryPosition next;
+        EntryWalk walk;
     };
     const ReleaseScope scope;
     std::vector<Level> levels;
     EnsureDeferredLoaded();
-    levels.push_back({this, entries.Begin()});
+    levels.push_back({this, {}});
     while (!levels.empty()) {
         Level& level = levels.back();
-        if (level.next.IsEnd()) {
+        NodeEntry* entry = level.walk.Next(level.node->entries);
+        if (entry == nullptr) {
             levels.pop_back();
-            continue;
-        }
-        NodeEntry* entry = level.node->entries.At(level.next);
-        level.next = level.node->entries.Next(level.next);
-        if (const String* text = entry->Text()) {
+        } else if (const String* text = entry->Text()) {
             if (HasVariables(*text)) {
                 level.node->SetEntryText(entry, ExpandVariables(*text, parameters));
             }
         } else if (ResTreeNode* child = entry->Child()) {
             child->EnsureDeferredLoaded();
-            levels.push_back({child, child->entries.Begin()});
+            levels.push_back({child, {}});
         }
     }
 }

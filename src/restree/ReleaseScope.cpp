@@ -16,6 +16,7 @@ struct Kept {
 };
 
 constinit thread_local uint32_t depth = 0;
+constinit thread_local uint64_t countOfNodes = 0;
 
 // Null while nothing is kept. Neither is destroyed at the end of a thread: the tree of the process is taken down when
 // that of the main thread is over.
@@ -59,6 +60,10 @@ bool ReleaseScope::IsActive() noexcept {
     return depth != 0;
 }
 
+uint64_t ReleaseScope::CountOfNodes() noexcept {
+    return countOfNodes;
+}
+
 void ReleaseScope::Reserve() {
     if (kept == nullptr) {
         kept = new Kept;
@@ -78,6 +83,7 @@ bool ReleaseScope::HoldsWholeNodes() noexcept {
 void ReleaseScope::Keep(ResTreeNode* node) noexcept {
     node->isKept = true;
     kept->hasWholeNodes |= !node->isDefunct;
+    ++countOfNodes;
     kept->nodes.push_back(node);
 }
 

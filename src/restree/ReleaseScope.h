@@ -23,6 +23,9 @@ class ReleaseScope {
     // True if a node that left a tree is kept whole.
     static bool HoldsWholeNodes() noexcept;
 
+    // How many nodes have been kept on this thread so far, those of former scopes included.
+    static uint64_t CountOfNodes() noexcept;
+
     // Make sure that the next Keep can't fail. Throws bad_alloc.
     static void Reserve();
 

@@ -77,6 +77,11 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     const String& GetName() const { return name; }
     const String& GetType() const { return type; }
     ResTreeNode* GetParent() const { return parent; }
+
+    // Whether the node, or one above it, has left its tree since the outermost ReleaseScope began, which alone still
+    // keeps it. At most linear in its depth; constant as long as nothing was removed.
+    bool HasLeft() const;
+
     bool IsOrdered() const { return entries.IsOrdered(); }
 
     // The entries as they stand.
@@ -97,8 +102,10 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     EntryIterator FindEntry(std::u16string_view key);
     NodeEntry* Find(std::u16string_view key);
 
-    // The position of an entry of this node.
-    EntryIterator PositionOf(const NodeEntry* entry) { return {entries, entries.Locate(entry)}; }
+    // The position of an entry of this node; the end if it has been removed, where a ReleaseScope still keeps it.
+    EntryIterator PositionOf(const NodeEntry* entry) {
+        return {entries, StillHolds(entry) ? entries.Locate(entry) : EntryList::End()};
+    }
 
     // The value of the text entry `key`; null if there is none or the entry is of another kind. May load (FindEntry).
     // The result lives in the node until the entry is changed or removed.
@@ -169,7 +176,8 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     void MergeFrom(ResTreeNode& source, bool overwrite);
 
     // Makes `source` or its contents the child `key` at `position`, and gives that child. An entry of that name goes,
-    // except that with `overwrite` a child of the same type and order stays and receives the merge.
+    // except that with `overwrite` a child of the same type and order stays and receives the merge. Null and the end
+    // if an observer has removed the child meanwhile.
     EntryIterator CloneSubtreeInto(EntryIterator position, std::u16string_view key, ResTreeNode& source, bool overwrite,
                                    ResTreeNode*& child);
 
@@ -282,6 +290,7 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     const std::vector<Reservation>& GetReservations() const;
 
     // Appends the nodes that "Reserves" names; paths that lead nowhere are left out. Unless `raw`, a miss may load.
+    // Looking the paths up may load as well. What a load removes on the way is not given.
     void GetDependants(std::vector<ResTreeNode*>& list, bool raw);
 
     // Appends the child nodes that support `filter` (see Supports; all of them if it is empty) and, below each of
@@ -361,7 +370,6 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     static void ReleaseNode(ResTreeNode* node) noexcept;
     static void DestroySubtree(ResTreeNode* top) noexcept;
 
-    bool HasLeft() const;
     ReservationList& MakeReservations();
     ReservationList* OwnReservations() const;
     void MirrorReservations();
@@ -378,6 +386,7 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     static bool RemoveRecords(ResTreeNode& node, ResTreeNodeChangeObserver* observer, int32_t context);
     void ForgetWatching() noexcept;
     bool AnyActiveObserver(uint32_t mask) const;
+    void LookUpAll(const std::vector<String>& paths, std::vector<ResTreeNode*>& list);
 
     int32_t LoadIncludedFile(const NarrowString& path, bool asChild, ResTreeNode** node, const LoadChain& includer);
     int32_t LoadFile(const NarrowString& path, bool asChild, ResTreeNode** node, const LoadChain& chain);

@@ -5,6 +5,7 @@
 #include <utility>
 #include <vector>
 
+#include "restree/EntryWalk.h"
 #include "restree/NodePath.h"
 #include "restree/ReleaseScope.h"
 #include "restree/ResTreeNode.h"
@@ -16,8 +17,9 @@ struct ResTreeNode::MergeWalk {
     struct Level {
         ResTreeNode* target;
         ResTreeNode* source;
-        EntryPosition position;
-        const NodeEntry* entry = nullptr;  // At `position`; null before the first.
+        // What is done for an entry may change the source: observers do, and a source that stands below the target
+        // can be replaced or filled by the merge itself.
+        EntryWalk walk;
         // Paths of the two, made for the first link.
         String sourcePath = String::WithoutBuffer();
         String targetPath = String::WithoutBuffer();
@@ -46,25 +48,17 @@ struct ResTreeNode::MergeWalk {
 void ResTreeNode::MergeWalk::Run() {
     while (!levels.empty()) {
         Level& level = levels.back();
-        // What was done for the last entry may have changed the source: observers do, and a source that stands below
-        // the target can be replaced or filled by the merge itself.
-        const EntryList& sourceEntries = level.source->entries;
-        level.position =
-            level.entry == nullptr ? sourceEntries.Begin() : sourceEntries.Following(level.position, level.entry);
-        if (level.position.IsEnd()) {
+        const NodeEntry* entry = level.walk.Next(level.source->entries);
+        if (entry == nullptr) {
             levels.pop_back();
-            continue;
-        }
-        level.entry = sourceEntries.At(level.position);
-        const NodeEntry& entry = *level.entry;
-        if (entry.IsText()) {
-            MergeText(*level.target, entry);
-        } else if (entry.LinkPath() != nullptr) {
-            MergeLink(level, entry);
-        } else if (ResTreeNode* sourceChild = entry.Child(); sourceChild != nullptr && sourceChild != top) {
+        } else if (entry->IsText()) {
+            MergeText(*level.target, *entry);
+        } else if (entry->LinkPath() != nullptr) {
+            MergeLink(level, *entry);
+        } else if (ResTreeNode* sourceChild = entry->Child(); sourceChild != nullptr && sourceChild != top) {
             NodeEntry* placed = nullptr;
-            if (ResTreeNode* child =
-                    level.target->PrepareClone(EntryList::End(), entry.Key().View(), *sourceChild, overwrite, placed)) {
+            if (ResTreeNode* child = level.target->PrepareClone(EntryList::End(), entry->Key().View(), *sourceChild,
+                                                                overwrite, placed)) {
                 Enter(*child, *sourceChild);
             }
         }
@@ -101,7 +95,7 @@ void ResTreeNode::MergeFrom(ResTreeNode& source, bool overwrite) {
 }
 
 // All of CloneSubtreeInto but the merge. Gives the child that is to receive it, or null if another kind of entry holds
-// the place.
+// the place or an observer has removed the child already.
 ResTreeNode* ResTreeNode::PrepareClone(EntryPosition position, std::u16string_view key, ResTreeNode& source,
                                        bool overwrite, NodeEntry*& entry) {
     if (IsOrdered()) {
@@ -126,7 +120,7 @@ ResTreeNode* ResTreeNode::PrepareClone(EntryPosition position, std::u16string_vi
     }
     ResTreeNode* child = nullptr;
     entry = AddChildAt(position, String(key), String(source.type), source.IsOrdered(), child).entry;
-    return child;
+    return StillHolds(entry) ? child : nullptr;
 }
 
 EntryIterator ResTreeNode::CloneSubtreeInto(EntryIterator position, std::u16string_view key, ResTreeNode& source,
@@ -137,7 +131,11 @@ EntryIterator ResTreeNode::CloneSubtreeInto(EntryIterator position, std::u16stri
     if (child != nullptr) {
         child->MergeFrom(source, overwrite);
     }
-    return PositionOf(entry);
+    const EntryIterator placed = PositionOf(entry);
+    if (placed.IsEnd()) {
+        child = nullptr;
+    }
+    return placed;
 }
 
 std::unique_ptr<ResTreeNode> ResTreeNode::Clone() {

@@ -167,6 +167,10 @@ bool ResTreeNode::WatchDependants() {
         open.pop_back();
         dependants.clear();
         node->GetDependants(dependants, false);
+        // The load of a deferred content may have removed the node itself, or one that an earlier step has found.
+        if (node->isDefunct) {
+            continue;
+        }
         for (ResTreeNode* dependant : dependants) {
             anyNew |= dependant->Register(node, ReservationChanged, dependantContext, node);
         }
@@ -266,16 +270,25 @@ void ResTreeNode::GetDependants(std::vector<ResTreeNode*>& list, bool raw) {
     }
     std::vector<String> paths;
     SplitList(entry->Text()->View(), u',', paths, true);
-    const auto first = static_cast<std::ptrdiff_t>(list.size());
+    const size_t first = list.size();
+    const uint64_t removals = ReleaseScope::CountOfNodes();
+    LookUpAll(paths, list);
+    if (ReleaseScope::CountOfNodes() != removals) {
+        // A load on the way has removed nodes, and what was found before it may be among them. All is loaded now.
+        list.resize(first);
+        LookUpAll(paths, list);
+        list.erase(std::remove_if(list.begin() + static_cast<std::ptrdiff_t>(first), list.end(),
+                                  [](const ResTreeNode* node) { return node->HasLeft(); }),
+                   list.end());
+    }
+}
+
+void ResTreeNode::LookUpAll(const std::vector<String>& paths, std::vector<ResTreeNode*>& list) {
     for (const String& path : paths) {
         if (ResTreeNode* node = Lookup(path.View(), nullptr)) {
             list.push_back(node);
         }
     }
-    // A lookup may load, and so remove what an earlier one has found.
-    const auto left =
-        std::remove_if(list.begin() + first, list.end(), [](const ResTreeNode* node) { return node->HasLeft(); });
-    list.erase(left, list.end());
 }
 
 }  // namespace zkhw

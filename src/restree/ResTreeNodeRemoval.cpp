@@ -115,7 +115,6 @@ void ResTreeNode::DestroySubtree(ResTreeNode* top) noexcept {
     }
 }
 
-// True if the node, or one above it, has left its tree since the outermost ReleaseScope began.
 bool ResTreeNode::HasLeft() const {
     if (isDefunct || !ReleaseScope::HoldsWholeNodes()) {
         return isDefunct;

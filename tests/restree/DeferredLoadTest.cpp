@@ -1,11 +1,15 @@
 // Nodes whose contents are read on the first lookup that misses.
 
 #include <cerrno>
+#include <memory>
 #include <string>
+#include <vector>
 
 #include <gtest/gtest.h>
 
 #include "restree/ReadTree.h"
+#include "restree/ReleaseScope.h"
+#include "support/ChangeLog.h"
 
 namespace zkhw {
 namespace {
@@ -198,6 +202,83 @@ TEST_F(DeferredLoad, ThousandsOfParentsInARowAreAskedWithoutTheStack) {
     }
     EXPECT_TRUE(innermost->EnsureDeferredLoaded());
     EXPECT_EQ(TextAt(*deep, u"V"), "top");
+}
+
+// --- Loads that remove nodes which "Reserves" has led to ---
+
+// The stub "s" holds X, which its file replaces; "w" reserves X and then something that only the file has.
+class DependantsOfALoad : public DeferredLoad {
+  protected:
+    DependantsOfALoad() {
+        Load(*root, "<R><A name='a'><S name='s'><X name='X'><Y name='Y'/></X></S></A><W name='w'/></R>");
+        Write("board.xml", "<S><X name='X' replace='true'><New>1</New></X><Z name='Z'/></S>");
+        Defer(Stub(), u"board.xml");
+        w = &At(*root, u"w");
+        old = &At(*root, u"a/s/X");
+    }
+    ~DependantsOfALoad() override { root->RemoveObserver(&observer, -1, true); }
+
+    ChangeLog log;
+    LoggingObserver observer{log, "o"};
+    ResTreeNode* w = nullptr;
+    ResTreeNode* old = nullptr;
+};
+
+TEST_F(DependantsOfALoad, AreThoseThatStandAfterIt) {
+    w->SetProperty(u"Reserves", u"../a/s/X,../a/s/X/Y,../a/s/Z");
+    const ReleaseScope scope;
+    std::vector<ResTreeNode*> dependants;
+    w->GetDependants(dependants, false);
+    EXPECT_EQ(dependants, (std::vector<ResTreeNode*>{&At(*root, u"a/s/X"), &At(*root, u"a/s/Z")}));
+    EXPECT_NE(dependants.front(), old);
+}
+
+TEST_F(DependantsOfALoad, StandAfterItUnderObserversToo) {
+    root->AddObserver(&observer, ChildNameChanged, 0);
+    w->SetProperty(u"Reserves", u"../a/s/X,../a/s/X/Y,../a/s/Z");
+    const ReleaseScope scope;
+    std::vector<ResTreeNode*> dependants;
+    w->GetDependants(dependants, true);
+    EXPECT_EQ(dependants, (std::vector<ResTreeNode*>{&At(*root, u"a/s/X"), &At(*root, u"a/s/Z")}));
+    EXPECT_NE(dependants.front(), old);
+}
+
+TEST_F(DependantsOfALoad, AreAppendedToWhatIsThere) {
+    w->SetProperty(u"Reserves", u"../a/s/X,../a/s/Z");
+    std::vector<ResTreeNode*> dependants{w};
+    w->GetDependants(dependants, false);
+    EXPECT_EQ(dependants, (std::vector<ResTreeNode*>{w, &At(*root, u"a/s/X"), &At(*root, u"a/s/Z")}));
+}
+
+TEST_F(DependantsOfALoad, OnlyThoseThatStandAreWatched) {
+    w->SetProperty(u"Reserves", u"../a/s/X,../a/s/Z");
+    EXPECT_TRUE(w->AddObserver(&observer, ReservationChanged, 7));
+    log.Take();
+    At(*root, u"a/s/X").Raise(ReservationChanged);
+    EXPECT_EQ(log.Take(), "o: w ReservationChanged #7\n");
+    At(*root, u"a/s/Z").Raise(ReservationChanged);
+    EXPECT_EQ(log.Take(), "o: w ReservationChanged #7\n");
+}
+
+TEST_F(DependantsOfALoad, OfADependantThatGoesAreNotWatched) {
+    // X leads on to the stub and is replaced when its own dependants are looked up.
+    w->SetProperty(u"Reserves", u"../a/s/X");
+    old->SetProperty(u"Reserves", u"../../../w,../Z");
+    EXPECT_TRUE(w->AddObserver(&observer, ReservationChanged, 7));
+    log.Take();
+    At(*root, u"a/s/X").Raise(ReservationChanged);
+    At(*root, u"a/s/Z").Raise(ReservationChanged);
+    EXPECT_EQ(log.Take(), "");
+    w->Raise(ReservationChanged);
+    EXPECT_EQ(log.Take(), "o: w ReservationChanged #7\n");
+}
+
+TEST_F(DependantsOfALoad, OfTheNodeItselfThatGoesAreNotWatched) {
+    old->SetProperty(u"Reserves", u"../../../w,../Z");
+    EXPECT_TRUE(old->AddObserver(&observer, ReservationChanged, 7));
+    log.Take();
+    w->Raise(ReservationChanged);
+    EXPECT_EQ(log.Take(), "");
 }
 
 }  // namespace

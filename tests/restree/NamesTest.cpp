@@ -1,10 +1,13 @@
 // Elements with "names": read once, and copied when they are complete.
 
+#include <memory>
 #include <string>
 
 #include <gtest/gtest.h>
 
 #include "restree/ReadTree.h"
+#include "support/ChangeLog.h"
+#include "support/TreeMaking.h"
 
 namespace zkhw {
 namespace {
@@ -412,6 +415,65 @@ TEST(Names, ManyCopiesAreMadeInOrder) {
         EXPECT_EQ(count, 20001);
         EXPECT_EQ(TextAt(At(*root, u"P20000"), u"V"), "20000");
     }
+}
+
+// --- Observers that change the node in which copies are made ---
+
+// A root with the child A, and an observer of A.
+class NamesUnderObservers : public ::testing::TestWithParam<bool> {
+  protected:
+    NamesUnderObservers() {
+        a = AddChild(*root, u"A", u"A", GetParam());
+        a->AddObserver(&observer, ChildAdded, 5);
+    }
+    ~NamesUnderObservers() override { root->RemoveObserver(&observer, -1, true); }
+
+    // Reads copies P1 to P9 into A; `removed` goes as soon as child number `at` has come. What stands then, with the
+    // value of each, or "-".
+    std::string Read(int at, const std::string& removed) {
+        observer.reaction = [this, at, removed](ResTreeNode&, uint32_t) {
+            if (++heard == at) {
+                a->RemoveEntryByName(Wide(removed).View());
+            }
+        };
+        const std::string ordered = GetParam() ? " ordered='true'" : "";
+        EXPECT_EQ(root->LoadResourceText(
+                      Wide("<Root><A" + ordered + "><P names='P[i=1..9]'><V>#{i}</V></P></A></Root>"), false, nullptr),
+                  0);
+        std::string names;
+        for (EntryIterator entry = a->Begin(); !entry.IsEnd(); ++entry) {
+            const NodeEntry* value = entry->Child()->FindRaw(u"V");
+            names += qn::dsc::ExactText(entry->Key()) + "=" +
+                     (value == nullptr ? "-" : qn::dsc::ExactText(*value->Text())) + " ";
+        }
+        return names;
+    }
+
+    ChangeLog log;
+    LoggingObserver observer{log, "o"};
+    int heard = 0;
+    std::unique_ptr<ResTreeNode> root = MakeRootNode();
+    ResTreeNode* a = nullptr;
+};
+
+INSTANTIATE_TEST_SUITE_P(BothForms, NamesUnderObservers, ::testing::Bool(),
+                         [](const auto& form) { return form.param ? "Ordered" : "Unordered"; });
+
+TEST_P(NamesUnderObservers, CopyMayGoAtOnce) {
+    EXPECT_EQ(Read(4, "P4"), "P1=1 P2=2 P3=3 P5=5 P6=6 P7=7 P8=8 P9=9 ");
+}
+
+TEST_P(NamesUnderObservers, LastCopyMayGoAtOnce) {
+    EXPECT_EQ(Read(9, "P9"), "P1=1 P2=2 P3=3 P4=4 P5=5 P6=6 P7=7 P8=8 ");
+}
+
+TEST_P(NamesUnderObservers, EarlierCopyMayGo) {
+    EXPECT_EQ(Read(5, "P3"), "P1=1 P2=2 P4=4 P5=5 P6=6 P7=7 P8=8 P9=9 ");
+}
+
+TEST_P(NamesUnderObservers, PatternMayGo) {
+    // It is torn down with its notices, so the copies of it that are still to come are empty.
+    EXPECT_EQ(Read(2, "P1"), "P2=- P3=- P4=- P5=- P6=- P7=- P8=- P9=- ");
 }
 
 }  // namespace

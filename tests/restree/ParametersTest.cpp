@@ -1,11 +1,16 @@
 #include "restree/Parameters.h"
 
+#include <functional>
+#include <memory>
 #include <string>
+#include <tuple>
 #include <utility>
 
 #include <gtest/gtest.h>
 
 #include "restree/ReadTree.h"
+#include "support/ChangeLog.h"
+#include "support/TreeMaking.h"
 
 namespace zkhw {
 namespace {
@@ -292,6 +297,143 @@ TEST(ApplyParameters, InstanceWithoutAVariableHasItsNameAlone) {
     Load(*root, "<R><V>#{name} #{i} #{}</V></R>");
     root->ApplyInstance(u"n", u"", 5);
     EXPECT_EQ(TextAt(*root, u"V"), "n #{i} #{}");
+}
+
+// --- Observers that change what is being expanded ---
+
+// A root with "count" texts "#{K}" under the keys 1000, 1001, ... and an observer of them, which acts once.
+class ExpandedUnderObservers : public ::testing::TestWithParam<std::tuple<bool, int>> {
+  protected:
+    ExpandedUnderObservers() {
+        for (int i = 0; i < Count(); ++i) {
+            root->AddTextEntry(Key(i), String(u"#{K}"), TextEntry);
+        }
+        values.emplace(u"K", u"k");
+    }
+    ~ExpandedUnderObservers() override { root->RemoveObserver(&observer, -1, true); }
+
+    static int Count() { return std::get<1>(GetParam()); }
+    static String Key(int i) { return Wide(std::to_string(1000 + i)); }
+
+    void Once(ResTreeNode& node, std::function<void()> action) {
+        node.AddObserver(&observer, PropertyChanged, 0);
+        observer.reaction = [action = std::move(action), done = false](ResTreeNode&, uint32_t) mutable {
+            if (!std::exchange(done, true)) {
+                action();
+            }
+        };
+    }
+    void Apply() { root->ApplyParameters(MapParameters(std::move(values))); }
+
+    // How many texts of `node` there are, all of which must have been expanded.
+    static int CountExpanded(ResTreeNode& node) {
+        int count = 0;
+        for (EntryIterator entry = node.Begin(); !entry.IsEnd(); ++entry) {
+            if (entry->Text() != nullptr) {
+                EXPECT_EQ(ExactText(*entry->Text()), "k") << ExactText(entry->Key());
+                ++count;
+            }
+        }
+        return count;
+    }
+
+    ChangeLog log;
+    LoggingObserver observer{log, "o"};
+    std::unique_ptr<ResTreeNode> root = MakeRootNode(std::get<0>(GetParam()));
+    ParameterMap values;
+};
+
+INSTANTIATE_TEST_SUITE_P(BothForms, ExpandedUnderObservers,
+                         ::testing::Combine(::testing::Bool(), ::testing::Values(3, 32, 500)), [](const auto& form) {
+                             return std::string(std::get<0>(form.param) ? "Ordered" : "Unordered") +
+                                    std::to_string(std::get<1>(form.param));
+                         });
+
+TEST_P(ExpandedUnderObservers, EntryThatWasJustExpandedMayGo) {
+    Once(*root, [this] { root->RemoveEntryByName(Key(0).View()); });
+    Apply();
+    EXPECT_EQ(CountExpanded(*root), Count() - 1);
+}
+
+TEST_P(ExpandedUnderObservers, EveryEntryMayGoWhenItHasBeenExpanded) {
+    root->AddObserver(&observer, PropertyChanged, 0);
+    observer.reaction = [this](ResTreeNode& node, uint32_t) { node.RemoveEntry(node.Begin()); };
+    Apply();
+    EXPECT_EQ(CountExpanded(*root), 0);
+}
+
+TEST_P(ExpandedUnderObservers, NextEntryMayGo) {
+    Once(*root, [this] { root->RemoveEntryByName(Key(1).View()); });
+    Apply();
+    EXPECT_EQ(CountExpanded(*root), Count() - 1);
+}
+
+TEST_P(ExpandedUnderObservers, LastEntryMayGoWhileItIsNext) {
+    int heard = 0;
+    root->AddObserver(&observer, PropertyChanged, 0);
+    observer.reaction = [&](ResTreeNode&, uint32_t) {
+        if (++heard == Count() - 1) {
+            root->RemoveEntryByName(Key(Count() - 1).View());
+        }
+    };
+    Apply();
+    EXPECT_EQ(heard, Count() - 1);
+    EXPECT_EQ(CountExpanded(*root), Count() - 1);
+}
+
+TEST_P(ExpandedUnderObservers, AllEntriesMayGo) {
+    Once(*root, [this] {
+        while (!root->Begin().IsEnd()) {
+            root->RemoveEntry(root->Begin());
+        }
+    });
+    Apply();
+    EXPECT_TRUE(root->Begin().IsEnd());
+}
+
+TEST_P(ExpandedUnderObservers, EntriesMayComeInFront) {
+    Once(*root, [this] {
+        const String first = Key(0);
+        for (int i = 0; i < 200; ++i) {
+            root->AddTextEntry(Wide("0" + std::to_string(1000 + i)), String(u"k"), TextEntry, &first);
+        }
+    });
+    Apply();
+    EXPECT_EQ(CountExpanded(*root), Count() + 200);
+}
+
+TEST_P(ExpandedUnderObservers, EntriesThatComeBehindAreExpandedToo) {
+    Once(*root, [this] {
+        for (int i = 0; i < 200; ++i) {
+            root->AddTextEntry(Wide("z" + std::to_string(1000 + i)), String(u"#{K}"), TextEntry);
+        }
+    });
+    Apply();
+    EXPECT_EQ(CountExpanded(*root), Count() + 200);
+}
+
+TEST_P(ExpandedUnderObservers, ChildThatIsBeingWalkedMayGo) {
+    ResTreeNode* child = AddChild(*root, u"0child", u"T", std::get<0>(GetParam()));
+    AddChild(*root, u"zchild");
+    AddText(*root->Lookup(u"zchild", nullptr), u"V", u"#{K}");
+    for (int i = 0; i < Count(); ++i) {
+        child->AddTextEntry(Key(i), String(u"#{K}"), TextEntry);
+    }
+    Once(*child, [this] { root->RemoveEntryByName(u"0child"); });
+    Apply();
+    EXPECT_EQ(root->Lookup(u"0child", nullptr), nullptr);
+    EXPECT_EQ(CountExpanded(*root), Count());
+    EXPECT_EQ(CountExpanded(*root->Lookup(u"zchild", nullptr)), 1);
+}
+
+TEST_P(ExpandedUnderObservers, NodeItselfMayGo) {
+    ResTreeNode* child = AddChild(*root, u"child", u"T", std::get<0>(GetParam()));
+    for (int i = 0; i < Count(); ++i) {
+        child->AddTextEntry(Key(i), String(u"#{K}"), TextEntry);
+    }
+    Once(*child, [this] { root->RemoveEntryByName(u"child"); });
+    child->ApplyParameters(MapParameters(std::move(values)));
+    EXPECT_EQ(root->Lookup(u"child", nullptr), nullptr);
 }
 
 class ParametersOfFiles : public ResourceFiles {};

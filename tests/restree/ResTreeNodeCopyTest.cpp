@@ -1,5 +1,8 @@
+#include <functional>
 #include <memory>
 #include <string>
+#include <tuple>
+#include <utility>
 
 #include <gtest/gtest.h>
 
@@ -652,6 +655,118 @@ TEST(MergeNotices, ObserverMayRemoveTheTargetMeanwhile) {
     target->AddObserver(&observer, ChildAdded, 5);
     target->MergeFrom(source, false);
     EXPECT_EQ(DumpTree(*root), "Root:Root\n");
+}
+
+// --- Observers that change the target of a clone ---
+
+// A root with texts a000, a001, ... and an observer of it; a source with a child and a text.
+class CloneUnderObservers : public ::testing::TestWithParam<std::tuple<bool, int>> {
+  protected:
+    CloneUnderObservers() {
+        for (int i = 0; i < std::get<1>(GetParam()); ++i) {
+            std::string key = std::to_string(1000 + i);
+            key.front() = 'a';
+            root->AddTextEntry(String(key.c_str()), String(), TextEntry);
+        }
+        AddText(*AddChild(source, u"c"), u"d", u"1");
+        AddText(source, u"e", u"2");
+    }
+    ~CloneUnderObservers() override { root->RemoveObserver(&observer, -1, true); }
+
+    void At(uint32_t changes, std::function<void()> action) {
+        root->AddObserver(&observer, changes, 5);
+        observer.reaction = [action = std::move(action), done = false](ResTreeNode&, uint32_t) mutable {
+            if (!std::exchange(done, true)) {
+                action();
+            }
+        };
+    }
+    // Clones `source` as "copy" to the place of `before`, or to the end.
+    EntryIterator Clone(const char16_t* before, bool overwrite = false) {
+        child = &source;
+        return root->CloneSubtreeInto(before == nullptr ? root->End() : root->FindEntryRaw(before), u"copy", source,
+                                      overwrite, child);
+    }
+    void RemoveAll() {
+        while (!root->Begin().IsEnd()) {
+            root->RemoveEntry(root->Begin());
+        }
+    }
+
+    ChangeLog log;
+    LoggingObserver observer{log, "o"};
+    std::unique_ptr<ResTreeNode> root = MakeRootNode(std::get<0>(GetParam()));
+    ResTreeNode source{u"S", u"T", false, noTable};
+    ResTreeNode* child = nullptr;
+};
+
+INSTANTIATE_TEST_SUITE_P(BothForms, CloneUnderObservers,
+                         ::testing::Combine(::testing::Bool(), ::testing::Values(1, 31, 32, 500)),
+                         [](const auto& form) {
+                             return std::string(std::get<0>(form.param) ? "Ordered" : "Unordered") +
+                                    std::to_string(std::get<1>(form.param));
+                         });
+
+TEST_P(CloneUnderObservers, NewChildMayGoAtOnce) {
+    At(ChildAdded, [this] { root->RemoveEntryByName(u"copy"); });
+    EXPECT_TRUE(Clone(u"a000").IsEnd());
+    EXPECT_EQ(child, nullptr);
+    EXPECT_TRUE(root->FindEntryRaw(u"copy").IsEnd());
+}
+
+TEST_P(CloneUnderObservers, NewChildMayBeReplacedAtOnce) {
+    At(ChildAdded, [this] {
+        root->RemoveEntryByName(u"copy");
+        AddText(*root, u"copy", u"x");
+    });
+    EXPECT_TRUE(Clone(u"a000").IsEnd());
+    EXPECT_EQ(child, nullptr);
+    EXPECT_EQ(TextOf(*root, u"copy"), "x");
+}
+
+TEST_P(CloneUnderObservers, AllEntriesMayGoWhenTheChildIsAdded) {
+    At(ChildAdded, [this] { RemoveAll(); });
+    EXPECT_TRUE(Clone(u"a000").IsEnd());
+    EXPECT_EQ(child, nullptr);
+    EXPECT_TRUE(root->Begin().IsEnd());
+}
+
+TEST_P(CloneUnderObservers, AllOtherEntriesMayGoWhenTheChildIsAdded) {
+    At(ChildAdded, [this] {
+        for (int i = 0; i < std::get<1>(GetParam()); ++i) {
+            std::string key = std::to_string(1000 + i);
+            key.front() = 'a';
+            root->RemoveEntryByName(String(key.c_str()).View());
+        }
+    });
+    const EntryIterator placed = Clone(nullptr);
+    ASSERT_FALSE(placed.IsEnd());
+    EXPECT_EQ(placed->Child(), child);
+    EXPECT_EQ(DumpTree(*root).substr(DumpTree(*root).find('\n') + 1), "  copy:T\n    c:T\n      d=1\n    e=2\n");
+}
+
+TEST_P(CloneUnderObservers, NewChildMayGoWhileItIsFilled) {
+    LoggingObserver inner(log, "i");
+    At(ChildAdded, [&] { root->Lookup(u"copy", nullptr)->AddObserver(&inner, ChildAdded, 5); });
+    inner.reaction = [this](ResTreeNode&, uint32_t) { root->RemoveEntryByName(u"copy"); };
+    EXPECT_TRUE(Clone(u"a000").IsEnd());
+    EXPECT_EQ(child, nullptr);
+}
+
+TEST_P(CloneUnderObservers, AllEntriesMayGoWithTheOldChild) {
+    AddChild(*root, u"copy", u"Other");
+    At(ChildRemoved, [this] { RemoveAll(); });
+    const EntryIterator placed = Clone(u"a000", true);
+    ASSERT_FALSE(placed.IsEnd());
+    EXPECT_EQ(placed->Child(), child);
+    EXPECT_EQ(DumpTree(*root).substr(DumpTree(*root).find('\n') + 1), "  copy:T\n    c:T\n      d=1\n    e=2\n");
+}
+
+TEST_P(CloneUnderObservers, ChildOfAMergeMayGoAtOnce) {
+    At(ChildAdded, [this] { root->RemoveEntryByName(u"c"); });
+    root->MergeFrom(source, false);
+    EXPECT_EQ(root->FindRaw(u"c"), nullptr);
+    EXPECT_EQ(TextOf(*root, u"e"), "2");
 }
 
 }  // namespace
