@@ -10,11 +10,8 @@
  * Modules are never loaded for this. Without a run-time the library works by itself: texts are English, and targets are
  * those beside the executable.
  *
- * Memory. A handle is a pointer to the pointer to a block; both belong to the run-time, which alone makes, resizes and
- * frees them. A block may move whenever one of these functions is called, the handle stays. Sizes are in bytes.
- * A string is a handle to a block of an int32_t, the length, and that many bytes, without a terminator; an array of
- * strings is one to an int32_t, the count, and that many string handles, naturally aligned. The library sets lengths
- * and counts itself.
+ * Memory. host_data.h says what handles, strings and arrays are. Sizes are in bytes. The library sets the lengths of
+ * strings and the counts of arrays itself.
  *
  * Codes. A function that gives a code gives 0 for success and otherwise one of the host's own error codes, and has then
  * changed nothing. 1 is a wrong argument and 2 no memory: the library itself reports these two. No exception may leave
@@ -25,11 +22,11 @@
 #include <stddef.h>
 #include <stdint.h>
 
+#include "zkfpga/host_data.h"
+
 #ifdef __cplusplus
 extern "C" {
 #endif
-
-typedef char** ZkHandle;
 
 /* A path of the host. What it points to is the run-time's. */
 typedef void* ZkPath;
@@ -88,20 +85,6 @@ int32_t HostSystemTextToPath(const char* text, ZkPath path);
  *   19. HostClonePath            copies a path
  *   20. HostFileInPackedLibrary  tests for a file in a packed library
  *   21. HostPathToSystemString   the text of a path in the form of the file system */
-
-/* The other direction: exported by the library for the host. */
-
-/* Names the module of the run-time for the whole process; null: none. On Linux a module is a dlopen handle. It must
- * stay loaded while it is named. Then calls the hook with it. */
-void SetZKRTModule(void* module);
-
-/* Names the thread-local slot in which a thread may hold a module of its own; 0xFFFFFFFF: none. On Linux a slot is a
- * pthread_key_t. A thread whose slot is null goes on to what SetZKRTModule named. Then calls the hook with it. */
-void SetZKRTTLSIndex(uint32_t index);
-
-/* Do nothing. */
-void SetZKRTModuleHook(void* module);
-void SetZKRTTLSIndexHook(uint32_t index);
 
 #ifdef __cplusplus
 }

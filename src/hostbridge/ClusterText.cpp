@@ -32,4 +32,13 @@ void MakeNameValueCluster(const String& name, const String& value, String& resul
     result.Swap(cluster);
 }
 
+String MakeResourceCluster(const String& resource, const String& alias, const String& displayName) {
+    String cluster(u"<Cluster><Name></Name><NumElts>3</NumElts>");
+    AppendStringElement(cluster, resource.View(), u"resource");
+    AppendStringElement(cluster, alias.View(), u"alias");
+    AppendStringElement(cluster, displayName.View(), u"display name");
+    cluster.Append(u"</Cluster>");
+    return cluster;
+}
+
 }  // namespace zkhw

@@ -13,4 +13,8 @@ qn::dsc::String MakeStringElement(const qn::dsc::String& value, const qn::dsc::S
 // Replaces what was in `result`.
 void MakeNameValueCluster(const qn::dsc::String& name, const qn::dsc::String& value, qn::dsc::String& result);
 
+// A cluster without a name of its own, of three string elements: "resource", "alias" and "display name".
+qn::dsc::String MakeResourceCluster(const qn::dsc::String& resource, const qn::dsc::String& alias,
+                                    const qn::dsc::String& displayName);
+
 }  // namespace zkhw

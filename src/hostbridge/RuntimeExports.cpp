@@ -1,9 +1,10 @@
 // The functions by which a host names its run-time module, for the whole process or for each thread by a thread-local
-// slot. Their contract stands in zkfpga/host_runtime.h.
+// slot. Their contract stands in zkfpga/exports.h.
+
+#include "zkfpga/exports.h"
 
 #include "hostbridge/RuntimeModule.h"
 #include "qn/dsc/osdep/Export.h"
-#include "zkfpga/host_runtime.h"
 
 extern "C" {
 

@@ -93,6 +93,9 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     // The same after a deferred load, if one is pending. Such a walk ends at End().
     EntryIterator BeginLoaded();
 
+    // The entries as they stand, for a walk during which they may change (EntryWalk.h).
+    const EntryList& Entries() const { return entries; }
+
     // The entry `key` as things stand; the first one in an ordered node. The end position, or null, on a miss.
     // Logarithmic. Find... gives the entry itself, which stays where it is until it is removed.
     EntryIterator FindEntryRaw(std::u16string_view key);

@@ -1,5 +1,5 @@
 // A host that puts its own hooks in the place of the library's. Exit code 0 if they hear of what is set.
-#include "zkfpga/host_runtime.h"
+#include "zkfpga/exports.h"
 
 namespace {
 

@@ -8,6 +8,7 @@
 
 #include "host/HostTest.h"
 #include "hostbridge/HostFunctionTable.h"
+#include "zkfpga/exports.h"
 #include "zkfpga/host_runtime.h"
 
 namespace zkhw {

@@ -3,7 +3,7 @@
 #include "host/LoadedRuntime.h"
 #include "hostbridge/RuntimeModule.h"
 #include "support/RunProgram.h"
-#include "zkfpga/host_runtime.h"
+#include "zkfpga/exports.h"
 
 namespace zkhw {
 namespace {
