@@ -1,0 +1,19 @@
+# What an installation gets: the tool with its manual page; for hosts, the library, its headers, and packages by which
+# CMake and pkg-config find it.
+include(CMakePackageConfigHelpers)
+
+install(TARGETS zkfpga_make_resource_cache)
+install(TARGETS zkfpgarestree EXPORT zkfpga-targets)
+install(DIRECTORY include/zkfpga TYPE INCLUDE FILES_MATCHING PATTERN "*.h")
+install(FILES docs/zkfpga_make_resource_cache.1 DESTINATION ${CMAKE_INSTALL_MANDIR}/man1)
+
+set(cmake_package_dir ${CMAKE_INSTALL_LIBDIR}/cmake/zkfpga)
+install(EXPORT zkfpga-targets NAMESPACE zkfpga:: DESTINATION ${cmake_package_dir} FILE zkfpgaTargets.cmake)
+configure_package_config_file(cmake/zkfpgaConfig.cmake.in ${CMAKE_BINARY_DIR}/zkfpgaConfig.cmake
+  INSTALL_DESTINATION ${cmake_package_dir})
+write_basic_package_version_file(${CMAKE_BINARY_DIR}/zkfpgaConfigVersion.cmake COMPATIBILITY SameMajorVersion)
+install(FILES ${CMAKE_BINARY_DIR}/zkfpgaConfig.cmake ${CMAKE_BINARY_DIR}/zkfpgaConfigVersion.cmake
+  DESTINATION ${cmake_package_dir})
+
+configure_file(cmake/zkfpga.pc.in ${CMAKE_BINARY_DIR}/zkfpga.pc @ONLY)
+install(FILES ${CMAKE_BINARY_DIR}/zkfpga.pc DESTINATION ${CMAKE_INSTALL_LIBDIR}/pkgconfig)
