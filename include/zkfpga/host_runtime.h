@@ -23,6 +23,7 @@
 #include <stdint.h>
 
 #include "zkfpga/host_data.h"
+#include "zkfpga/types.h"
 
 #ifdef __cplusplus
 extern "C" {
@@ -53,6 +54,11 @@ int32_t HostResizeArray(int32_t typeCode, int32_t dimensions, ZkHandle* array, s
  * length, and the text. "English", "Japanese" and "ChineseS" are known, in any letter case; any other counts as
  * English. Asked once for a process. */
 void HostGetLanguageName(unsigned char* buffer);
+
+/* 7. Gives the interface `interfaceId` of what the host knows by the reference `refNum` in `*result`, with one
+ * reference for the caller. The library asks for IzkhwResourceTreeNode4. S_OK, or a negative result and a null
+ * `*result`. */
+HRESULT QueryInterfaceForZKRefNum(uint32_t refNum, GUID interfaceId, void** result);
 
 /* 8. Makes `path` an empty path and gives it; for null, gives a new empty path. Never null. */
 ZkPath HostEmptyPath(ZkPath path);

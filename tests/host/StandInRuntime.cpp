@@ -158,17 +158,11 @@ EXPORTED void HostGetLanguageName(unsigned char* buffer) {
     std::memcpy(buffer + 1, language.data(), buffer[0]);
 }
 
-// As a GUID is passed by value: 16 bytes in two registers.
-struct StandInGuid {
-    uint64_t halves[2];
-};
-
-EXPORTED int32_t QueryInterfaceForZKRefNum(uint32_t refNum, StandInGuid interfaceId, void** result);
-int32_t QueryInterfaceForZKRefNum(uint32_t refNum, StandInGuid interfaceId, void** result) {
+EXPORTED HRESULT QueryInterfaceForZKRefNum(uint32_t refNum, GUID interfaceId, void** result) {
     const int32_t fault = Enter(__func__, std::to_string(refNum));
     *result = nullptr;
     if (fault != 0 || !standInRuntime.queryInterface) {
-        return fault != 0 ? fault : static_cast<int32_t>(0x80004002U);
+        return fault != 0 ? fault : E_NOINTERFACE;
     }
     std::array<uint8_t, 16> id;
     std::memcpy(id.data(), &interfaceId, id.size());

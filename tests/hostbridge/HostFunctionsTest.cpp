@@ -25,6 +25,10 @@ static_assert(std::is_same_v<decltype(zkhw::HostNewHandleClear), decltype(::Host
 static_assert(std::is_same_v<decltype(zkhw::HostGetErrorText), decltype(::HostGetErrorText)>);
 static_assert(std::is_same_v<decltype(zkhw::HostResizeArray), decltype(::HostResizeArray)>);
 static_assert(std::is_same_v<decltype(zkhw::HostGetLanguageName), decltype(::HostGetLanguageName)>);
+// A GUID under another name, by value.
+static_assert(std::is_same_v<decltype(::QueryInterfaceForZKRefNum), HRESULT(uint32_t, GUID, void**)>);
+static_assert(std::is_same_v<decltype(zkhw::QueryInterfaceForZKRefNum), HRESULT(uint32_t, Guid, void**)>);
+static_assert(sizeof(Guid) == sizeof(GUID));
 static_assert(std::is_same_v<decltype(zkhw::HostEmptyPath), decltype(::HostEmptyPath)>);
 static_assert(std::is_same_v<decltype(zkhw::HostPathToString), decltype(::HostPathToString)>);
 static_assert(std::is_same_v<decltype(zkhw::HostGetSpecialDir), decltype(::HostGetSpecialDir)>);

@@ -1,4 +1,4 @@
-/* The header is plain C99 and stands alone. */
+/* The header is plain C99 and needs nothing before it. */
 #include "zkfpga/host_runtime.h"
 
 int32_t CallFromC(ZkHandle handle);
