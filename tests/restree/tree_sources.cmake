@@ -10,6 +10,7 @@ set(RESTREE_TREE_TESTS
   ${CMAKE_CURRENT_LIST_DIR}/ResTreeNodePathTest.cpp
   ${CMAKE_CURRENT_LIST_DIR}/ResTreeNodeRemovalTest.cpp
   ${CMAKE_CURRENT_LIST_DIR}/ResTreeNodeTypesTest.cpp
+  ${CMAKE_CURRENT_LIST_DIR}/ReservationModelTest.cpp
   ${CMAKE_CURRENT_LIST_DIR}/ReservationObserverTest.cpp
   ${CMAKE_CURRENT_LIST_DIR}/ReservationWalkTest.cpp
   ${CMAKE_CURRENT_LIST_DIR}/ReservationsTest.cpp)
