@@ -1,7 +1,5 @@
 #include "restree/ChangeDispatch.h"
 
-#include <algorithm>
-
 #include "restree/NodeAttachments.h"
 
 namespace zkhw {
@@ -48,7 +46,7 @@ void ChangeDispatch::BeginPass(Step& step) {
     node.suspendCount = 1;
     node.pendingChanges = 0;
     if (node.attachments) {
-        node.attachments->notifying = true;
+        node.attachments->observers.SetNotifying(true);
     }
 }
 
@@ -59,21 +57,13 @@ bool ChangeDispatch::EndPass(Step& step) const {
         step.saved &= ~step.delivered;
         // Not while an outer run goes through the same records: it does the sweep.
         if (node.attachments && step.outer == nullptr) {
-            auto& observers = node.attachments->observers;
-            const auto removed = std::remove_if(observers.begin(), observers.end(), [](const ObserverRecord& record) {
-                return record.state == ObserverRecord::Removed;
-            });
-            ObserverCount::Subtract(static_cast<size_t>(observers.end() - removed));
-            observers.erase(removed, observers.end());
-            for (ObserverRecord& record : observers) {
-                record.state = ObserverRecord::Active;
-            }
+            node.attachments->observers.Sweep();
         }
     }
     node.pendingChanges = static_cast<uint16_t>(node.pendingChanges | step.saved);
     node.suspendCount = step.wasSuspended ? 1 : 0;
     if (node.attachments) {
-        node.attachments->notifying = step.outer != nullptr;
+        node.attachments->observers.SetNotifying(step.outer != nullptr);
     }
     if (node.suspendCount == 0 && (node.pendingChanges & step.mask) != 0) {
         return false;
@@ -111,12 +101,12 @@ void ChangeDispatch::Advance() {
         steps.pop_back();
         return;
     }
-    if (step.delivered != 0 && node.attachments && step.next < node.attachments->observers.size()) {
+    const ObserverRecord* next = step.delivered == 0 || !node.attachments
+                                     ? nullptr
+                                     : node.attachments->observers.NextActive(step.next, step.delivered);
+    if (next != nullptr) {
         // A copy: the call may register observers and so move the records.
-        const ObserverRecord record = node.attachments->observers[step.next++];
-        if (record.state != ObserverRecord::Active || (record.mask & step.delivered) == 0) {
-            return;
-        }
+        const ObserverRecord record = *next;
         const uint32_t delivered = step.delivered;
         if (record.chained == nullptr) {
             record.observer->OnNodeChanged(&node, delivered, record.context);

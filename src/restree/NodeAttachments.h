@@ -6,6 +6,7 @@
 #include <memory>
 #include <vector>
 
+#include "restree/ObserverList.h"
 #include "restree/ResTreeNode.h"
 #include "restree/ReservationList.h"
 
@@ -16,27 +17,22 @@ class ChangeDispatch;
 struct ResTreeNode::Attachments {
     std::unique_ptr<TypeTable> typeTable;
 
-    std::vector<ObserverRecord> observers;     // In order of registration.
-    bool notifying = false;                    // A dispatch runs over `observers`.
+    ObserverList observers;
     const ChangeDispatch* dispatch = nullptr;  // The run of notices that has this node open, if any.
 
     // The nodes that hold a record of this one, so that none of them is left with it when this node goes. Each stands
-    // here once per record.
-    std::vector<ResTreeNode*> watched;
+    // here once per record, which in turn knows its slot here.
+    struct Watch {
+        ResTreeNode* node;
+        uint64_t serial;  // Of the record.
+    };
+    std::vector<Watch> watched;
 
     // Entries that a renaming over a sibling took from the collection. They live on, out of reach of any lookup, for
     // as long as this node does.
     std::vector<NodeEntry*> lostEntries;
 
     std::unique_ptr<ReservationList> reservations;  // Null until the first reservation.
-};
-
-// How many observer records there are in the process. While there are none, nodes come and go without notices.
-class ObserverCount {
-  public:
-    static bool IsZero() noexcept;
-    static void Add(size_t count) noexcept;
-    static void Subtract(size_t count) noexcept;
 };
 
 }  // namespace zkhw

@@ -31,20 +31,7 @@ class LoadChain;
 class Parameters;
 class ParseStack;
 class ReservationList;
-
-struct ObserverRecord {
-    enum State : uint8_t {
-        Active = 0,
-        Removed = 1,  // Removed during a dispatch: skipped, and erased at the end of that dispatch.
-        Added = 2,    // Added during a dispatch: skipped by it, and active from its end on.
-    };
-
-    ResTreeNodeChangeObserver* observer;  // Not owned, but see DeleteWithNode.
-    int32_t context;                      // Handed back at each call.
-    uint32_t mask;                        // ChangeFlags that make a call.
-    State state;
-    ResTreeNode* chained;  // The observer itself if it is a node that watches this one, else null.
-};
+struct ObserverRecord;
 
 class ResTreeNode : public ResTreeNodeChangeObserver {
   public:
@@ -388,6 +375,7 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     bool WatchDependants();
     static bool RemoveRecords(ResTreeNode& node, ResTreeNodeChangeObserver* observer, int32_t context);
     void ForgetWatching() noexcept;
+    static void EndWatch(ObserverRecord& record) noexcept;
     bool AnyActiveObserver(uint32_t mask) const;
     void LookUpAll(const std::vector<String>& paths, std::vector<ResTreeNode*>& list);
 

@@ -1,7 +1,6 @@
 // Who hears of a node's changes, and how a node comes to watch others.
 
 #include <algorithm>
-#include <atomic>
 #include <typeinfo>
 #include <unordered_set>
 
@@ -15,12 +14,10 @@ namespace zkhw {
 
 namespace {
 
-constexpr int32_t anyContext = -1;
+constexpr int32_t anyContext = ObserverList::anyContext;
 constexpr int32_t ancestorContext = 1;   // The watching node stands below.
 constexpr int32_t dependantContext = 2;  // The watching node reserves this one with it.
 constexpr uint32_t ancestorMask = NodeNameChanged | AncestorChanged;
-
-std::atomic<size_t> observerCount = 0;
 
 // The observer if it is a node and nothing more, so that what it does with a notice is known; else null.
 ResTreeNode* AsPlainNode(ResTreeNodeChangeObserver* observer) {
@@ -28,23 +25,7 @@ ResTreeNode* AsPlainNode(ResTreeNodeChangeObserver* observer) {
                                                                            : nullptr;
 }
 
-bool IsMatch(const ObserverRecord& record, const ResTreeNodeChangeObserver* observer, int32_t context) {
-    return record.observer == observer && (context == anyContext || record.context == context);
-}
-
 }  // namespace
-
-bool ObserverCount::IsZero() noexcept {
-    return observerCount.load(std::memory_order_relaxed) == 0;
-}
-
-void ObserverCount::Add(size_t count) noexcept {
-    observerCount.fetch_add(count, std::memory_order_relaxed);
-}
-
-void ObserverCount::Subtract(size_t count) noexcept {
-    observerCount.fetch_sub(count, std::memory_order_relaxed);
-}
 
 // --- Delivery ---
 
@@ -63,7 +44,7 @@ void ResTreeNode::EndChanges(uint32_t saved, bool replace) {
 }
 
 void ResTreeNode::DispatchChanges(uint32_t mask) {
-    if (suspendCount == 0 && (!attachments || attachments->observers.empty())) {
+    if (suspendCount == 0 && (!attachments || attachments->observers.IsEmpty())) {
         pendingChanges = static_cast<uint16_t>(pendingChanges & ~mask);
         return;
     }
@@ -93,58 +74,54 @@ void ResTreeNode::OnNodeChanged(ResTreeNode*, uint32_t changes, int32_t) {
 // --- Registration ---
 
 bool ResTreeNode::AnyActiveObserver(uint32_t mask) const {
-    return attachments && std::any_of(attachments->observers.begin(), attachments->observers.end(),
-                                      [mask](const ObserverRecord& record) {
-                                          return record.state == ObserverRecord::Active && (record.mask & mask) != 0;
-                                      });
+    return attachments && attachments->observers.HasActive(mask);
 }
 
 // The record itself, without what AddObserver does on top. True if it is new.
 bool ResTreeNode::Register(ResTreeNodeChangeObserver* observer, uint32_t mask, int32_t context, ResTreeNode* chained) {
-    Attachments& own = GetAttachments();
-    for (ObserverRecord& record : own.observers) {
-        if (record.state == ObserverRecord::Active && IsMatch(record, observer, context)) {
-            record.mask = mask;
-            return false;
-        }
+    ObserverList& observers = GetAttachments().observers;
+    if (ObserverRecord* record = observers.FindActive(observer, context)) {
+        observers.SetMask(*record, mask);
+        return false;
     }
-    if (own.observers.size() == own.observers.capacity()) {
-        own.observers.reserve(own.observers.size() * 2 + 1);
+    if (chained == nullptr) {
+        observers.Append(observer, context, mask, nullptr);
+        return true;
     }
-    if (chained != nullptr) {
-        chained->GetAttachments().watched.push_back(this);
+    std::vector<Attachments::Watch>& watched = chained->GetAttachments().watched;
+    if (watched.size() == watched.capacity()) {
+        watched.reserve(watched.size() * 2 + 1);
     }
-    own.observers.push_back(
-        {observer, context, mask, own.notifying ? ObserverRecord::Added : ObserverRecord::Active, chained});
-    ObserverCount::Add(1);
+    ObserverRecord& record = observers.Append(observer, context, mask, chained);
+    record.watchSlot = static_cast<uint32_t>(watched.size());
+    watched.push_back({this, record.serial});
     return true;
 }
 
 // Takes out the first matching record, also one that waits for the end of a dispatch to become active: its observer
 // may be about to die. True if there was one.
 bool ResTreeNode::Unregister(ResTreeNodeChangeObserver* observer, int32_t context) {
-    if (!attachments) {
+    ObserverRecord* record = attachments ? attachments->observers.FindPresent(observer, context) : nullptr;
+    if (record == nullptr) {
         return false;
     }
-    auto& observers = attachments->observers;
-    const auto found = std::find_if(observers.begin(), observers.end(), [&](const ObserverRecord& record) {
-        return record.state != ObserverRecord::Removed && IsMatch(record, observer, context);
-    });
-    if (found == observers.end()) {
-        return false;
-    }
-    if (found->chained != nullptr) {
-        auto& watched = found->chained->attachments->watched;
-        watched.erase(std::find(watched.begin(), watched.end(), this));
-        found->chained = nullptr;  // The node may be gone before the record is.
-    }
-    if (attachments->notifying) {
-        found->state = ObserverRecord::Removed;
-    } else {
-        observers.erase(found);
-        ObserverCount::Subtract(1);
-    }
+    EndWatch(*record);
+    attachments->observers.Remove(*record);
     return true;
+}
+
+// Takes the record off the list of its watching node, if it has one: the node may be gone before the record is.
+void ResTreeNode::EndWatch(ObserverRecord& record) noexcept {
+    if (record.chained == nullptr) {
+        return;
+    }
+    std::vector<Attachments::Watch>& watched = record.chained->attachments->watched;
+    // The last one takes its slot. It may be this very record.
+    const Attachments::Watch moved = watched.back();
+    moved.node->attachments->observers.WithSerial(moved.serial).watchSlot = record.watchSlot;
+    watched[record.watchSlot] = moved;
+    watched.pop_back();
+    record.chained = nullptr;
 }
 
 bool ResTreeNode::WatchAncestors() {
@@ -257,7 +234,7 @@ bool ResTreeNode::RemoveObserver(ResTreeNodeChangeObserver* observer, int32_t co
 
 void ResTreeNode::ForgetWatching() noexcept {
     while (attachments && !attachments->watched.empty()) {
-        RemoveRecords(*attachments->watched.back(), this, anyContext);
+        RemoveRecords(*attachments->watched.back().node, this, anyContext);
     }
 }
 

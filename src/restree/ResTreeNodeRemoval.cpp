@@ -68,23 +68,23 @@ void ResTreeNode::ReleaseLostEntries() {
 }
 
 void ResTreeNode::ReleaseObservers() {
-    std::vector<ObserverRecord>& observers = attachments->observers;
+    ObserverList& observers = attachments->observers;
     std::unordered_set<const ResTreeNodeChangeObserver*> deleted;
     // An observer that dies here may take itself or others off the list: their records are only marked then.
-    attachments->notifying = true;
-    for (size_t i = 0; i < observers.size(); ++i) {
-        const ObserverRecord record = observers[i];
+    observers.SetNotifying(true);
+    for (size_t place = 0; place < observers.Size(); ++place) {
+        ObserverRecord& record = observers.At(place);
         if (record.state == ObserverRecord::Removed || deleted.count(record.observer) != 0) {
             continue;
         }
+        ResTreeNodeChangeObserver* observer = record.observer;
         if (record.chained != nullptr) {
-            std::erase(record.chained->attachments->watched, this);
-        } else if (record.observer != nullptr && record.observer->DeleteWithNode()) {
-            deleted.insert(record.observer);
-            delete record.observer;
+            EndWatch(record);
+        } else if (observer != nullptr && observer->DeleteWithNode()) {
+            deleted.insert(observer);
+            delete observer;
         }
     }
-    ObserverCount::Subtract(observers.size());
 }
 
 // Destroys a subtree that nobody observes. The nodes still to come are threaded through their parent pointers.

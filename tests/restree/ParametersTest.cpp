@@ -357,7 +357,7 @@ TEST_P(ExpandedUnderObservers, EntryThatWasJustExpandedMayGo) {
 
 TEST_P(ExpandedUnderObservers, EveryEntryMayGoWhenItHasBeenExpanded) {
     root->AddObserver(&observer, PropertyChanged, 0);
-    observer.reaction = [this](ResTreeNode& node, uint32_t) { node.RemoveEntry(node.Begin()); };
+    observer.reaction = [](ResTreeNode& node, uint32_t) { node.RemoveEntry(node.Begin()); };
     Apply();
     EXPECT_EQ(CountExpanded(*root), 0);
 }

@@ -3,6 +3,7 @@ set(RESTREE_TREE_TESTS
   ${CMAKE_CURRENT_LIST_DIR}/DeepTreeTest.cpp
   ${CMAKE_CURRENT_LIST_DIR}/DeferredLoadTest.cpp
   ${CMAKE_CURRENT_LIST_DIR}/EntryListTest.cpp
+  ${CMAKE_CURRENT_LIST_DIR}/ManyObserversTest.cpp
   ${CMAKE_CURRENT_LIST_DIR}/ObserverTest.cpp
   ${CMAKE_CURRENT_LIST_DIR}/ResTreeNodeChangesTest.cpp
   ${CMAKE_CURRENT_LIST_DIR}/ResTreeNodeCopyTest.cpp
