@@ -3,7 +3,7 @@
 #ifndef ZKFPGA_HOST_DATA_H
 #define ZKFPGA_HOST_DATA_H
 
-#include <stdint.h>
+#include <stdint.h>  // NOLINT(modernize-deprecated-headers): for C, too
 
 typedef char** ZkHandle;
 

@@ -19,8 +19,8 @@
 #ifndef ZKFPGA_HOST_RUNTIME_H
 #define ZKFPGA_HOST_RUNTIME_H
 
-#include <stddef.h>
-#include <stdint.h>
+#include <stddef.h>  // NOLINT(modernize-deprecated-headers): for C, too
+#include <stdint.h>  // NOLINT(modernize-deprecated-headers): for C, too
 
 #include "zkfpga/host_data.h"
 #include "zkfpga/types.h"

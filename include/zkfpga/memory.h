@@ -12,7 +12,7 @@
 
 #else
 
-#include <stddef.h>
+#include <stddef.h>  // NOLINT(modernize-deprecated-headers): for C, too
 
 #ifdef __cplusplus
 extern "C" {

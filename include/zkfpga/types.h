@@ -19,7 +19,7 @@
 
 #else
 
-#include <stdint.h>
+#include <stdint.h>  // NOLINT(modernize-deprecated-headers): for C, too
 #ifndef __cplusplus
 #include <uchar.h>
 #endif
