@@ -95,6 +95,10 @@ AttributeList::Place AttributeList::Find(std::u16string_view name) const {
     return nowhere;
 }
 
+String AttributeList::NameOf(const Item& item) const {
+    return Widen(TextAt(item.name));
+}
+
 String AttributeList::ValueAt(Place place) const {
     return Widen(TextAt(place));
 }
@@ -111,7 +115,7 @@ std::vector<AttributeList::Attribute> AttributeList::InOrder() const {
     std::vector<Attribute> ordered;
     ordered.reserve(items.size());
     for (const Item& item : items) {
-        ordered.emplace_back(Widen(TextAt(item.name)), Widen(TextAt(item.value)));
+        ordered.emplace_back(NameOf(item), Widen(TextAt(item.value)));
     }
     std::stable_sort(ordered.begin(), ordered.end(),
                      [](const Attribute& left, const Attribute& right) { return left.first < right.first; });

@@ -44,6 +44,14 @@ class AttributeList {
     Place Find(std::u16string_view name) const;
     String ValueAt(Place place) const;
 
+    // Hands name and place of each to `take`, in document order; equal names all the same.
+    template <typename Take>
+    void ForEach(Take take) const {
+        for (const Item& item : items) {
+            take(NameOf(item), item.value);
+        }
+    }
+
     // All of them in the order of their names. Costs a sort.
     std::vector<Attribute> InOrder() const;
 
@@ -56,6 +64,7 @@ class AttributeList {
     static constexpr size_t knownCount = 10;
 
     std::string_view TextAt(uint32_t offset) const { return text.data() + offset; }
+    String NameOf(const Item& item) const;
     void Note(std::string_view name, uint32_t value);
 
     std::string text;

@@ -9,6 +9,7 @@
 #include "restree/LoadChain.h"
 #include "restree/LocalizeText.h"
 #include "restree/NodePath.h"
+#include "restree/OpenElementParameters.h"
 #include "restree/Parameters.h"
 #include "restree/TextList.h"
 #include "restree/Utf8Text.h"
@@ -159,7 +160,7 @@ ResTreeNode& ElementReader::MakeChild(String&& entryName, String&& elementName, 
     if (prototype != nullptr) {
         // Ahead of the element's own children, so that these override it.
         child->MergeFrom(*prototype, frame.mergeExisting);
-        child->ApplyParameters(OpenElementParameters(stack));
+        child->ApplyParameters(CollectParameters(stack));
     }
     return *child;
 }
@@ -207,7 +208,7 @@ String ElementReader::ReadValueText(bool isPath) const {
 
 void ElementReader::MakeOrdinaryValue(String&& text, bool isReferenceList) {
     if (HasVariables(text)) {
-        text = ExpandVariables(text, OpenElementParameters(stack));
+        text = ExpandVariables(text, CollectParameters(stack));
     }
     if (isReferenceList) {
         // The node's path is only wanted for pieces that begin with a slash.
@@ -270,7 +271,7 @@ void ElementReader::IncludeFile(const String& text) {
         Report(u"Unable to find include file node: ", path);
         return;
     }
-    loaded->ApplyParameters(OpenElementParameters(stack));
+    loaded->ApplyParameters(CollectParameters(stack));
 }
 
 void ElementReader::Report(std::u16string_view message, const String& subject) {

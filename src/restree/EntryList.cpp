@@ -88,7 +88,7 @@ bool EntryList::IsValid(EntryPosition position) const {
     return isLong ? longForm->pieces.IsValid(position) : !position.IsEnd() && position.slot < count;
 }
 
-EntryPosition EntryList::Following(EntryPosition position, const NodeEntry* entry) const {
+EntryPosition EntryList::FollowingMoved(EntryPosition position, const NodeEntry* entry) const {
     const bool isValid = IsValid(position);
     if (isValid && At(position) == entry) {
         return Next(position);

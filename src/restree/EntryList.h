@@ -52,7 +52,10 @@ class EntryList {
     // The position behind `entry`, which stood at `position` before the list may have changed. If the entry has left
     // the list, what has moved up to its position; the end if there is nothing. Linear in the length of one piece
     // where the list did change.
-    EntryPosition Following(EntryPosition position, const NodeEntry* entry) const;
+    EntryPosition Following(EntryPosition position, const NodeEntry* entry) const {
+        const bool isUnmoved = !isLong && position.slot < count && items[position.slot] == entry;
+        return isUnmoved ? Next(position) : FollowingMoved(position, entry);
+    }
 
     // The entry with this key, the first one in an ordered list; null if there is none. Throws bad_alloc when the
     // index of a long ordered list can't be built.
@@ -86,6 +89,7 @@ class EntryList {
 
     EntryPosition NextInPieces(EntryPosition position) const;
     NodeEntry* AtInPieces(EntryPosition position) const;
+    EntryPosition FollowingMoved(EntryPosition position, const NodeEntry* entry) const;
     bool IsValid(EntryPosition position) const;
     NodeEntry* FindInIndex(std::u16string_view key) const;
     void InsertInArray(uint32_t slot, NodeEntry* entry);

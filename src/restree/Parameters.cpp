@@ -1,14 +1,12 @@
 #include "restree/Parameters.h"
 
-#include <algorithm>
-#include <utility>
 #include <vector>
 
 #include "qn/dsc/osdep/Compare.h"
 #include "qn/dsc/osdep/IntegerToString.h"
 #include "restree/EntryWalk.h"
-#include "restree/ParseStack.h"
 #include "restree/ReleaseScope.h"
+#include "restree/ResTreeNode.h"
 #include "restree/TextList.h"
 #include "restree/Utf8Text.h"
 
@@ -20,18 +18,6 @@ namespace {
 
 constexpr std::u16string_view openMark = u"#{";
 constexpr std::u16string_view nameKey = u"name";
-constexpr std::u16string_view documentRootKey = u"document-root";
-
-bool IsLoopVariable(const ParseStack& stack, std::u16string_view name) {
-    for (const ParseFrame* frame = stack.Top(); frame != nullptr; frame = frame->previous.get()) {
-        for (const String& variable : frame->loopVariables) {
-            if (Equal(variable.View(), name)) {
-                return true;
-            }
-        }
-    }
-    return false;
-}
 
 std::u16string_view TrimBlanks(std::u16string_view text) {
     constexpr std::u16string_view blanks = u" \t\r\n";
@@ -63,69 +49,6 @@ bool InstanceParameters::AppendValue(std::u16string_view name, std::u16string& t
         return false;
     }
     return true;
-}
-
-ParameterMap CollectParameters(const ParseStack& stack) {
-    std::vector<const ParseFrame*> frames;
-    for (const ParseFrame* frame = stack.Top(); frame != nullptr; frame = frame->previous.get()) {
-        frames.push_back(frame);
-    }
-    ParameterMap parameters;
-    for (auto frame = frames.rbegin(); frame != frames.rend(); ++frame) {
-        for (AttributeList::Attribute& attribute : (*frame)->pendingAttributes.InOrder()) {
-            parameters.insert(std::move(attribute));
-        }
-    }
-    if (const ResTreeNode* documentRoot = stack.GetDocumentRoot()) {
-        parameters.emplace(documentRootKey, documentRoot->GetPath());
-    }
-    for (const ParseFrame* frame : frames) {
-        for (const String& variable : frame->loopVariables) {
-            parameters.erase(variable);
-        }
-    }
-    parameters.erase(String(nameKey));
-    return parameters;
-}
-
-const MapParameters& OpenElementParameters::Gathered() const {
-    if (!gathered) {
-        gathered = std::make_unique<MapParameters>(CollectParameters(stack));
-    }
-    return *gathered;
-}
-
-bool OpenElementParameters::IsEmpty() const {
-    const bool hasDocumentRoot = stack.GetDocumentRoot() != nullptr && !IsLoopVariable(stack, documentRootKey);
-    return !hasDocumentRoot && Gathered().IsEmpty();
-}
-
-bool OpenElementParameters::AppendValue(std::u16string_view name, std::u16string& text) const {
-    if (gathered || ++questions > questionsWithoutMap) {
-        return Gathered().AppendValue(name, text);
-    }
-    if (Equal(name, nameKey) || IsLoopVariable(stack, name)) {
-        return false;
-    }
-    // From the innermost outward: the last hit stands.
-    const ParseFrame* outermost = nullptr;
-    AttributeList::Place place = AttributeList::nowhere;
-    for (const ParseFrame* frame = stack.Top(); frame != nullptr; frame = frame->previous.get()) {
-        const AttributeList::Place found = frame->pendingAttributes.Find(name);
-        if (found != AttributeList::nowhere) {
-            outermost = frame;
-            place = found;
-        }
-    }
-    if (outermost != nullptr) {
-        text.append(outermost->pendingAttributes.ValueAt(place).View());
-        return true;
-    }
-    if (stack.GetDocumentRoot() != nullptr && Equal(name, documentRootKey)) {
-        text.append(stack.GetDocumentRoot()->GetPath().View());
-        return true;
-    }
-    return false;
 }
 
 bool HasVariables(const String& text) {

@@ -5,7 +5,6 @@
 
 #include <cstdint>
 #include <map>
-#include <memory>
 #include <string>
 #include <string_view>
 
@@ -14,8 +13,6 @@
 namespace zkhw {
 
 using qn::dsc::String;
-
-class ParseStack;
 
 class Parameters {
   public:
@@ -59,30 +56,6 @@ class InstanceParameters : public Parameters {
     const String& variable;
     String index;
 };
-
-// Those of the elements that are open in `stack`: their attributes, of which the outermost wins, and "document-root",
-// the path of the document element's node. Without "name" and the loop variables of open `names`, which are filled in
-// per copy. Only good while the same elements are open.
-class OpenElementParameters : public Parameters {
-  public:
-    explicit OpenElementParameters(const ParseStack& stack) : stack(stack) {}
-
-    bool IsEmpty() const override;
-    bool AppendValue(std::u16string_view name, std::u16string& text) const override;
-
-  private:
-    // After so many questions the answers are gathered in a map.
-    static constexpr uint32_t questionsWithoutMap = 16;
-
-    const MapParameters& Gathered() const;
-
-    const ParseStack& stack;
-    mutable uint32_t questions = 0;
-    mutable std::unique_ptr<MapParameters> gathered;
-};
-
-// All that OpenElementParameters answers, as a map.
-ParameterMap CollectParameters(const ParseStack& stack);
 
 // `text` with every "#{name}" that has a parameter replaced by its value, in one pass. An unknown one stays, without
 // the blanks inside its braces; a "#{" that isn't closed stays with all that follows.

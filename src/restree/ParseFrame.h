@@ -44,6 +44,10 @@ struct ParseFrame {
     std::string text;                       // Since the last start tag at this level, in UTF-8.
     std::vector<InstanceRecord> instances;  // What `names` of the pending element stands for.
     std::vector<String> loopVariables;      // Those of `instances`; consecutive equal ones stand here once.
+
+    // Attributes and loop variables stand in the OpenAttributes of the stack, and don't change until they are taken
+    // out.
+    bool isInOpenAttributes = false;
 };
 
 }  // namespace zkhw

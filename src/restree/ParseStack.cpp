@@ -49,6 +49,7 @@ void ParseStack::PushFrame(ResTreeNode& node, std::string_view nextName, const c
     top->position = nullptr;
     frame->previous = std::move(top);
     top = std::move(frame);
+    ++countOfFrames;
 }
 
 void ParseStack::PopFrame() {
@@ -56,8 +57,12 @@ void ParseStack::PopFrame() {
     top = std::move(frame->previous);
     frame->previous = std::move(spare);
     spare = std::move(frame);
+    --countOfFrames;
     if (top) {
         top->position = nullptr;
+        if (top->isInOpenAttributes) {
+            openAttributes.Remove(*top);
+        }
     }
 }
 

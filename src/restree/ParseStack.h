@@ -6,6 +6,7 @@
 #include <memory>
 
 #include "restree/ExPatHandler.h"
+#include "restree/OpenAttributes.h"
 #include "restree/ParseFrame.h"
 
 namespace zkhw {
@@ -20,7 +21,11 @@ class ParseStack final : public ExPatHandler {
     ~ParseStack();
 
     ParseFrame* Top() const { return top.get(); }
+    uint32_t CountOfFrames() const { return countOfFrames; }
     const LoadChain& Chain() const { return chain; }
+
+    // What is known by name of the frames. A frame that is on top again has been taken out.
+    OpenAttributes& GetOpenAttributes() { return openAttributes; }
 
     // The node of the document element, or null before there is one.
     ResTreeNode* GetDocumentRoot() const { return documentRoot; }
@@ -46,7 +51,9 @@ class ParseStack final : public ExPatHandler {
     const LoadChain& chain;
     std::unique_ptr<ParseFrame> top;    // Null when the last frame has been popped; later events are ignored.
     std::unique_ptr<ParseFrame> spare;  // Frames to use again, with the room that their texts have.
+    uint32_t countOfFrames = 1;
     ResTreeNode* documentRoot = nullptr;
+    OpenAttributes openAttributes;
 };
 
 }  // namespace zkhw

@@ -8,5 +8,7 @@ target_sources(zkfpga PRIVATE
   ${CMAKE_CURRENT_LIST_DIR}/LoadChain.cpp
   ${CMAKE_CURRENT_LIST_DIR}/LocalizeText.cpp
   ${CMAKE_CURRENT_LIST_DIR}/NameRange.cpp
+  ${CMAKE_CURRENT_LIST_DIR}/OpenAttributes.cpp
+  ${CMAKE_CURRENT_LIST_DIR}/OpenElementParameters.cpp
   ${CMAKE_CURRENT_LIST_DIR}/Parameters.cpp
   ${CMAKE_CURRENT_LIST_DIR}/ParseStack.cpp)

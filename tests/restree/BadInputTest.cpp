@@ -101,6 +101,68 @@ TEST(DeepInput, IsCopiedByNamesAndPrototypes) {
     });
 }
 
+TEST(DeepInput, ParametersAreFoundAtEveryLevel) {
+    const String xml =
+        Wide("<N K='k'>" + Repeated("<N><V>#{K}#{x}</V>", manyLevels - 1) + Repeated("</N>", manyLevels));
+    RunOnSmallStack([&] {
+        auto root = MakeRoot();
+        EXPECT_EQ(root->LoadResourceText(xml, true, nullptr), 0);
+        EXPECT_EQ(TextAt(Innermost(*root, u"N"), u"V"), "k#{x}");
+    });
+}
+
+TEST(DeepInput, OutermostParameterWinsAtEveryLevel) {
+    // Each level has K and an attribute that none above it has; the innermost asks for the first and the last of them.
+    std::string document = "<R>";
+    for (int i = 0; i < manyLevels; ++i) {
+        const std::string number = std::to_string(i);
+        document += "<N k='" + number + "' a" + number + "='" + number + "'><V>#{K} #{A" + number + "}</V>";
+    }
+    document += "<W>#{a0} #{a99999} #{a100000} #{document-root} #{name}</W>";
+    const String xml = Wide(document + Repeated("</N>", manyLevels) + "<V>#{k}</V></R>");
+    RunOnSmallStack([&] {
+        auto root = MakeRoot();
+        EXPECT_EQ(root->LoadResourceText(xml, true, nullptr), 0);
+        ResTreeNode& top = At(*root, u"R");
+        EXPECT_EQ(TextAt(top, u"V"), "#{k}");
+        EXPECT_EQ(TextAt(At(top, u"N"), u"V"), "0 0");
+        EXPECT_EQ(TextAt(At(top, u"N/N/N"), u"V"), "0 2");
+        EXPECT_EQ(TextAt(Innermost(top, u"N"), u"V"), "0 99999");
+        EXPECT_EQ(TextAt(Innermost(top, u"N"), u"W"), "0 99999 #{a100000} /R #{name}");
+    });
+}
+
+TEST(DeepInput, PrototypeAtEveryLevelIsFilledIn) {
+    // Lookup by "/" climbs to the root, so the prototype is named from the document element.
+    std::string document = "<R K='k'><P><V>#{K} #{J} #{x}</V></P>";
+    for (int i = 0; i < manyLevels; ++i) {
+        document += "<N prototype='#{document-root}/P' J='" + std::to_string(i) + "' a" + std::to_string(i) + "='1'>";
+    }
+    const String xml = Wide(document + "<W>w</W>" + Repeated("</N>", manyLevels) + "</R>");
+    RunOnSmallStack([&] {
+        auto root = MakeRoot();
+        EXPECT_EQ(root->LoadResourceText(xml, true, nullptr), 0);
+        // J was not open when the prototype itself was read.
+        EXPECT_EQ(TextAt(At(*root, u"R/P"), u"V"), "k #{J} #{x}");
+        EXPECT_EQ(TextAt(At(*root, u"R/N/N"), u"V"), "k 0 #{x}");
+        EXPECT_EQ(TextAt(Innermost(At(*root, u"R"), u"N"), u"V"), "k 0 #{x}");
+        EXPECT_EQ(TextAt(Innermost(At(*root, u"R"), u"N"), u"W"), "w");
+    });
+}
+
+TEST(DeepInput, LoopVariableHidesTheAttributesAtEveryLevel) {
+    const std::string level = "<N i='1' L='l'><V>#{I} #{l}</V>";
+    const String xml = Wide("<R i='0'><X names='P[i=7..8]'>" + Repeated(level, manyLevels / 10) +
+                            Repeated("</N>", manyLevels / 10) + "</X><V>#{i}</V></R>");
+    RunOnSmallStack([&] {
+        auto root = MakeRoot();
+        EXPECT_EQ(root->LoadResourceText(xml, true, nullptr), 0);
+        EXPECT_EQ(TextAt(Innermost(At(*root, u"R/P7"), u"N"), u"V"), "7 l");
+        EXPECT_EQ(TextAt(Innermost(At(*root, u"R/P8"), u"N"), u"V"), "8 l");
+        EXPECT_EQ(TextAt(At(*root, u"R"), u"V"), "0");
+    });
+}
+
 TEST(DeepInput, XmlValueIsFlat) {
     // Every second start tag is kept; the end tags run out of depth in the middle and then end frames.
     const String xml =
@@ -225,6 +287,20 @@ TEST(LargeInput, TenThousandAttributes) {
     EXPECT_EQ(root->LoadResourceText(xml, false, nullptr), 0);
     EXPECT_TRUE(At(*root, u"c").IsOrdered());
     EXPECT_TRUE(TextAt(*root, u"V") == "<i" + kept + "></i>");
+}
+
+TEST(LargeInput, TextsUnderTenThousandAttributes) {
+    std::string attributes;
+    for (int i = 10000; i < 20000; ++i) {
+        attributes += " a" + std::to_string(i) + "='" + std::to_string(i) + "'";
+    }
+    const std::string text = Repeated("#{A10000}#{a19999}#{x}", 10);
+    const String xml = Wide("<R><A" + attributes + ">" + Repeated("<B><C><V>" + text + "</V></C></B>", 3000) +
+                            "</A><V>#{a10000}</V></R>");
+    auto root = MakeUnnamedRoot();
+    EXPECT_EQ(root->LoadResourceText(xml, false, nullptr), 0);
+    EXPECT_EQ(TextAt(At(*root, u"A/B/C"), u"V"), Repeated("1000019999#{x}", 10));
+    EXPECT_EQ(TextAt(*root, u"V"), "#{a10000}");
 }
 
 TEST(LargeInput, HundredThousandReports) {

@@ -326,7 +326,8 @@ void CompareByChance(uint32_t growth, uint32_t seed) {
     for (int step = 0; step < 3000; ++step) {
         const size_t observer = chance(12);
         const int32_t context = static_cast<int32_t>(chance(40)) - 1;
-        const uint32_t mask = 1U << chance(11) | 1U << chance(11);
+        const uint32_t flag = 1U << chance(11);
+        const uint32_t mask = flag | 1U << chance(11);
         if (chance(20) == 0) {
             if (notifying) {
                 list.Sweep();

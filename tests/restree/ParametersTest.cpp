@@ -254,6 +254,150 @@ TEST(OpenElementParameters, ManyQuestionsGetTheSameAnswersAsFew) {
     EXPECT_EQ(TextAt(At(*root, u"P0"), u"V"), expected);
 }
 
+// --- Documents so deep that attributes are found by name ---
+
+// `inner` inside 20 levels "<L>", inside a document element R with `attributes`; the node of the innermost level.
+class DeepParameters : public ::testing::Test {
+  protected:
+    ResTreeNode& Read(const std::string& attributes, const std::string& inner) {
+        std::string document = "<R" + attributes + ">";
+        for (int i = 0; i < 20; ++i) {
+            document += "<L>";
+        }
+        document += inner;
+        for (int i = 0; i < 20; ++i) {
+            document += "</L>";
+        }
+        Load(*root, document + "</R>");
+        ResTreeNode* node = root.get();
+        while (const NodeEntry* entry = node->FindRaw(u"L")) {
+            node = entry->Child();
+        }
+        return *node;
+    }
+
+    std::unique_ptr<ResTreeNode> root = MakeUnnamedRoot();
+};
+
+TEST_F(DeepParameters, SiblingsDoNotSeeAClosedElement) {
+    ResTreeNode& node = Read(" K='k'",
+                             "<A a='1' K='no'><B b='2'><C c='3'><V>#{a}#{b}#{c}#{K}</V></C></B></A>"
+                             "<D d='4'><E><V>#{a}#{b}#{c}#{d}#{K}</V></E></D><V>#{a}#{d}#{K}</V>");
+    EXPECT_EQ(TextAt(At(node, u"A/B/C"), u"V"), "123k");
+    EXPECT_EQ(TextAt(At(node, u"D/E"), u"V"), "#{a}#{b}#{c}4k");
+    EXPECT_EQ(TextAt(node, u"V"), "#{a}#{d}k");
+}
+
+TEST_F(DeepParameters, AttributeOfAClosedElementGivesWayToTheNextOne) {
+    ResTreeNode& node = Read("", "<A a='1'><B><V>#{a}</V></B></A><C><D a='2'><V>#{A}</V></D></C><V a='3'>#{a}</V>");
+    EXPECT_EQ(TextAt(At(node, u"A/B"), u"V"), "1");
+    EXPECT_EQ(TextAt(At(node, u"C/D"), u"V"), "2");
+    EXPECT_EQ(TextAt(node, u"V"), "3");
+}
+
+TEST_F(DeepParameters, ElementsThatReturnToAFlatLevelAreSeenThere) {
+    // The lower frames are known by name by then, and the upper ones are looked at.
+    Read(" K='k' J='j'", "<V>#{K}</V>");
+    Load(*root,
+         "<R K='k' J='j'><A a='a'><B><C><D><E><F><G><H><V>#{a}</V></H></G></F></E></D></C></B>"
+         "<V J='own'>#{K}#{a}#{J}</V></A><W a='w'>#{a}#{J}</W></R>");
+    EXPECT_EQ(TextAt(At(*root, u"A/B/C/D/E/F/G/H"), u"V"), "a");
+    EXPECT_EQ(TextAt(At(*root, u"A"), u"V"), "kaj");
+    EXPECT_EQ(TextAt(*root, u"W"), "wj");
+}
+
+TEST_F(DeepParameters, OfAttributesThatDifferOnlyInCaseTheFirstStays) {
+    ResTreeNode& node = Read(" speed='1' SPEED='2'", "<A Speed='3' b='4' B='5'><V sPeed='6'>#{Speed}#{b}</V></A>");
+    EXPECT_EQ(TextAt(At(node, u"A"), u"V"), "14");
+}
+
+TEST_F(DeepParameters, NameIsLeftToInstances) {
+    ResTreeNode& node = Read(" name='r' K='k'", "<A name='a'><B NAME='b'><V>#{name}#{Name}#{K}</V></B></A>");
+    EXPECT_EQ(TextAt(At(node, u"a/b"), u"V"), "#{name}#{Name}k");
+}
+
+TEST_F(DeepParameters, DocumentRootIsAPathUnlessAnAttributeSaysOtherwise) {
+    EXPECT_EQ(TextAt(At(Read("", "<A><V>#{document-root}</V></A>"), u"A"), u"V"), "/");
+    root = MakeUnnamedRoot();
+    EXPECT_EQ(TextAt(At(Read("", "<A Document-Root='own'><V>#{document-root}</V></A>"), u"A"), u"V"), "own");
+    root = MakeUnnamedRoot();
+    EXPECT_EQ(TextAt(At(Read("", "<A><V document-ROOT='v'>#{document-root}</V></A>"), u"A"), u"V"), "v");
+}
+
+TEST_F(DeepParameters, LoopVariablesAreLeftToInstances) {
+    ResTreeNode& node = Read(" i='r' j='r' k='r'",
+                             "<A names='P[i=1..2],Q[j=3..3]' I='a'><B><V>#{i}#{J}#{k}</V></B></A><C><V>#{i}</V></C>");
+    EXPECT_EQ(TextAt(At(node, u"P1/B"), u"V"), "1#{J}r");
+    EXPECT_EQ(TextAt(At(node, u"P2/B"), u"V"), "2#{J}r");
+    EXPECT_EQ(TextAt(At(node, u"Q3/B"), u"V"), "#{i}3r");
+    EXPECT_EQ(TextAt(At(node, u"C"), u"V"), "r");
+}
+
+TEST_F(DeepParameters, LoopVariableOfAnOuterElementOutlivesThatOfAnInnerOne) {
+    ResTreeNode& node = Read(" i='r'",
+                             "<A names='P[i=1..2]'><B names='Q[i=5..6]'><C><V>#{i}</V></C></B><D><V>#{i}</V></D></A>"
+                             "<E><V>#{i}</V></E>");
+    EXPECT_EQ(TextAt(At(node, u"P1/Q5/C"), u"V"), "5");
+    EXPECT_EQ(TextAt(At(node, u"P2/Q6/C"), u"V"), "6");
+    EXPECT_EQ(TextAt(At(node, u"P1/D"), u"V"), "1");
+    EXPECT_EQ(TextAt(At(node, u"P2/D"), u"V"), "2");
+    EXPECT_EQ(TextAt(At(node, u"E"), u"V"), "r");
+}
+
+TEST_F(DeepParameters, LoopVariableMayHideTheDocumentRoot) {
+    ResTreeNode& node = Read("", "<A names='P[document-root=1..2]'><B><V>#{ document-root }#{ x }</V></B></A>");
+    EXPECT_EQ(TextAt(At(node, u"P2/B"), u"V"), "2#{x}");
+    root = MakeUnnamedRoot();
+    ResTreeNode& single = Read(" names='R'", "<A names='P[document-root=1..1]'><B><V>#{ x }</V></B></A>");
+    EXPECT_EQ(TextAt(At(single, u"P1/B"), u"V"), "#{x}");
+}
+
+TEST_F(DeepParameters, ManyQuestionsGetTheSameAnswersAsFew) {
+    std::string text;
+    std::string expected;
+    for (int i = 0; i < 40; ++i) {
+        text += "#{K}#{own}#{Own2}#{name}#{x}#{document-root}";
+        expected += "k12#{name}#{x}/";
+    }
+    ResTreeNode& node = Read(" K='k'", "<A K='a'><V own='1' own2='2' K='v' xml:space='preserve'>" + text +
+                                           "</V><W own='w'>#{own}#{own2}</W></A>");
+    EXPECT_EQ(TextAt(At(node, u"A"), u"V"), expected);
+    EXPECT_EQ(TextAt(At(node, u"A"), u"W"), "w#{own2}");
+}
+
+TEST_F(DeepParameters, XmlValuesTakeTheirPlaceInTheFrame) {
+    ResTreeNode& node = Read("", "<A a='1'><B type='xml' b='2'><i c='3'/><j/></B><V>#{a}#{b}#{c}</V></A>");
+    EXPECT_EQ(TextAt(At(node, u"A"), u"B"), "<i c=\"3\"></i><j></j>");
+    EXPECT_EQ(TextAt(At(node, u"A"), u"V"), "1#{b}#{c}");
+}
+
+TEST_F(DeepParameters, PrototypesAreFilledInFromAllLevels) {
+    ResTreeNode& node = Read(" K='k'",
+                             "<P><V>#{a}#{b}#{K}#{x}</V></P><A a='1'><B><C b='2' K='no' prototype='../../P'/>"
+                             "<D prototype='../../P' b='3'><W>#{b}</W></D></B></A>");
+    EXPECT_EQ(TextAt(At(node, u"P"), u"V"), "#{a}#{b}k#{x}");
+    EXPECT_EQ(TextAt(At(node, u"A/B/C"), u"V"), "12k#{x}");
+    EXPECT_EQ(TextAt(At(node, u"A/B/D"), u"V"), "13k#{x}");
+    EXPECT_EQ(TextAt(At(node, u"A/B/D"), u"W"), "3");
+}
+
+TEST_F(DeepParameters, TenThousandAttributesAreTenThousandParameters) {
+    std::string attributes;
+    std::string text;
+    std::string expected;
+    for (int i = 0; i < 10000; ++i) {
+        const std::string number = std::to_string(i);
+        attributes += " a" + number + "='" + number + "'";
+        text += "#{a" + number + "}";
+        expected += number;
+    }
+    ResTreeNode& node =
+        Read("", "<A" + attributes + "><V>" + text + "</V></A><V" + attributes + ">" + text + "</V><W>#{a5}</W>");
+    EXPECT_EQ(TextAt(At(node, u"A"), u"V"), expected);
+    EXPECT_EQ(TextAt(node, u"V"), expected);
+    EXPECT_EQ(TextAt(node, u"W"), "#{a5}");
+}
+
 // --- A whole tree ---
 
 TEST(ApplyParameters, ExpandsTextsAtAnyDepthAndNothingElse) {

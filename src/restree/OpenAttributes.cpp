@@ -1,0 +1,56 @@
+#include "restree/OpenAttributes.h"
+
+#include <algorithm>
+#include <utility>
+#include <vector>
+
+#include "qn/dsc/osdep/Compare.h"
+#include "restree/ParseFrame.h"
+
+namespace zkhw {
+
+void OpenAttributes::Add(ParseFrame* frame) {
+    std::vector<ParseFrame*> missing;
+    for (; frame != nullptr && !frame->isInOpenAttributes; frame = frame->previous.get()) {
+        missing.push_back(frame);
+    }
+    // Outermost first: what is there stays.
+    for (auto next = missing.rbegin(); next != missing.rend(); ++next) {
+        ParseFrame& added = **next;
+        added.isInOpenAttributes = true;
+        added.pendingAttributes.ForEach([&](String&& name, AttributeList::Place place) {
+            attributes.try_emplace(std::move(name), Place{&added, place});
+        });
+        loopVariables.insert(added.loopVariables.begin(), added.loopVariables.end());
+    }
+}
+
+void OpenAttributes::Remove(ParseFrame& frame) {
+    frame.isInOpenAttributes = false;
+    frame.pendingAttributes.ForEach([&](String&& name, AttributeList::Place) {
+        const auto found = attributes.find(name);
+        if (found != attributes.end() && found->second.frame == &frame) {
+            attributes.erase(found);
+        }
+    });
+    for (const String& variable : frame.loopVariables) {
+        loopVariables.erase(loopVariables.find(variable));
+    }
+}
+
+OpenAttributes::Place OpenAttributes::Find(std::u16string_view name) const {
+    const auto found = attributes.find(String(name));
+    return found == attributes.end() ? Place{} : found->second;
+}
+
+bool OpenAttributes::IsLoopVariable(std::u16string_view name) const {
+    return !loopVariables.empty() && loopVariables.count(String(name)) != 0;
+}
+
+bool OpenAttributes::HasAnyBut(std::u16string_view hidden) const {
+    return std::any_of(attributes.begin(), attributes.end(), [&](const auto& attribute) {
+        return !qn::dsc::osdep::Equal(attribute.first.View(), hidden) && loopVariables.count(attribute.first) == 0;
+    });
+}
+
+}  // namespace zkhw
