@@ -137,12 +137,18 @@ void ElementReader::BindDocumentElement(String&& entryName, String&& elementName
     stack.NoteNode(node);
 }
 
+ResTreeNode* ElementReader::Lookup(const String& path) {
+    // A path from the root is the same from any node, and deep down in a document the loading node is nearer to it.
+    ResTreeNode& start = path.View().starts_with(u'/') ? stack.LoadingNode() : node;
+    return start.Lookup(path.View(), stack.GetDocumentRoot());
+}
+
 ResTreeNode* ElementReader::FindPrototype() {
     if (!Attributes().Has(AttributeName::Prototype)) {
         return nullptr;
     }
     const String path = Attributes().Value(AttributeName::Prototype);
-    ResTreeNode* prototype = node.Lookup(path.View(), stack.GetDocumentRoot());
+    ResTreeNode* prototype = Lookup(path);
     if (prototype == nullptr) {
         Report(u"Unable to find prototype node: ", path);
     }
@@ -201,7 +207,7 @@ String ElementReader::ReadValueText(bool isPath) const {
     SplitList(wide.View(), u'/', pieces, false);
     String path;
     for (const String& piece : pieces) {
-        path = JoinPath(path, piece);
+        qn::dsc::osdep::AppendPathPart(path, piece);
     }
     return path;
 }
@@ -233,7 +239,7 @@ void ElementReader::StoreText(String&& text, EntryKind kind) {
 }
 
 void ElementReader::MakeLink(String&& entryName, const String& text) {
-    const ResTreeNode* target = node.Lookup(text.View(), stack.GetDocumentRoot());
+    const ResTreeNode* target = Lookup(text);
     if (target == nullptr) {
         // It stays a dead text, even when the target is read later. The first one of a node stays.
         String dead(u"UNRESOLVED LINK: ");

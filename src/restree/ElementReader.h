@@ -31,6 +31,7 @@ class ElementReader {
     void BindDocumentElement(String&& entryName, String&& elementName, bool isOrdered);
     ResTreeNode& MakeChild(String&& entryName, String&& elementName, bool isOrdered);
     ResTreeNode* FindPrototype();
+    ResTreeNode* Lookup(const String& path);
 
     void MakeValue(String&& entryName);
     String ReadValueText(bool isPath) const;

@@ -8,7 +8,8 @@
 
 namespace zkhw {
 
-ParseStack::ParseStack(ResTreeNode& node, const String& rootType, const LoadChain& chain) : chain(chain) {
+ParseStack::ParseStack(ResTreeNode& node, const String& rootType, const LoadChain& chain)
+    : loadingNode(node), chain(chain) {
     top = std::make_unique<ParseFrame>();
     top->node = &node;
     top->typeTable = node.NearestTypeTable();

@@ -21,6 +21,9 @@ class ParseStack final : public ExPatHandler {
     ~ParseStack();
 
     ParseFrame* Top() const { return top.get(); }
+    // The node that the document is read into; all nodes of the frames are in its tree.
+    ResTreeNode& LoadingNode() const { return loadingNode; }
+
     uint32_t CountOfFrames() const { return countOfFrames; }
     const LoadChain& Chain() const { return chain; }
 
@@ -48,6 +51,7 @@ class ParseStack final : public ExPatHandler {
     void PopFrame();
     std::unique_ptr<ParseFrame> TakeSpare();
 
+    ResTreeNode& loadingNode;
     const LoadChain& chain;
     std::unique_ptr<ParseFrame> top;    // Null when the last frame has been popped; later events are ignored.
     std::unique_ptr<ParseFrame> spare;  // Frames to use again, with the room that their texts have.

@@ -133,10 +133,10 @@ TEST(DeepInput, OutermostParameterWinsAtEveryLevel) {
 }
 
 TEST(DeepInput, PrototypeAtEveryLevelIsFilledIn) {
-    // Lookup by "/" climbs to the root, so the prototype is named from the document element.
     std::string document = "<R K='k'><P><V>#{K} #{J} #{x}</V></P>";
     for (int i = 0; i < manyLevels; ++i) {
-        document += "<N prototype='#{document-root}/P' J='" + std::to_string(i) + "' a" + std::to_string(i) + "='1'>";
+        const std::string path = i % 2 == 0 ? "/R/P" : "#{document-root}/P";
+        document += "<N prototype='" + path + "' J='" + std::to_string(i) + "' a" + std::to_string(i) + "='1'>";
     }
     const String xml = Wide(document + "<W>w</W>" + Repeated("</N>", manyLevels) + "</R>");
     RunOnSmallStack([&] {
@@ -348,6 +348,13 @@ TEST(LargeInput, LongPathsAndReferenceLists) {
     EXPECT_EQ(root->LoadResourceText(xml, false, nullptr), 0);
     EXPECT_TRUE(TextAt(At(*root, u"A"), u"LogPath") == Repeated("ab\\", 200000));
     EXPECT_TRUE(TextAt(At(*root, u"A"), u"Reserves") == Repeated("../B,", 200000));
+}
+
+TEST(LargeInput, AbsolutePiecesOfALongPathWin) {
+    const std::string text = Repeated("ab/C:\\x/", 200000) + Repeated("y/", 200000) + "z";
+    auto root = MakeUnnamedRoot();
+    EXPECT_EQ(root->LoadResourceText(Wide("<R><LogPath>" + text + "</LogPath></R>"), false, nullptr), 0);
+    EXPECT_TRUE(TextAt(*root, u"LogPath") == "C:\\x" + Repeated("\\y", 200000) + "\\z");
 }
 
 // --- Entities ---

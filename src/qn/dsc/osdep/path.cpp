@@ -106,6 +106,15 @@ String JoinPath(const String& base, const String& part) {
                                         : String::Concat({base.View(), u"\\", part.View()});
 }
 
+void AppendPathPart(String& base, const String& part) {
+    if (base.IsEmpty() || IsAbsolute(part.View())) {
+        base = part;
+        return;
+    }
+    AppendSeparator(base);
+    base.Append(part);
+}
+
 String GetFileName(const String& path) {
     const std::u16string_view view = path.View();
     const size_t last = view.rfind(separator);

@@ -18,6 +18,9 @@ bool IsAbsolutePath(const String& path);
 // is empty. So an empty `part` gives `base` with a backslash at its end.
 String JoinPath(const String& base, const String& part);
 
+// The same in place, so that a path of many parts takes time in proportion to its text. `part` is another text.
+void AppendPathPart(String& base, const String& part);
+
 // What stands behind the last backslash: nothing for a path that ends in one, and for a bare drive ("C:").
 String GetFileName(const String& path);
 

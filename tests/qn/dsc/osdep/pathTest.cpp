@@ -77,6 +77,36 @@ TEST(JoinPath, ASingleLeadingBackslashDoesNotMakeThePartAbsolute) {
     EXPECT_EQ(ExactText(JoinPath(u"a", u"C:b")), "a\\C:b");
 }
 
+TEST(AppendPathPart, GivesWhatJoinPathGives) {
+    struct Row {
+        const char16_t* base;
+        const char16_t* part;
+        const char* joined;
+    };
+    constexpr Row rows[] = {{u"a", u"b", "a\\b"},     {u"C:\\a", u"b\\c", "C:\\a\\b\\c"},
+                            {u"C:\\", u"b", "C:\\b"}, {u"", u"x", "x"},
+                            {u"", u"", ""},           {u"a", u"", "a\\"},
+                            {u"a\\", u"", "a\\"},     {u"a", u"C:\\b", "C:\\b"},
+                            {u"a", u"\\b", "a\\\\b"}, {u"C:\\a\\", u"\\\\s\\b", "\\\\s\\b"},
+                            {u"a", u"C:b", "a\\C:b"}, {u"a/", u"b", "a/\\b"}};
+    for (const Row& row : rows) {
+        String path(row.base);
+        AppendPathPart(path, row.part);
+        EXPECT_EQ(ExactText(path), row.joined);
+        EXPECT_EQ(ExactText(JoinPath(row.base, row.part)), row.joined);
+    }
+}
+
+TEST(AppendPathPart, ManyPartsTakeTimeInProportionToTheirText) {
+    String path;
+    std::string expected;
+    for (int i = 0; i < 1000000; ++i) {
+        AppendPathPart(path, u"ab");
+        expected += i == 0 ? "ab" : "\\ab";
+    }
+    EXPECT_TRUE(ExactText(path) == expected);
+}
+
 TEST(JoinPath, ASlashIsNoSeparator) {
     EXPECT_EQ(ExactText(JoinPath(u"a/", u"b")), "a/\\b");
 }
