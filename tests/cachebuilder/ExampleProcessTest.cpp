@@ -1,0 +1,121 @@
+// The tool as a user runs it on copies of the example installation.
+
+#include <filesystem>
+#include <fstream>
+#include <sstream>
+#include <string>
+#include <vector>
+
+#include <gtest/gtest.h>
+
+#include "support/RunProgram.h"
+#include "support/TemporaryFolder.h"
+
+namespace zkhw {
+namespace {
+
+using qn::dsc::osdep::ProgramResult;
+using qn::dsc::osdep::RunProgram;
+using qn::dsc::osdep::TemporaryFolder;
+
+const std::string working = "Targets/QN/FPGA";
+const std::string cacheFile = working + "/resource_cache.xml";
+
+std::string ReviewedCache() {
+    std::ostringstream bytes;
+    bytes << std::ifstream(ZKFPGA_SOURCE_DIR "/tests/data/example_resource_cache.xml", std::ios::binary).rdbuf();
+    return bytes.str();
+}
+
+// A copy of the example, with the tool in its usual place: a folder of its own in the working directory.
+class ExampleCopy {
+  public:
+    explicit ExampleCopy(const std::string& below = "installation") : below(below) {
+        folder.MakeFolder(below);
+        std::filesystem::copy(ZKFPGA_SOURCE_DIR "/examples/installation", Root(),
+                              std::filesystem::copy_options::recursive);
+        std::filesystem::create_directories(ToolFolder());
+        std::filesystem::copy_file(ZKFPGA_TOOL, ToolFolder() + "/zkfpga_make_resource_cache");
+    }
+
+    std::string Root() const { return folder.Native(below); }
+    std::string ToolFolder() const { return Root() + "/" + working + "/Utilities"; }
+
+    ProgramResult Run(const std::vector<std::string>& arguments, const std::string& workingFolder) const {
+        return RunProgram(ToolFolder() + "/zkfpga_make_resource_cache", arguments, workingFolder);
+    }
+
+    std::string Read(const std::string& path) const { return folder.ReadFile(below + "/" + path); }
+    std::vector<std::string> Tree() const { return folder.Tree(); }
+
+  private:
+    TemporaryFolder folder;
+    std::string below;
+};
+
+void ExpectSuccess(const ProgramResult& result) {
+    EXPECT_EQ(result.end, "exit 0");
+    EXPECT_EQ(result.output, "");
+    EXPECT_EQ(result.errors, "");
+}
+
+TEST(ExampleProcess, SucceedsAndLeavesTheReviewedCache) {
+    const ExampleCopy copy;
+    ExpectSuccess(copy.Run({}, "/"));
+    EXPECT_EQ(copy.Read(cacheFile), ReviewedCache());
+}
+
+TEST(ExampleProcess, CopiesTheMenusOfTheFamilyIntoABoardsFolder) {
+    const ExampleCopy copy;
+    ExpectSuccess(copy.Run({}, "/"));
+    const std::string menus = working + "/Menus/Virtex6/";
+    for (const char* file : {"Blocks.menu", "Memory/Memory.menu", "Transceivers/Transceivers.menu"}) {
+        EXPECT_EQ(copy.Read(working + "/ML605/" + file), copy.Read(menus + file)) << file;
+    }
+    for (const std::string& path : copy.Tree()) {
+        // The family of this board has no menus.
+        EXPECT_EQ(path.find("KC705/Blocks.menu"), std::string::npos) << path;
+    }
+}
+
+TEST(ExampleProcess, SecondRunGivesTheSame) {
+    const ExampleCopy copy;
+    ExpectSuccess(copy.Run({}, "/"));
+    const std::vector<std::string> tree = copy.Tree();
+    ExpectSuccess(copy.Run({}, "/"));
+    EXPECT_EQ(copy.Tree(), tree);
+    EXPECT_EQ(copy.Read(cacheFile), ReviewedCache());
+}
+
+TEST(ExampleProcess, RunsInDifferentFoldersGiveTheSameCache) {
+    const ExampleCopy one("one");
+    const ExampleCopy other("an other place/of-longer-name/with \xC3\xA4");
+    ExpectSuccess(one.Run({}, "/"));
+    ExpectSuccess(other.Run({}, "/"));
+    EXPECT_EQ(one.Read(cacheFile), ReviewedCache());
+    EXPECT_EQ(other.Read(cacheFile), one.Read(cacheFile));
+}
+
+TEST(ExampleProcess, ArgumentMayBeGivenInAnyForm) {
+    const ExampleCopy copy;
+    std::string system = "C:" + copy.Root() + "/" + working;
+    for (char& unit : system) {
+        unit = unit == '/' ? '\\' : unit;
+    }
+    for (const std::string& argument :
+         {copy.Root() + "/" + working, working, std::string("Targets\\QN\\FPGA"), system}) {
+        std::filesystem::remove(copy.Root() + "/" + cacheFile);
+        ExpectSuccess(copy.Run({argument}, copy.Root()));
+        EXPECT_EQ(copy.Read(cacheFile), ReviewedCache()) << argument;
+    }
+}
+
+TEST(ExampleProcess, FolderThatIsNotThereFailsAndLeavesNothing) {
+    const ExampleCopy copy;
+    const std::vector<std::string> before = copy.Tree();
+    EXPECT_EQ(copy.Run({copy.Root() + "/missing"}, "/").end, "exit 5");
+    EXPECT_EQ(copy.Tree(), before);
+}
+
+}  // namespace
+}  // namespace zkhw
