@@ -2,6 +2,7 @@
 
 // Descriptions of boards as text, of any size, for the benchmarks of what reads and writes them.
 
+#include <cstdint>
 #include <memory>
 #include <string>
 
@@ -42,6 +43,11 @@ inline std::string PrototypeBoard(int instances) {
 inline std::string NamesBoard(int copies) {
     return "<Board><Bit names=\"Bit[i=1.." + std::to_string(copies) +
            "]\"><Index>#{i}</Index><Label>#{name} of the port</Label><Pull>up</Pull><Drive>12</Drive></Bit></Board>";
+}
+
+inline std::u16string Number(int64_t number) {
+    const std::string digits = std::to_string(number);
+    return std::u16string(digits.begin(), digits.end());
 }
 
 inline qn::dsc::String Wide(const std::string& utf8) {

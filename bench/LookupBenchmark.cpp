@@ -14,11 +14,7 @@ using qn::dsc::String;
 using zkhw::ResTreeNode;
 
 std::u16string Key(int64_t number) {
-    std::u16string key(u"Line");
-    for (const char digit : std::to_string(number)) {
-        key.push_back(static_cast<char16_t>(digit));
-    }
-    return key;
+    return u"Line" + bench::Number(number);
 }
 
 void FindEntry(benchmark::State& state, bool ordered) {
