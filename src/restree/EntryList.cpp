@@ -105,7 +105,7 @@ EntryPosition EntryList::FollowingMoved(EntryPosition position, const NodeEntry*
 
 NodeEntry* EntryList::Find(std::u16string_view key) const {
     if (!ordered) {
-        return FindPlace(key).entry;
+        return SearchSorted(key).entry;
     }
     if (isLong) {
         return FindInIndex(key);
@@ -130,6 +130,10 @@ EntryList::Place EntryList::FindPlace(std::u16string_view key) const {
     if (count == 0 || Compare(At(Last())->Key().View(), key) < 0) {
         return {{}, nullptr};
     }
+    return SearchSorted(key);
+}
+
+EntryList::Place EntryList::SearchSorted(std::u16string_view key) const {
     if (isLong) {
         const EntryPieces& pieces = longForm->pieces;
         const EntryPosition position =

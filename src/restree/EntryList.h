@@ -92,6 +92,7 @@ class EntryList {
     EntryPosition FollowingMoved(EntryPosition position, const NodeEntry* entry) const;
     bool IsValid(EntryPosition position) const;
     NodeEntry* FindInIndex(std::u16string_view key) const;
+    Place SearchSorted(std::u16string_view key) const;
     void InsertInArray(uint32_t slot, NodeEntry* entry);
     void AddToIndex(NodeEntry* entry, bool atEnd) noexcept;
     void MakeLong();
