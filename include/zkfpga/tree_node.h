@@ -172,7 +172,8 @@ struct IzkhwResourceTreeNode : public IUnknown {
     /* Calls `observer` when something of `mask` changes about the node; `id`, a number of the caller's, comes back in
      * each call. A second registration of the same observer with the same id at the same node does nothing, and the
      * first mask stands. The registration holds a reference to the observer and to this object until Unadvise or the
-     * end of the node. Ids 1 and 2 are used by nodes among themselves, too. S_OK, E_OUTOFMEMORY. */
+     * end of the node. Ids 1 and 2 are used by nodes among themselves, too. S_OK, E_OUTOFMEMORY; E_POINTER for a null
+     * `observer`. */
     virtual HRESULT STDMETHODCALLTYPE Advise(IzkhwResourceTreeNodeObserver* observer, ULONG mask, ULONG id) = 0;
 
     /* Ends registrations of `observer`: the one with `id` at this node. With `id` 0xFFFFFFFF, all of its ids, and with
@@ -218,24 +219,33 @@ struct IzkhwResourceTreeNode3 : public IzkhwResourceTreeNode2 {
 
 struct IzkhwResourceTreeNode4 : public IzkhwResourceTreeNode3 {
     /* A deep copy of the node, of that name unless it is null or empty, as the root of a tree of its own. The tree
-     * lives as long as the object in `*clone`; all other views of it are void when that goes. S_OK, E_OUTOFMEMORY. */
+     * lives as long as the object in `*clone`; all other views of it are void when that goes. Registrations that were
+     * made on them end without a notice. Contents that aren't loaded yet stay unread in both. Links keep leading to
+     * where they led in the original's tree, so they lead somewhere only in the copy of a root. S_OK, E_OUTOFMEMORY. */
     virtual HRESULT STDMETHODCALLTYPE CloneDetached(LPCWSTR name, IzkhwResourceTreeNode** clone) = 0;
 
     /* The names of all nodes below that are of `type` and not excluded, a parent before its children, links followed.
      * A node is excluded if its property `exclusionProperty` is empty or "true", "yes", "1", "on" or "enable"; null or
-     * empty: none is. Below a node that is left out the walk goes on. With `includePath` each is the node's own path;
-     * behind a link, it is the path on which the walk came, from `path`, or from the node's own path if that is null.
-     * From the first link of a node on, its later entries are named by the way to them, too. `displayNames`, optional,
-     * gets as many display paths. A link to a node that the walk stands in is passed over. May load everything below.
-     * S_OK, E_POINTER, E_OUTOFMEMORY. */
+     * empty: none is. Below a node that is left out the walk goes on. A link to a node that the walk stands in is
+     * passed over. `displayNames`, optional, gets as many display paths. May load everything below. S_OK, E_POINTER,
+     * E_OUTOFMEMORY.
+     *
+     * With `includePath` each is a path, otherwise the node's name. As long as the walk has met no link it is the
+     * node's own path. A link is named by its key below the own path of the node that holds it, and all behind it by
+     * the way through it. The later entries of a node that holds a link are named by the way to that node: this node
+     * counts as reached by `path`, or by its own path if that is null; a node below it that was reached without a link
+     * has no way, so they are named as if they stood right below the root. If `path` itself, walked from here as
+     * FindNode does, goes through a link, everything is named by the way from `path`. Display paths follow the same
+     * rules; `path` plays no part in them, but for that last one: then the way begins at the node's display path. */
     virtual HRESULT STDMETHODCALLTYPE GetDescendantNamesEx(LPCWSTR path, LPCWSTR type, BOOL includePath,
                                                            LPCWSTR exclusionProperty, ULONG* count, BSTR** names,
                                                            BSTR** displayNames) = 0;
 
     /* GetXml of a copy from which entries were taken out: with `keep` all but the named ones, else the named ones. A
      * child is named by its key or its type in `nodeNames`, a property by its key in `propertyNames`; a link is never
-     * named. What stays is filtered in turn, so with `keep` a node stays only if all above it are named. Always S_OK;
-     * `*xml` is null if there is no memory for it. */
+     * named. What stays is filtered in turn, so with `keep` a node stays only if all above it are named. Links are
+     * written as those of a copy (CloneDetached). Loads everything that stays, in the copy alone. A null name is the
+     * empty one; an array may be null if its count is 0. Always S_OK; `*xml` is null if there is no memory for it. */
     virtual HRESULT STDMETHODCALLTYPE GetFilteredXmlEx(BOOL keep, ULONG nodeNameCount, LPCWSTR* nodeNames,
                                                        ULONG propertyNameCount, LPCWSTR* propertyNames, BSTR* xml) = 0;
 
@@ -254,7 +264,8 @@ struct IzkhwResourceTreeNode4 : public IzkhwResourceTreeNode3 {
 
 struct IzkhwResourceTreeNode5 : public IzkhwResourceTreeNode4 {
     /* The reservations again, for a project item of the host as the owner: the key is the text of the item's id, with
-     * braces and capital digits. A null item means any owner in GetReservationForItem, and nowhere else. */
+     * braces and capital digits. A null item means any owner in GetReservationForItem; in the others it is E_POINTER,
+     * and out arguments are untouched. Results otherwise as of the operations by text. */
     virtual HRESULT STDMETHODCALLTYPE ReserveForItem(IzkProjectItem* item, ULONG mode, ULONG* granted) = 0;
     virtual HRESULT STDMETHODCALLTYPE GetReservationForItem(IzkProjectItem* item, ULONG* mode) = 0;
     virtual HRESULT STDMETHODCALLTYPE UnreserveForItem(IzkProjectItem* item) = 0;

@@ -15,16 +15,30 @@
 
 namespace zkhw {
 
-// How a count changes; each gives the new count.
+// How a count is read and changed; each gives what the count is then. Behind the greatest signed count comes the least:
+// an AddRef there is sound, if only AddRefs follow.
 struct CQNComSingleThreadModel {
-    static int32_t Increment(int32_t& count) { return ++count; }
-    static int32_t Decrement(int32_t& count) { return --count; }
+    static int32_t Read(const int32_t& count) { return count; }
+    static int32_t Increment(int32_t& count) { return Change(count, 1); }
+    static int32_t Decrement(int32_t& count) { return Change(count, 0xFFFFFFFF); }
+
+  private:
+    static int32_t Change(int32_t& count, uint32_t by) {
+        return count = static_cast<int32_t>(static_cast<uint32_t>(count) + by);
+    }
 };
 
 // Protects the count alone.
 struct CQNComMultiThreadModelNoCS {
-    static int32_t Increment(int32_t& count) { return std::atomic_ref(count).fetch_add(1) + 1; }
-    static int32_t Decrement(int32_t& count) { return std::atomic_ref(count).fetch_sub(1) - 1; }
+    static int32_t Read(int32_t& count) { return std::atomic_ref(count).load(); }
+    static int32_t Increment(int32_t& count) { return Change(count, 1); }
+    static int32_t Decrement(int32_t& count) { return Change(count, -1); }
+
+  private:
+    static int32_t Change(int32_t& count, int32_t by) {
+        const int32_t before = std::atomic_ref(count).fetch_add(by);
+        return static_cast<int32_t>(static_cast<uint32_t>(before) + static_cast<uint32_t>(by));
+    }
 };
 
 template <typename ThreadModel>
@@ -35,7 +49,7 @@ class CQNComObjectRootEx : public CQNComObjectRootBase {
 
     // Trap at the greatest count there is: the next would be 0 again.
     ULONG InternalAddRef() {
-        if (static_cast<uint32_t>(count) == 0xFFFFFFFF) {
+        if (static_cast<uint32_t>(ThreadModel::Read(count)) == 0xFFFFFFFF) {
             qn::dsc::osdep::DebugTrap();
         }
         return static_cast<ULONG>(ThreadModel::Increment(count));
@@ -43,7 +57,7 @@ class CQNComObjectRootEx : public CQNComObjectRootBase {
 
     // Trap if there is no reference. At 0 the object has to go.
     ULONG InternalRelease() {
-        if (count < 1) {
+        if (ThreadModel::Read(count) < 1) {
             qn::dsc::osdep::DebugTrap();
         }
         return static_cast<ULONG>(ThreadModel::Decrement(count));
@@ -79,7 +93,10 @@ class CQNComObject final : public T {
     }
 
     // A reference that is taken and given back while the object is destroyed must not bring it here again.
-    ~CQNComObject() override { this->count = 1; }
+    ~CQNComObject() override {
+        this->count = 1;
+        T::FinalRelease();
+    }
 
     // Nothing to do. Behind the destructor in the table of every object.
     virtual HRESULT OnCreate(void*, void*) { return S_OK; }

@@ -32,6 +32,10 @@ class CQNComObjectRootBase {
     static HRESULT InternalQueryInterface(const volatile void* object, const InterfaceMapEntry* map, REFIID id,
                                           void** result);
 
+    // What a concrete class has to do when its last reference has gone; one that has anything to do hides it by its
+    // own. The object is whole here: in the class's destructor the operations of IUnknown are gone already.
+    void FinalRelease() {}
+
     // An object is born at 0: the first QueryInterface takes the first reference.
     int32_t count = 0;
 };

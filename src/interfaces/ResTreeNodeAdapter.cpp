@@ -33,7 +33,7 @@ ResTreeNodeAdapter* ResTreeNodeAdapter::Make(ResTreeNode* node, AdapterObserverS
     return adapter;
 }
 
-ResTreeNodeAdapter::~ResTreeNodeAdapter() {
+void ResTreeNodeAdapter::FinalRelease() {
     if (!m_ownsNode) {
         return;
     }

@@ -93,8 +93,10 @@ class ResTreeNodeAdapter : public IzkhwResourceTreeNode5, public CQNComObjectRoo
     HRESULT STDMETHODCALLTYPE IsLocalizedProperty(LPCWSTR name) override;
 
   protected:
+    virtual ~ResTreeNodeAdapter() = default;
+
     // An owning view ends the registrations of its tree, then destroys it.
-    virtual ~ResTreeNodeAdapter();
+    void FinalRelease();
 
   private:
     bool m_ownsNode = false;

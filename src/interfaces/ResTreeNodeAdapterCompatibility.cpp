@@ -3,6 +3,7 @@
 
 #include <set>
 #include <string_view>
+#include <utility>
 #include <vector>
 
 #include "interfaces/BoundaryArrays.h"
@@ -32,16 +33,31 @@ class ReceivedTexts {
     BSTR* array = nullptr;
 };
 
-std::vector<NodePointer> ReceiveChildren(IzkhwResourceTreeNode& node, bool& succeeded) {
+// The same for an array of nodes. What is taken out of it is to be set to null there.
+class ReceivedNodes {
+  public:
+    ReceivedNodes() = default;
+    ReceivedNodes(const ReceivedNodes&) = delete;
+    ReceivedNodes& operator=(const ReceivedNodes&) = delete;
+    ~ReceivedNodes() {
+        for (ULONG i = 0; i < count; ++i) {
+            NodePointer(array[i]).Reset();
+        }
+        CoTaskMemFree(array);
+    }
+
     ULONG count = 0;
     IzkhwResourceTreeNode** array = nullptr;
-    succeeded = SUCCEEDED(node.GetChildren(&count, &array));
+};
+
+std::vector<NodePointer> ReceiveChildren(IzkhwResourceTreeNode& node, bool& succeeded) {
+    ReceivedNodes nodes;
+    succeeded = SUCCEEDED(node.GetChildren(&nodes.count, &nodes.array));
     std::vector<NodePointer> children;
-    children.reserve(count);
-    for (ULONG i = 0; i < count; ++i) {
-        children.emplace_back(array[i]);
+    children.reserve(nodes.count);
+    for (ULONG i = 0; i < nodes.count; ++i) {
+        children.emplace_back(std::exchange(nodes.array[i], nullptr));
     }
-    CoTaskMemFree(array);
     return children;
 }
 

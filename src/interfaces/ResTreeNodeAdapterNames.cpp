@@ -15,6 +15,9 @@ namespace {
 
 // Both arrays or none.
 HRESULT GiveNames(const NameLists& lists, ULONG* count, BSTR** names, BSTR** displayNames) {
+    if (displayNames != nullptr) {
+        *displayNames = nullptr;
+    }
     const HRESULT given = GiveTexts(lists.names, count, names);
     if (FAILED(given) || displayNames == nullptr) {
         return given;
