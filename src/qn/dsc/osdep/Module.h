@@ -13,8 +13,8 @@ using CodePointer = void (*)();
 // The main module of the process. Its exports count together with those of the modules that were linked to it.
 ModuleHandle GetMainModule();
 
-// An already loaded module; null if it isn't. `name` is a file name as on Windows: "x.dll" is libx.so on Linux, and
-// "x" with any other ending is x.so.
+// An already loaded module, wherever it was loaded from; null if it isn't. `name` is a file name as on Windows: "x.dll"
+// is libx.so on Linux, and "x" with any other ending is x.so.
 ModuleHandle FindLoadedModule(const char* name);
 
 // The address of an export of `module`; null if it has none of that name.

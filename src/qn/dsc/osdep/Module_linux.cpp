@@ -5,6 +5,7 @@
 #include <string_view>
 
 #include <dlfcn.h>
+#include <link.h>
 #include <pthread.h>
 
 namespace qn::dsc::osdep {
@@ -27,6 +28,23 @@ ModuleHandle OpenUncounted(const char* nativeName, int flags) {
     return handle;
 }
 
+struct ModuleSearch {
+    std::string_view fileName;
+    const char* path;  // Of the module that was found. The dynamic linker's; null: none yet.
+};
+
+// Called for each loaded module; not 0 ends the search.
+int LookAtModule(dl_phdr_info* module, size_t, void* context) noexcept {
+    ModuleSearch& search = *static_cast<ModuleSearch*>(context);
+    const std::string_view path = module->dlpi_name;
+    // Without a slash npos + 1 is 0: all of it.
+    if (path.substr(path.rfind('/') + 1) != search.fileName) {
+        return 0;
+    }
+    search.path = module->dlpi_name;
+    return 1;
+}
+
 }  // namespace
 
 ModuleHandle GetMainModule() {
@@ -34,7 +52,15 @@ ModuleHandle GetMainModule() {
 }
 
 ModuleHandle FindLoadedModule(const char* name) {
-    return OpenUncounted(NativeModuleName(name).c_str(), RTLD_LAZY | RTLD_NOLOAD);
+    const std::string nativeName = NativeModuleName(name);
+    void* const module = OpenUncounted(nativeName.c_str(), RTLD_LAZY | RTLD_NOLOAD);
+    if (module != nullptr) {
+        return module;
+    }
+    // A plug-in bears no name inside. The dynamic linker knows it only by the path from which it was loaded.
+    ModuleSearch search{nativeName, nullptr};
+    dl_iterate_phdr(&LookAtModule, &search);
+    return search.path == nullptr ? nullptr : OpenUncounted(search.path, RTLD_LAZY | RTLD_NOLOAD);
 }
 
 CodePointer FindExport(ModuleHandle module, const char* name) {
