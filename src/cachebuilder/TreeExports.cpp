@@ -29,8 +29,9 @@ struct TreeQuery {
     LPCWSTR Options() const { return ToBoundary(options.CStr()); }
 
     TreePointer root;
-    String path;
-    String options;
+    // Without memory for the owner these are never filled, and nothing may be asked for on their behalf.
+    String path = String::WithoutBuffer();
+    String options = String::WithoutBuffer();
 };
 
 // The first query of the process builds the tree here.
