@@ -35,16 +35,18 @@ ZKFPGA_API ZkhwFPGAResTree* gFPGAResTree(void);
  * `context` and `item` may be null; those of the first successful query for a node or a tree are kept for good: the
  * item by a reference, the context without. For IzkhwResourceTreeOwner, the host object that stands for the tree is
  * asked of the item's project, or of `context` if `item` is null.
- * S_OK; E_NOINTERFACE: another id, `*result` is null; E_POINTER: the owner's id with neither context nor item; a
- * negative code of what builds the tree, or of the host. A null `result` traps, and so does having no memory for the
- * owner. */
+ * S_OK; E_NOINTERFACE: another id; E_POINTER: the owner's id with neither context nor item, or a null `id`; a negative
+ * code of what builds the tree, or of the host. `*result` is null unless it is S_OK; a null `id` leaves it as it was. A
+ * null `result` with an id that is served traps, and so does having no memory for the owner. */
 ZKFPGA_API HRESULT QueryResourceTreeInterface(const IID* id, IzkHostContext* context, IzkProjectItem* item,
                                               void** result);
 
 /* The queries below name a node by `basePath`, one element however many slashes it holds, and `subPath`, a path below
  * it, of which one leading "/" is passed over. With an empty `subPath`, `basePath` is a path itself. `options` is an
  * option string of IzkEIOGResourceTree (tree_root.h), to which "stripPathPrefix=" and `basePath` are added: results are
- * relative to the base. The caller owns all handles. 0x8007000E: no memory for the owner. */
+ * relative to the base. A null text counts as empty. The caller owns all handles; where there is none, and where
+ * `found` is null, nothing is stored. 0x8007000E: no memory for the owner. Where the result is negative nothing was
+ * stored. Without the host's run-time (host_runtime.h) storing ends the process. */
 
 /* Stores the property at that path in `value`; `*found` is 1. If there is none: 0 is the result all the same, `*found`
  * is 0, and `value` becomes empty. */
@@ -52,7 +54,9 @@ ZKFPGA_API HRESULT FPGAResTree_GetProperty(const char* basePath, const char* sub
                                            ZkStringHandle value, unsigned char* found);
 
 /* Store what IzkEIOGResourceTree::GetDescendantNames or GetMultipleProperties gives in `*names`, which is made if it is
- * null and resized to fit. `*found` is 0, and the array empty, if the path leads nowhere. */
+ * null and resized to fit. `*found` is 0, and the array empty, if the path leads nowhere. E_POINTER: `names` is null.
+ * If the host's run-time reports an error while a string is stored, that string and those in front of it are given back
+ * and null, the others stay, and the exception that leaves says "Array index out of bounds." */
 ZKFPGA_API HRESULT FPGAResTree_GetDescendantNames(const char* basePath, const char* subPath, const char* options,
                                                   ZkStringArrayHandle* names, unsigned char* found);
 ZKFPGA_API HRESULT FPGAResTree_GetMultipleProperties(const char* basePath, const char* subPath, const char* options,
