@@ -15,5 +15,8 @@ write_basic_package_version_file(${CMAKE_BINARY_DIR}/zkfpgaConfigVersion.cmake C
 install(FILES ${CMAKE_BINARY_DIR}/zkfpgaConfig.cmake ${CMAKE_BINARY_DIR}/zkfpgaConfigVersion.cmake
   DESTINATION ${cmake_package_dir})
 
+# The folder of zkfpga.pc may lie at any depth: lib, lib64, lib/x86_64-linux-gnu.
+file(RELATIVE_PATH pc_to_prefix ${CMAKE_INSTALL_FULL_LIBDIR}/pkgconfig ${CMAKE_INSTALL_PREFIX})
+file(RELATIVE_PATH pc_to_include ${CMAKE_INSTALL_FULL_LIBDIR}/pkgconfig ${CMAKE_INSTALL_FULL_INCLUDEDIR})
 configure_file(cmake/zkfpga.pc.in ${CMAKE_BINARY_DIR}/zkfpga.pc @ONLY)
 install(FILES ${CMAKE_BINARY_DIR}/zkfpga.pc DESTINATION ${CMAKE_INSTALL_LIBDIR}/pkgconfig)
