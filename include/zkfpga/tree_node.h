@@ -46,7 +46,8 @@ struct IzkhwResourceTreeNode : public IUnknown {
     virtual HRESULT STDMETHODCALLTYPE GetPath(BSTR* path) = 0;
 
     /* The same with each node's "DisplayName" in place of its name, where it has one; a node whose "DisplayName" is
-     * empty is left out. May load. S_OK, E_POINTER, E_OUTOFMEMORY. */
+     * empty is left out. A localised "DisplayName" ends the path: what follows isn't given. So for all display paths.
+     * May load. S_OK, E_POINTER, E_OUTOFMEMORY. */
     virtual HRESULT STDMETHODCALLTYPE GetDisplayPath(BSTR* path) = 0;
 
     /* Renames the node and the key of its entry in the parent. S_OK. S_FALSE: the parent refused, because an unordered
@@ -221,7 +222,8 @@ struct IzkhwResourceTreeNode4 : public IzkhwResourceTreeNode3 {
     /* A deep copy of the node, of that name unless it is null or empty, as the root of a tree of its own. The tree
      * lives as long as the object in `*clone`; all other views of it are void when that goes. Registrations that were
      * made on them end without a notice. Contents that aren't loaded yet stay unread in both. Links keep leading to
-     * where they led in the original's tree, so they lead somewhere only in the copy of a root. S_OK, E_OUTOFMEMORY. */
+     * where they led in the original's tree, so they lead somewhere only in the copy of a root. Reservations aren't
+     * copied, though their property is. S_OK, E_OUTOFMEMORY. */
     virtual HRESULT STDMETHODCALLTYPE CloneDetached(LPCWSTR name, IzkhwResourceTreeNode** clone) = 0;
 
     /* The names of all nodes below that are of `type` and not excluded, a parent before its children, links followed.
