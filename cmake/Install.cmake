@@ -1,5 +1,5 @@
-# What an installation gets: the tool with its manual page; for hosts, the library, its headers, and packages by which
-# CMake and pkg-config find it.
+# What an installation gets: the tool with its manual page; for hosts, the library, its headers, packages by which CMake
+# and pkg-config find it, and the guide with its two example programs.
 include(CMakePackageConfigHelpers)
 
 install(TARGETS zkfpga_make_resource_cache)
@@ -14,6 +14,9 @@ configure_package_config_file(cmake/zkfpgaConfig.cmake.in ${CMAKE_BINARY_DIR}/zk
 write_basic_package_version_file(${CMAKE_BINARY_DIR}/zkfpgaConfigVersion.cmake COMPATIBILITY SameMajorVersion)
 install(FILES ${CMAKE_BINARY_DIR}/zkfpgaConfig.cmake ${CMAKE_BINARY_DIR}/zkfpgaConfigVersion.cmake
   DESTINATION ${cmake_package_dir})
+
+install(FILES docs/host-guide.md TYPE DOC)
+install(DIRECTORY examples/host/ DESTINATION ${CMAKE_INSTALL_DOCDIR}/examples)
 
 # The folder of zkfpga.pc may lie at any depth: lib, lib64, lib/x86_64-linux-gnu.
 file(RELATIVE_PATH pc_to_prefix ${CMAKE_INSTALL_FULL_LIBDIR}/pkgconfig ${CMAKE_INSTALL_PREFIX})
