@@ -43,11 +43,20 @@ ResTreeNodeObserverAdapter* AdapterObserverSet::FirstBehind(const Key& key) cons
     return found == members.end() ? nullptr : *found;
 }
 
-void AdapterObserverSet::End(ResTreeNodeObserverAdapter* member) {
-    member->GetNode()->RemoveObserver(member, static_cast<int32_t>(member->GetId()), false);
-    // Out of the set first: what the host does when it is released must not find it there.
-    TakeOut({member->GetNode(), member->GetObserver(), member->GetId()});
-    delete member;
+AdapterObserverSet::Ended::~Ended() {
+    for (const ResTreeNodeObserverAdapter* member : members) {
+        delete member;
+    }
+}
+
+void AdapterObserverSet::End(ResTreeNodeObserverAdapter* member, Ended& ended) {
+    const Key key = ByKey::KeyOf(member);
+    member->GetNode()->RemoveObserver(member, static_cast<int32_t>(key.id), false);
+    // That may have read files, and whoever heard of it may have ended this registration too.
+    const auto found = members.find(key);
+    if (found != members.end() && *found == member) {
+        ended.members.insert(members.extract(found));
+    }
 }
 
 void AdapterObserverSet::UnadviseAll() {
@@ -63,13 +72,12 @@ AdapterObserverSet* MakeAdapterObserverSet() {
 
 void EndAdapterObservers(AdapterObserverSet& observers, ResTreeNode* root) {
     while (ResTreeNodeObserverAdapter* const member = observers.First()) {
-        const AdapterObserverSet::Key key{member->GetNode(), member->GetObserver(), member->GetId()};
         const auto adapter = InterfacePointer<ResTreeNodeAdapter>::Share(member->GetAdapter());
+        IzkhwResourceTreeNodeObserver* const observer = member->GetObserver();
+        const ULONG id = member->GetId();
         member->OnNodeChanged(root, NodeDeleted, 0);
-        // The observer may have unregistered itself.
-        if (observers.Find(key) == member) {
-            adapter->Unadvise(member->GetObserver(), member->GetId(), 0);
-        }
+        // By its key: the observer may have ended this registration, and with it its own life, or may have renewed it.
+        adapter->Unadvise(observer, id, 0);
     }
 }
 

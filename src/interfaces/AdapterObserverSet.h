@@ -18,6 +18,24 @@ class AdapterObserverSet {
         ULONG id;
     };
 
+  private:
+    struct ByKey {
+        using is_transparent = void;
+        static Key KeyOf(const ResTreeNodeObserverAdapter* member) {
+            return {member->GetNode(), member->GetObserver(), member->GetId()};
+        }
+        static const Key& KeyOf(const Key& key) { return key; }
+        static bool IsLess(const Key& left, const Key& right);
+
+        template <typename Left, typename Right>
+        bool operator()(const Left& left, const Right& right) const {
+            return IsLess(KeyOf(left), KeyOf(right));
+        }
+    };
+
+    using Members = std::set<ResTreeNodeObserverAdapter*, ByKey>;
+
+  public:
     bool IsEmpty() const { return members.empty(); }
 
     // The member with this key, or null.
@@ -35,29 +53,29 @@ class AdapterObserverSet {
     // The first one behind `key`.
     ResTreeNodeObserverAdapter* FirstBehind(const Key& key) const;
 
-    // Ends a registration: the node hears nothing more, and the member is deleted, which may release the last
-    // reference to a view or to an observer of the host.
-    void End(ResTreeNodeObserverAdapter* member);
+    // Registrations that have ended. Deletes them at its own end, which may release the last reference to a view or to
+    // an observer of the host, and so end the very set that they come from: nothing of it may be used behind that.
+    class Ended {
+      public:
+        Ended() = default;
+        Ended(const Ended&) = delete;
+        Ended& operator=(const Ended&) = delete;
+        ~Ended();
+
+      private:
+        friend AdapterObserverSet;
+        // What the set has held them in comes along, so that ending a registration needs no memory.
+        std::multiset<ResTreeNodeObserverAdapter*, ByKey> members;
+    };
+
+    // Ends a registration: the node has nothing more to tell it, and `ended` takes the member over. May load.
+    void End(ResTreeNodeObserverAdapter* member, Ended& ended);
 
     // Ends all registrations, each as if the host had unregistered it through the view that it used.
     void UnadviseAll();
 
   private:
-    struct ByKey {
-        using is_transparent = void;
-        static Key KeyOf(const ResTreeNodeObserverAdapter* member) {
-            return {member->GetNode(), member->GetObserver(), member->GetId()};
-        }
-        static const Key& KeyOf(const Key& key) { return key; }
-        static bool IsLess(const Key& left, const Key& right);
-
-        template <typename Left, typename Right>
-        bool operator()(const Left& left, const Right& right) const {
-            return IsLess(KeyOf(left), KeyOf(right));
-        }
-    };
-
-    std::set<ResTreeNodeObserverAdapter*, ByKey> members;
+    Members members;
 };
 
 }  // namespace zkhw

@@ -38,7 +38,8 @@ void ResTreeNodeAdapter::FinalRelease() {
         return;
     }
     m_observers->UnadviseAll();
-    delete m_node;
+    // An observer may have let this view go while it hears of a change of the tree.
+    ResTreeNode::Destroy(m_node);
     DestroyAdapterObserverSet(m_observers);
 }
 

@@ -12,6 +12,8 @@ namespace zkhw {
 
 namespace {
 
+using Key = AdapterObserverSet::Key;
+
 constexpr ULONG anyId = ResTreeNodeObserverAdapter::anyId;
 
 bool IsAtOrBelow(const ResTreeNode* node, const ResTreeNode* top) {
@@ -28,7 +30,8 @@ HRESULT ResTreeNodeAdapter::Advise(IzkhwResourceTreeNodeObserver* observer, ULON
         return E_POINTER;
     }
     // The mask of the first registration stands.
-    if (m_observers->Find({m_node, observer, id}) != nullptr) {
+    const Key key{m_node, observer, id};
+    if (m_observers->Find(key) != nullptr) {
         return S_OK;
     }
     try {
@@ -38,7 +41,7 @@ HRESULT ResTreeNodeAdapter::Advise(IzkhwResourceTreeNodeObserver* observer, ULON
         try {
             m_node->AddObserver(member, mask, static_cast<int32_t>(id));
         } catch (...) {
-            m_observers->End(member);
+            delete m_observers->TakeOut(key);
             throw;
         }
     } catch (const std::bad_alloc&) {
@@ -48,15 +51,14 @@ HRESULT ResTreeNodeAdapter::Advise(IzkhwResourceTreeNodeObserver* observer, ULON
 }
 
 HRESULT ResTreeNodeAdapter::Unadvise(IzkhwResourceTreeNodeObserver* observer, ULONG id, BOOL subtree) {
-    using Key = AdapterObserverSet::Key;
+    // Released last: that may end this view, and with an owning one the whole tree.
+    AdapterObserverSet::Ended ended;
     if (id != anyId && subtree == 0) {
         if (ResTreeNodeObserverAdapter* const member = m_observers->Find({m_node, observer, id})) {
-            m_observers->End(member);
+            m_observers->End(member, ended);
         }
         return S_OK;
     }
-    // The end of a registration may release this view, and with an owning one the whole tree.
-    const auto self = InterfacePointer<IzkhwResourceTreeNode>::Share(this);
     // Of this node alone all that could match stand in a row.
     Key key{subtree != 0 ? nullptr : m_node, subtree != 0 ? nullptr : observer, 0};
     ResTreeNodeObserverAdapter* member = m_observers->FirstFrom(key);
@@ -67,7 +69,7 @@ HRESULT ResTreeNodeAdapter::Unadvise(IzkhwResourceTreeNodeObserver* observer, UL
         }
         if (key.observer == observer && IsAtOrBelow(key.node, m_node) &&
             (id == anyId || key.id == anyId || key.id == id)) {
-            m_observers->End(member);
+            m_observers->End(member, ended);
         }
         member = m_observers->FirstBehind(key);
     }

@@ -53,6 +53,10 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     // Removes the entries one by one from the first, with the notices that go with it, then ends all watching.
     ~ResTreeNode() override;
 
+    // Deletes a root; null does nothing. While a ReleaseScope stands, which an operation of the tree further up the
+    // stack may have set up, the memory stays until that ends.
+    static void Destroy(ResTreeNode* root) noexcept;
+
     // Nodes come from the same allocator as their texts.
     static void* operator new(size_t size);
     static void* operator new(size_t size, const std::nothrow_t&) noexcept;
@@ -198,7 +202,8 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     // `context` of -1 stands for any. Contexts 1 and 2 are taken by nodes that watch each other. With AncestorChanged
     // all nodes above are watched too, with ReservationChanged all nodes that "Reserves" names, at any distance.
     // The observer isn't owned (but see DeleteWithNode): remove it before it dies.
-    // True if something new was registered, here or on a node that this one watches in turn.
+    // True if something new was registered, here or on a node that this one watches in turn. After an exception a new
+    // observer isn't registered.
     bool AddObserver(ResTreeNodeChangeObserver* observer, uint32_t mask, int32_t context);
 
     // Ends what AddObserver began; a `context` of -1 stands for all. With `recursive` on all nodes below too, which
@@ -373,6 +378,7 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     bool Unregister(ResTreeNodeChangeObserver* observer, int32_t context);
     bool WatchAncestors();
     bool WatchDependants();
+    void Withdraw(ResTreeNodeChangeObserver* observer, int32_t context);
     static bool RemoveRecords(ResTreeNode& node, ResTreeNodeChangeObserver* observer, int32_t context);
     void ForgetWatching() noexcept;
     static void EndWatch(ObserverRecord& record) noexcept;

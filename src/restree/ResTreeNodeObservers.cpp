@@ -1,6 +1,7 @@
 // Who hears of a node's changes, and how a node comes to watch others.
 
 #include <algorithm>
+#include <new>
 #include <typeinfo>
 #include <unordered_set>
 
@@ -201,14 +202,31 @@ bool ResTreeNode::AddObserver(ResTreeNodeChangeObserver* observer, uint32_t mask
     if (isDefunct) {
         return false;
     }
-    bool anyNew = Register(observer, mask, context, AsPlainNode(observer));
-    if ((mask & AncestorChanged) != 0) {
-        anyNew |= WatchAncestors();
-    }
-    if ((mask & ReservationChanged) != 0) {
-        anyNew |= WatchDependants();
+    const bool isNew = Register(observer, mask, context, AsPlainNode(observer));
+    bool anyNew = isNew;
+    try {
+        if ((mask & AncestorChanged) != 0) {
+            anyNew |= WatchAncestors();
+        }
+        if ((mask & ReservationChanged) != 0) {
+            anyNew |= WatchDependants();
+        }
+    } catch (...) {
+        if (isNew) {
+            Withdraw(observer, context);
+        }
+        throw;
     }
     return anyNew;
+}
+
+// Takes back a registration that has failed. If there is not even memory for that, what nodes watch for its sake stays.
+void ResTreeNode::Withdraw(ResTreeNodeChangeObserver* observer, int32_t context) {
+    try {
+        RemoveRecords(*this, observer, context);
+    } catch (const std::bad_alloc&) {
+        Unregister(observer, context);
+    }
 }
 
 bool ResTreeNode::RemoveObserver(ResTreeNodeChangeObserver* observer, int32_t context, bool recursive) {

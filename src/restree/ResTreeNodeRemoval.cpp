@@ -143,6 +143,15 @@ void ResTreeNode::ReleaseNode(ResTreeNode* node) noexcept {
     }
 }
 
+void ResTreeNode::Destroy(ResTreeNode* root) noexcept {
+    if (root != nullptr) {
+        if (ReleaseScope::IsActive()) {
+            ReleaseScope::Reserve();
+        }
+        ReleaseNode(root);
+    }
+}
+
 void ResTreeNode::RemoveEntry(EntryIterator iterator) {
     if (!iterator.IsEnd()) {
         RemoveEntry(&*iterator);
