@@ -19,7 +19,7 @@ uint32_t ByteLengthInFront(BSTR string) {
 }
 
 TEST(BoundaryString, HasItsByteLengthInFrontAndANulBehind) {
-    const BSTR string = SysAllocString(In(u"abc"));
+    auto* const string = SysAllocString(In(u"abc"));
     EXPECT_EQ(ByteLengthInFront(string), 6U);
     EXPECT_EQ(std::memcmp(string, u"abc", 8), 0);
     EXPECT_EQ(SysStringLen(string), 3U);
@@ -27,7 +27,7 @@ TEST(BoundaryString, HasItsByteLengthInFrontAndANulBehind) {
 }
 
 TEST(BoundaryString, OfAnEmptyTextIsABlockOfItsOwn) {
-    const BSTR string = SysAllocString(In(u""));
+    auto* const string = SysAllocString(In(u""));
     ASSERT_NE(string, nullptr);
     EXPECT_EQ(ByteLengthInFront(string), 0U);
     EXPECT_EQ(string[0], 0);
@@ -41,7 +41,7 @@ TEST(BoundaryString, OfNullIsNull) {
 }
 
 TEST(BoundaryString, OfALengthKeepsNulUnits) {
-    const BSTR string = SysAllocStringLen(In(u"a\0b\0"), 4);
+    auto* const string = SysAllocStringLen(In(u"a\0b\0"), 4);
     EXPECT_EQ(ByteLengthInFront(string), 8U);
     EXPECT_EQ(SysStringLen(string), 4U);
     EXPECT_EQ(std::memcmp(string, u"a\0b\0", 10), 0);
@@ -49,13 +49,13 @@ TEST(BoundaryString, OfALengthKeepsNulUnits) {
 }
 
 TEST(BoundaryString, TakesNoMoreUnitsThanAskedFor) {
-    const BSTR string = SysAllocStringLen(In(u"abcdef"), 2);
+    auto* const string = SysAllocStringLen(In(u"abcdef"), 2);
     EXPECT_EQ(std::memcmp(string, u"ab", 6), 0);
     SysFreeString(string);
 }
 
 TEST(BoundaryString, WithoutATextHasRoomForItsUnitsAndANul) {
-    const BSTR string = SysAllocStringLen(nullptr, 3);
+    auto* const string = SysAllocStringLen(nullptr, 3);
     ASSERT_NE(string, nullptr);
     EXPECT_EQ(SysStringLen(string), 3U);
     EXPECT_EQ(string[3], 0);
