@@ -1,16 +1,24 @@
 // What an installation consists of.
 
 #include <algorithm>
+#include <cstdlib>
 #include <filesystem>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include <gtest/gtest.h>
 
 #include "install/ExampleHost.h"
+#include "support/RunProgram.h"
+#include "support/TemporaryFolder.h"
 
 namespace zkhw {
 namespace {
+
+using qn::dsc::osdep::ProgramResult;
+using qn::dsc::osdep::RunProgram;
+using qn::dsc::osdep::TemporaryFolder;
 
 TEST(InstalledFiles, AreTheToolTheLibraryItsHeadersItsPackagesAndTheGuide) {
     const std::string library = INSTALL_LIBDIR;
@@ -65,6 +73,22 @@ TEST(InstalledFiles, NameNoFolderOfTheBuild) {
         EXPECT_EQ(ReadText(path).find(ZKFPGA_SOURCE_DIR), std::string::npos) << path;
         EXPECT_GT(ReadText(path).size(), 0U) << path;
     }
+}
+
+TEST(InstalledFiles, AreFoundByPkgConfigWhereTheyWereMoved) {
+    const TemporaryFolder folder;
+    std::filesystem::copy(INSTALL_PREFIX, folder.Native(), std::filesystem::copy_options::recursive);
+    setenv("PKG_CONFIG_PATH", folder.Native(INSTALL_LIBDIR "/pkgconfig").c_str(), 1);
+    for (const auto& [variable, file] :
+         {std::pair("includedir", "zkfpga/zkfpga.h"), std::pair("libdir", "libzkfpgarestree.so"),
+          std::pair("prefix", "bin/zkfpga_make_resource_cache")}) {
+        ProgramResult result = RunProgram(HOST_PKG_CONFIG, {std::string("--variable=") + variable, "zkfpga"}, "/");
+        ASSERT_EQ(result.end + result.errors, "exit 0");
+        result.output.erase(result.output.find('\n'));
+        EXPECT_EQ(result.output.find(folder.Native()), 0U) << result.output;
+        EXPECT_TRUE(std::filesystem::exists(result.output + "/" + file)) << result.output;
+    }
+    unsetenv("PKG_CONFIG_PATH");
 }
 
 }  // namespace
