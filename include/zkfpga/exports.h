@@ -35,9 +35,10 @@ ZKFPGA_API ZkhwFPGAResTree* gFPGAResTree(void);
  * `context` and `item` may be null; those of the first successful query for a node or a tree are kept for good: the
  * item by a reference, the context without. For IzkhwResourceTreeOwner, the host object that stands for the tree is
  * asked of the item's project, or of `context` if `item` is null.
- * S_OK; E_NOINTERFACE: another id; E_POINTER: the owner's id with neither context nor item, or a null `id`; a negative
- * code of what builds the tree, or of the host. `*result` is null unless it is S_OK; a null `id` leaves it as it was. A
- * null `result` with an id that is served traps, and so does having no memory for the owner. */
+ * S_OK; E_NOINTERFACE: another id; E_POINTER: the owner's id with neither context nor item; E_FAIL: the item has no
+ * project; E_OUTOFMEMORY; a negative code of what builds the tree, or of the host. With all failures `*result` is null,
+ * and the next call tries again. A null `id` gives E_POINTER and leaves `*result` alone. A null `result` with a known
+ * id traps, and so does having no memory for the owner. */
 ZKFPGA_API HRESULT QueryResourceTreeInterface(const IID* id, IzkHostContext* context, IzkProjectItem* item,
                                               void** result);
 
@@ -45,8 +46,9 @@ ZKFPGA_API HRESULT QueryResourceTreeInterface(const IID* id, IzkHostContext* con
  * it, of which one leading "/" is passed over. With an empty `subPath`, `basePath` is a path itself. `options` is an
  * option string of IzkEIOGResourceTree (tree_root.h), to which "stripPathPrefix=" and `basePath` are added: results are
  * relative to the base. A null text counts as empty. The caller owns all handles; where there is none, and where
- * `found` is null, nothing is stored. 0x8007000E: no memory for the owner. Where the result is negative nothing was
- * stored. Without the host's run-time (host_runtime.h) storing ends the process. */
+ * `found` is null, nothing is stored. 0, or a negative code, and then nothing was stored: 0x8007000E: no memory for the
+ * owner; 0x80004003: null `names`; else that of what builds the tree or of the tree's own query. Without the host's
+ * run-time (host_runtime.h) storing ends the process. */
 
 /* Stores the property at that path in `value`; `*found` is 1. If there is none: 0 is the result all the same, `*found`
  * is 0, and `value` becomes empty. */

@@ -26,7 +26,8 @@ struct IzkProjectItem;
 /* Implemented by this library; the host calls it while IzkProjectItem::SelectItems runs, and not after. Takes part in
  * reference counting in form only: the host must neither keep nor release it. */
 struct IzkProjectItemSelector : public IUnknown {
-    /* Called for each project item below. `*result` becomes 1. S_FALSE: go on; S_OK: it was the one. */
+    /* Called for each project item below. `item` and `result` must not be null. `*result` becomes 1. S_FALSE: go on;
+     * S_OK: it was the one. */
     virtual HRESULT STDMETHODCALLTYPE SelectItem(IzkProjectItem* item, BOOL* result) = 0;
 
   protected:
@@ -38,13 +39,16 @@ struct IzkProjectItem : public IUnknown {
     /* Fills in `record`. The result isn't looked at. */
     virtual HRESULT STDMETHODCALLTYPE GetItemInfo(ProjectItemRecord* record) = 0;
 
-    /* The item's name as the user sees it: the alias of the resource that it refers to. */
+    /* The item's name as the user sees it: the alias of the resource that it refers to. Null is the empty name. The
+     * result isn't looked at. */
     virtual HRESULT STDMETHODCALLTYPE GetName(BSTR* name) = 0;
 
-    /* The item's project, with one reference; it is used as an IzkProject without being asked. */
+    /* The item's project, with one reference; it is used as an IzkProject without being asked. A failure, or no
+     * project (E_FAIL), becomes the result of the query for IzkhwResourceTreeOwner. */
     virtual HRESULT STDMETHODCALLTYPE GetProject(IUnknown** project) = 0;
 
-    /* Calls SelectItem of `selector` for the items below this one. `*result` may be given an object; it is released. */
+    /* Calls SelectItem of `selector` for the items below this one. `*result`, null before the call, may be given an
+     * object; it is released. The result isn't looked at. */
     virtual HRESULT STDMETHODCALLTYPE SelectItems(IzkProjectItemSelector* selector, IUnknown** result) = 0;
 
   protected:
@@ -57,7 +61,7 @@ struct IzkProjectItemLocator : public IUnknown {
      * used. The id travels by value. */
     virtual HRESULT STDMETHODCALLTYPE FindItemById(GUID id, IUnknown** item) = 0;
 
-    /* The project's own item for a record, with one reference, or null. */
+    /* The project's own item for a record, with one reference, or null. The result isn't looked at. */
     virtual HRESULT STDMETHODCALLTYPE FindItem(ProjectItemRecord* record, IUnknown** item) = 0;
 
   protected:
@@ -81,7 +85,8 @@ struct IzkItemMarker : public IUnknown {
 
 /* What IzkProjectItem::GetProject gives. */
 struct IzkProject : public IUnknown {
-    /* The object that stands for the tree in this project, with one reference. */
+    /* The object that stands for the tree in this project, with one reference; it answers for
+     * IID_IzkhwResourceTreeNode. A failure becomes the result of the query for IzkhwResourceTreeOwner. */
     virtual HRESULT STDMETHODCALLTYPE GetItemObject(ProjectItemRecord* record, IUnknown** object) = 0;
 
   protected:
@@ -91,7 +96,7 @@ struct IzkProject : public IUnknown {
 /* The host's context, the second argument of QueryResourceTreeInterface. This library holds no reference to it: it has
  * to live as long as the tree is used. */
 struct IzkHostContext : public IUnknown {
-    /* The locator, without a new reference. */
+    /* The locator, without a new reference; null: there are no aliases. */
     virtual IzkProjectItemLocator* STDMETHODCALLTYPE GetItemLocator() = 0;
 
   protected:

@@ -170,16 +170,19 @@ struct IzkhwResourceTreeNode : public IUnknown {
 
     /* --- Change notices (ZkhwChange) --- */
 
-    /* Calls `observer` when something of `mask` changes about the node; `id`, a number of the caller's, comes back in
-     * each call. A second registration of the same observer with the same id at the same node does nothing, and the
-     * first mask stands. The registration holds a reference to the observer and to this object until Unadvise or the
-     * end of the node. Ids 1 and 2 are used by nodes among themselves, too. S_OK, E_OUTOFMEMORY; E_POINTER for a null
-     * `observer`. */
+    /* Calls `observer` when something of `mask` (ZkhwChange) changes about the node; `id`, a number of the caller's,
+     * comes back in each call. Every number is free to use, those that nodes use among themselves included. A second
+     * registration of the same observer with the same id at the same node, through whichever view, does nothing: the
+     * first mask and the first view stand. A registration that is made during a notice of the node hears of what comes
+     * after it. The registration holds one reference to the observer and one to this object, until Unadvise, the end of
+     * the node, or the end of its tree; so at the view that CloneDetached made, it keeps the copy alive.
+     * With ZkhwReservationChanged: may load. S_OK; E_POINTER: null `observer`; E_OUTOFMEMORY: nothing is registered. */
     virtual HRESULT STDMETHODCALLTYPE Advise(IzkhwResourceTreeNodeObserver* observer, ULONG mask, ULONG id) = 0;
 
-    /* Ends registrations of `observer`: the one with `id` at this node. With `id` 0xFFFFFFFF, all of its ids, and with
-     * `subtree`, at all nodes below as well; a registration that was made with the id 0xFFFFFFFF is then ended with any
-     * id. Always S_OK. */
+    /* Ends registrations of `observer` at this node, through whichever view they were made: the one with `id`, or with
+     * the id 0xFFFFFFFF all of them. With `subtree`, those of that id at this node and all nodes below, and together
+     * with them every one there that was made with the id 0xFFFFFFFF. What is ended hears nothing more, also when a
+     * notice is under way. Always S_OK, also if there is none. */
     virtual HRESULT STDMETHODCALLTYPE Unadvise(IzkhwResourceTreeNodeObserver* observer, ULONG id, BOOL subtree) = 0;
 
     /* Hold the notices of this node back; nests. BeginChange takes the flags that wait and gives them in `*pending`.

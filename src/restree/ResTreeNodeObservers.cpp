@@ -220,12 +220,18 @@ bool ResTreeNode::AddObserver(ResTreeNodeChangeObserver* observer, uint32_t mask
     return anyNew;
 }
 
-// Takes back a registration that has failed. If there is not even memory for that, what nodes watch for its sake stays.
+// Takes back a registration that has failed. Without memory even for that, nodes may go on watching dependants for its
+// sake, which nobody hears of, but none goes on watching those above it: that would reach others.
 void ResTreeNode::Withdraw(ResTreeNodeChangeObserver* observer, int32_t context) {
     try {
         RemoveRecords(*this, observer, context);
     } catch (const std::bad_alloc&) {
         Unregister(observer, context);
+        ResTreeNode* node = this;
+        while (node->parent != nullptr && !node->AnyActiveObserver(AncestorChanged) &&
+               node->parent->Unregister(node, ancestorContext)) {
+            node = node->parent;
+        }
     }
 }
 

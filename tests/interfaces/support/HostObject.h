@@ -17,7 +17,7 @@ namespace zkhw {
 template <typename Interface>
 class HostObject : public Interface {
   public:
-    HostObject() = default;
+    HostObject() { asked.reserve(16); }
     HostObject(const HostObject&) = delete;
     HostObject& operator=(const HostObject&) = delete;
     virtual ~HostObject() { EXPECT_EQ(references, 0) << "references are left"; }
