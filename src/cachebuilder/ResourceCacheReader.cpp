@@ -1,5 +1,3 @@
-#include <algorithm>
-
 #include "cachebuilder/FPGAResTree.h"
 #include "cachebuilder/ResourceCache.h"
 #include "cachebuilder/TargetDiscovery.h"
@@ -16,24 +14,15 @@ using qn::dsc::osdep::GetDirectoryName;
 using qn::dsc::osdep::GetExecutableDir;
 using qn::dsc::osdep::GetFileModificationTime;
 using qn::dsc::osdep::JoinPath;
-using qn::dsc::osdep::TimeStamp;
 
 namespace {
 
-bool IsStale(const String& directory, const String& cachePath) {
-    const TimeStamp cacheTime = GetFileModificationTime(cachePath);
-    std::vector<String> files;
-    FindResourceFiles(directory, u"*resource.xml", files);
-    return std::any_of(files.begin(), files.end(),
-                       [&](const String& file) { return cacheTime < GetFileModificationTime(file); });
-}
-
 // ":DeferredLoadPath" comes last: with it in place, a name that the stub lacks makes it load, also when it is to be
 // set.
-void ArmTarget(ResTreeNode& target) {
+void ArmTarget(ResTreeNode& target, const String& executableDir) {
     target.MakeTypeTableLocal();
     const String folder = GetDirectoryName(target.GetPropertyOrEmpty(u"TargetXMLPath"));
-    target.SetProperty(u"TargetDir", JoinPath(GetExecutableDir(), folder).View());
+    target.SetProperty(u"TargetDir", JoinPath(executableDir, folder).View());
     target.SetProperty(u"TargetClassShortClassName", target.GetName().View());
     const String file = target.GetPropertyOrEmpty(u"TargetXMLPath");
     target.SetProperty(u":DeferredLoadPath", file.View());
@@ -50,14 +39,18 @@ void ArmOther(ResTreeNode& node) {
 bool ArmStubs(ResTreeNode& root) {
     const ReleaseScope scope;
     bool seenTarget = false;
+    String executableDir;
     for (EntryIterator entry = root.Begin(); !entry.IsEnd(); ++entry) {
         ResTreeNode* const child = entry->Child();
         if (child == nullptr) {
             continue;
         }
         if (child->IsA(u"Target")) {
-            seenTarget = true;
-            ArmTarget(*child);
+            if (!seenTarget) {
+                seenTarget = true;
+                executableDir = GetExecutableDir();
+            }
+            ArmTarget(*child, executableDir);
         } else {
             ArmOther(*child);
         }
@@ -68,7 +61,7 @@ bool ArmStubs(ResTreeNode& root) {
 }  // namespace
 
 int32_t FPGAResTree::ReadResourceCache(const String& directory, const String& cachePath, ResTreeNode& root) {
-    if (IsStale(directory, cachePath)) {
+    if (IsAnyResourceFileNewer(directory, u"*resource.xml", GetFileModificationTime(cachePath))) {
         return needsScan;
     }
     root.LoadResourceFile(NarrowString(cachePath), false, nullptr);

@@ -66,6 +66,7 @@ void FailEachInTurn(bool fromThenOn) {
         failures += outcome == "0" ? 0U : 1U;
         ASSERT_EQ(installation.files.OpenFiles(), 0) << "allocation " << nth;
         ASSERT_EQ(installation.files.OpenSearches(), 0) << "allocation " << nth;
+        ASSERT_EQ(installation.files.OpenWalks(), 0) << "allocation " << nth;
     }
     EXPECT_GT(failures, total / 2);
     // With the failure lifted all is as before.

@@ -38,7 +38,7 @@ std::string OutcomeOf(SmallInstallation& installation, const char* argument = nu
     }
 }
 
-enum class CacheAfter { Unchanged, Empty, Whole, WithoutOne, WithoutMore, WithoutTargets, OtherPaths };
+enum class CacheAfter { Unchanged, Empty, Whole, WithoutOne, WithoutMore, WithoutTargets, WithoutChildren, OtherPaths };
 
 struct Row {
     const char* name;
@@ -93,6 +93,10 @@ TEST_P(ToolFileFailure, EndsAsTheTableSays) {
             EXPECT_EQ(cache.find("<Target"), std::string::npos);
             EXPECT_NE(cache.find("<FPGAHostSet>"), std::string::npos);
             break;
+        case CacheAfter::WithoutChildren:
+            EXPECT_EQ(cache,
+                      "<?xml version=\"1.0\"?>\n<ProviderResourceTreeRoot name=\"\">\n</ProviderResourceTreeRoot>");
+            break;
         case CacheAfter::OtherPaths:
             EXPECT_TRUE(HasTarget(cache, "One"));
             EXPECT_NE(cache, whole);
@@ -101,6 +105,7 @@ TEST_P(ToolFileFailure, EndsAsTheTableSays) {
     EXPECT_EQ(installation.folder.Exists("Targets/QN/FPGA/one/a.menu"), row.menusCopied);
     EXPECT_EQ(installation.files.OpenFiles(), 0);
     EXPECT_EQ(installation.files.OpenSearches(), 0);
+    EXPECT_EQ(installation.files.OpenWalks(), 0);
 }
 
 const Row table[] = {
@@ -111,14 +116,15 @@ const Row table[] = {
     // looked for there as well, and the missing one is reported on its target.
     {"AttributesOfTheHost", FileCall::ReadAttributes, u"Zarvik.exe", "0", CacheAfter::OtherPaths, true},
     // A folder that can't be looked at counts as a file.
-    {"AttributesOfATargetsFolder", FileCall::ReadAttributes, u"Targets\\QN\\FPGA\\two", "0", CacheAfter::OtherPaths,
-     true},
+    {"EntryOfATargetsFolder", FileCall::EnterFolder, u"Targets\\QN\\FPGA\\two", "0", CacheAfter::OtherPaths, true},
     // The guard against loops stands back; nothing else asks who a folder is.
     {"IdentityOfAFolder", FileCall::ReadIdentity, u"Targets\\QN\\FPGA\\one", "0", CacheAfter::Whole, true},
     // A listing that fails is empty.
-    {"ListingOfMatches", FileCall::BeginSearch, u"Targets\\QN\\FPGA\\more\\*resource.xml", "failure",
-     CacheAfter::WithoutMore, false},
-    {"ListingOfFolders", FileCall::BeginSearch, u"Targets\\QN\\FPGA\\*", "failure", CacheAfter::WithoutTargets, false},
+    {"ListingOfMatches", FileCall::ListFolder, u"Targets\\QN\\FPGA\\more", "failure", CacheAfter::WithoutMore, false},
+    {"ListingOfEverything", FileCall::ListFolder, u"Targets\\QN\\FPGA", "failure", CacheAfter::WithoutChildren, false},
+    {"BeginningOfTheWalk", FileCall::BeginWalk, u"Targets\\QN\\FPGA", "failure", CacheAfter::WithoutChildren, false},
+    // The files of the directory itself are found without its folders.
+    {"EntryOfAllFolders", FileCall::EnterFolder, u"Targets\\QN\\FPGA\\*", "failure", CacheAfter::WithoutTargets, false},
     // A resource file that can't be opened is passed over without a trace.
     {"OpenOfATarget", FileCall::OpenText, u"Targets\\QN\\FPGA\\one\\one_resource.xml", "0", CacheAfter::WithoutOne,
      false},
@@ -194,7 +200,7 @@ TEST(ToolFileFailures, NoSingleFailureEndsInAnythingElse) {
     ASSERT_GT(readsBefore, 0U);
     for (const FileCall call :
          {FileCall::ReadAttributes, FileCall::ReadIdentity, FileCall::BeginSearch, FileCall::NextName,
-          FileCall::MakeFolder, FileCall::OpenBinary, FileCall::OpenText, FileCall::WriteBytes, FileCall::CloseFile,
+          FileCall::BeginWalk, FileCall::ListFolder, FileCall::EnterFolder, FileCall::MakeFolder, FileCall::OpenBinary, FileCall::OpenText, FileCall::WriteBytes, FileCall::CloseFile,
           FileCall::ReadWorkingFolder, FileCall::ReadExecutablePath}) {
         for (const int error : {EACCES, EIO, EMFILE, ENOENT, ENOMEM}) {
             for (uint64_t nth = 1; nth <= total; ++nth) {
@@ -217,6 +223,7 @@ TEST(ToolFileFailures, NoSingleFailureEndsInAnythingElse) {
                     << outcome;
                 EXPECT_EQ(installation.files.OpenFiles(), 0);
                 EXPECT_EQ(installation.files.OpenSearches(), 0);
+                EXPECT_EQ(installation.files.OpenWalks(), 0);
             }
         }
     }

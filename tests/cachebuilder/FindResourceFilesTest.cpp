@@ -123,8 +123,7 @@ TEST_F(FindResourceFilesIn, FolderThatCannotBeListedIsPassedOver) {
     folder.WriteFile("b/b_resource.xml", "");
     FaultyFileSystem files;
     const FileSystemScope scope(files);
-    files.FailOnPath(FileCall::BeginSearch, folder.System(u"a\\*resource.xml"), EACCES);
-    files.FailOnPath(FileCall::BeginSearch, folder.System(u"a\\*"), EACCES);
+    files.FailOnPath(FileCall::ListFolder, folder.System(u"a"), EACCES);
     EXPECT_EQ(Found(), (Names{"b\\b_resource.xml"}));
 }
 
@@ -136,14 +135,15 @@ TEST_F(FindResourceFilesIn, FolderWithoutAnIdentityIsStillEntered) {
     EXPECT_EQ(Found(), (Names{"a\\a_resource.xml"}));
 }
 
-TEST_F(FindResourceFilesIn, EachFolderIsListedTwice) {
+TEST_F(FindResourceFilesIn, EachFolderIsListedOnce) {
     folder.MakeFolder("a/b");
     folder.WriteFile("c_resource.xml", "");
     FaultyFileSystem files;
     const FileSystemScope scope(files);
     Found();
-    EXPECT_EQ(files.Count(FileCall::BeginSearch), 6u);
-    EXPECT_EQ(files.OpenSearches(), 0);
+    EXPECT_EQ(files.Count(FileCall::ListFolder), 3u);
+    EXPECT_EQ(files.Count(FileCall::BeginSearch), 0u);
+    EXPECT_EQ(files.OpenWalks(), 0);
 }
 
 TEST_F(FindResourceFilesIn, DeepFoldersTakeNoStack) {

@@ -221,14 +221,14 @@ TEST_F(ResourceCacheReader, StaleCacheIsNotOpened) {
 TEST_F(ResourceCacheReader, FirstNewerFileEndsTheTest) {
     BuildCache();
     SetTimes(-1);
-    const uint64_t before = host.Files().Count(FileCall::ReadAttributes);
+    const uint64_t before = host.Files().Count(FileCall::ReadWriteTime);
     EXPECT_EQ(Read(), 1);
-    const uint64_t allStale = host.Files().Count(FileCall::ReadAttributes) - before;
+    const uint64_t allStale = host.Files().Count(FileCall::ReadWriteTime) - before;
     SetTimes(0);
     SetTime("x/x_resource.xml", 1000001, 0);
-    const uint64_t between = host.Files().Count(FileCall::ReadAttributes);
+    const uint64_t between = host.Files().Count(FileCall::ReadWriteTime);
     EXPECT_EQ(Read(), 1);
-    const uint64_t lastStale = host.Files().Count(FileCall::ReadAttributes) - between;
+    const uint64_t lastStale = host.Files().Count(FileCall::ReadWriteTime) - between;
     // The other three were asked for their times.
     EXPECT_EQ(lastStale, allStale + 3);
 }
@@ -251,7 +251,7 @@ TEST_F(ResourceCacheReader, NewFileWithAnOldTimeStaysUnseen) {
 TEST_F(ResourceCacheReader, FileWhoseTimeCannotBeReadIsOld) {
     BuildCache();
     SetTime("x/x_resource.xml", 2000000, 0);
-    host.Files().FailOnPath(FileCall::ReadAttributes, installation.System(u"x\\x_resource.xml"), EIO);
+    host.Files().FailOnPath(FileCall::ReadWriteTime, installation.System(u"x\\x_resource.xml"), EIO);
     EXPECT_EQ(Read(), 0);
 }
 

@@ -1,10 +1,66 @@
 #include "support/FaultyFileSystem.h"
 
 #include <algorithm>
+#include <utility>
 
 #include "qn/dsc/osdep/Compare.h"
+#include "qn/dsc/osdep/path.h"
 
 namespace qn::dsc::osdep {
+
+// A walk of the inner file system. Knows the present path, for the faults that are set on paths.
+class FaultyFolderWalk final : public FolderWalk {
+  public:
+    FaultyFolderWalk(FaultyFileSystem& faultyFiles, std::unique_ptr<FolderWalk> innerWalk, const String& start)
+        : files(faultyFiles), inner(std::move(innerWalk)) {
+        paths.push_back(start);
+        ++files.openWalks;
+    }
+    ~FaultyFolderWalk() override { --files.openWalks; }
+
+    int List() override {
+        const int error = files.Enter(FileCall::ListFolder, &paths.back());
+        return error != 0 ? error : inner->List();
+    }
+    size_t EntryCount() const override { return inner->EntryCount(); }
+    WalkEntry EntryAt(size_t number) const override { return inner->EntryAt(number); }
+    int Enter(size_t number, WayIn& way) override {
+        String path = PathOf(number);
+        const String any = JoinPath(paths.back(), u"*");
+        paths.reserve(paths.size() + 1);
+        int error = files.Enter(FileCall::EnterFolder, &path);
+        if (error == 0) {
+            error = files.PathFaultFor(FileCall::EnterFolder, any);
+        }
+        if (error == 0) {
+            error = inner->Enter(number, way);
+        }
+        if (error == 0) {
+            paths.push_back(std::move(path));
+        }
+        return error;
+    }
+    void Leave() override {
+        paths.pop_back();
+        inner->Leave();
+    }
+    int ReadWriteTime(size_t number, uint64_t& time) override {
+        const String path = PathOf(number);
+        const int error = files.Enter(FileCall::ReadWriteTime, &path);
+        return error != 0 ? error : inner->ReadWriteTime(number, time);
+    }
+    int ReadIdentity(size_t level, FileIdentity& identity) override {
+        const int error = files.Enter(FileCall::ReadIdentity, &paths[level]);
+        return error != 0 ? error : inner->ReadIdentity(level, identity);
+    }
+
+  private:
+    String PathOf(size_t number) const { return JoinPath(paths.back(), String(inner->EntryAt(number).name)); }
+
+    FaultyFileSystem& files;
+    std::unique_ptr<FolderWalk> inner;
+    std::vector<String> paths;
+};
 
 void FaultyFileSystem::Fail(FileCall kind, uint64_t nth, int error) {
     const uint64_t call = Count(kind) + nth;
@@ -36,9 +92,13 @@ int FaultyFileSystem::Enter(FileCall kind, const String* path) {
             return fault.error;
         }
     }
+    return path == nullptr ? 0 : PathFaultFor(kind, *path);
+}
+
+int FaultyFileSystem::PathFaultFor(FileCall kind, const String& path) const {
     for (const PathFault& fault : pathFaults) {
         const bool isMeant = fault.kind == FileCall::Any || fault.kind == kind;
-        if (isMeant && path != nullptr && Equal(fault.path.View(), path->View())) {
+        if (isMeant && Equal(fault.path.View(), path.View())) {
             return fault.error;
         }
     }
@@ -72,6 +132,22 @@ int FaultyFileSystem::NextName(SearchHandle search, String& name) {
 void FaultyFileSystem::EndSearch(SearchHandle search) {
     --openSearches;
     inner.EndSearch(search);
+}
+
+int FaultyFileSystem::BeginWalk(const String& folder, const String& pattern, std::unique_ptr<FolderWalk>& walk) {
+    String start = folder;
+    if (start.Length() > 3 && start.View().back() == u'\\') {
+        start.Erase(start.Length() - 1, 1, false);
+    }
+    int error = Enter(FileCall::BeginWalk, &start);
+    std::unique_ptr<FolderWalk> begun;
+    if (error == 0) {
+        error = inner.BeginWalk(folder, pattern, begun);
+    }
+    if (error == 0) {
+        walk = std::make_unique<FaultyFolderWalk>(*this, std::move(begun), start);
+    }
+    return error;
 }
 
 int FaultyFileSystem::MakeFolder(const String& path) {

@@ -13,7 +13,8 @@
 // To fail every call of a run in turn: count the calls of a sound run with Count(FileCall::Any), then repeat the run
 // with Fail(FileCall::Any, n, EIO) for each n up to that count.
 //
-// EndSearch and HoldFolder can't fail and aren't counted. CloseFile closes, also where it reports a failure.
+// The ReadIdentity of a walk is one like any other. EndSearch, HoldFolder and the way out of a folder can't fail and
+// aren't counted. CloseFile closes, also where it reports a failure.
 
 #include <array>
 #include <cstddef>
@@ -30,6 +31,10 @@ enum class FileCall {
     ReadIdentity,
     BeginSearch,
     NextName,
+    BeginWalk,      // With the path of the folder.
+    ListFolder,     // Of a walk, with the path of the folder.
+    EnterFolder,    // Of a walk, with the path of what is entered; also with that of its folder and "\\*".
+    ReadWriteTime,  // Of a walk, with the path of the file.
     MakeFolder,
     OpenBinary,
     OpenText,
@@ -65,12 +70,14 @@ class FaultyFileSystem : public FileSystem {
     // Handles that were opened and not yet closed or ended.
     int64_t OpenFiles() const { return openFiles; }
     int64_t OpenSearches() const { return openSearches; }
+    int64_t OpenWalks() const { return openWalks; }
 
     int ReadAttributes(const String& path, FileAttributes& attributes) override;
     int ReadIdentity(const String& path, FileIdentity& identity) override;
     int BeginSearch(const String& pattern, SearchHandle& search, String& firstName) override;
     int NextName(SearchHandle search, String& name) override;
     void EndSearch(SearchHandle search) override;
+    int BeginWalk(const String& folder, const String& pattern, std::unique_ptr<FolderWalk>& walk) override;
     int MakeFolder(const String& path) override;
     int OpenBinary(const String& path, uint32_t mode, FileHandle& file) override;
     int OpenText(const String& path, TextMode mode, FileHandle& file) override;
@@ -82,6 +89,8 @@ class FaultyFileSystem : public FileSystem {
     std::unique_ptr<FolderHold> HoldFolder(const String& folder) override;
 
   private:
+    friend class FaultyFolderWalk;
+
     struct Fault {
         FileCall kind;
         // Counted as Count counts.
@@ -97,6 +106,8 @@ class FaultyFileSystem : public FileSystem {
 
     // Counts the call and gives the number it is to fail with; 0 for none. A null `path` is one that the call has not.
     int Enter(FileCall kind, const String* path);
+    // The number with which calls of `kind` with this path are to fail.
+    int PathFaultFor(FileCall kind, const String& path) const;
 
     FileSystem& inner;
     std::array<uint64_t, static_cast<size_t>(FileCall::ReadExecutablePath) + 1> counts{};
@@ -108,6 +119,7 @@ class FaultyFileSystem : public FileSystem {
     String executablePath;
     int64_t openFiles = 0;
     int64_t openSearches = 0;
+    int64_t openWalks = 0;
 };
 
 // Puts a file system in the place of the current one, and the old one back at its end.

@@ -16,6 +16,7 @@
 #include <cstddef>
 #include <cstdint>
 #include <memory>
+#include <string_view>
 
 #include "qn/dsc/StringBase.h"
 
@@ -33,6 +34,51 @@ struct FileIdentity {
     uint64_t file = 0;
 
     bool operator==(const FileIdentity& other) const = default;
+};
+
+// What a listing tells of a name.
+struct WalkEntry {
+    std::u16string_view name;
+    // The name fits the pattern of the walk.
+    bool isMatch = false;
+    // False: it is no folder. True: it is one, or it takes an Enter to know.
+    bool mayBeFolder = false;
+};
+
+// How a walk came into a folder.
+enum class WayIn {
+    // It stands in the folder that it was entered from. Where all of the present path was entered so, no folder is on
+    // it twice.
+    Direct,
+    // By a link, or by something else that may lead anywhere.
+    Indirect,
+};
+
+// A walk through a folder and those below it, one folder at a time: the last of the present path, which begins with the
+// start of the walk, at level 0. Each folder is read once, and open files are few however deep it is. Folders of the
+// present path are left in the reverse order; the destructor leaves them all.
+class FolderWalk {
+  public:
+    virtual ~FolderWalk() = default;
+
+    // Reads the names of the present folder: those that match, "." and ".." included, and those that may be folders,
+    // "." and ".." not included. They are numbered in listing order, from 0, until the folder is left. A folder that
+    // can't be read to its end has the names up to there; one that fails has none. n log n in what is kept.
+    virtual int List() = 0;
+    virtual size_t EntryCount() const = 0;
+    // The name lives until the next Enter, List or Leave.
+    virtual WalkEntry EntryAt(size_t number) const = 0;
+
+    // Goes into a folder of the present one; the next List is of that. ENOTDIR if it is none after all. Nothing has
+    // changed if it fails or throws.
+    virtual int Enter(size_t number, WayIn& way) = 0;
+    // Back to the folder that the present one was entered from. Not for level 0.
+    virtual void Leave() = 0;
+
+    // The last-write time of an entry, as in FileAttributes; of what a link leads to.
+    virtual int ReadWriteTime(size_t number, uint64_t& time) = 0;
+    // Which folder stands at a level of the present path.
+    virtual int ReadIdentity(size_t level, FileIdentity& identity) = 0;
 };
 
 using FileHandle = intptr_t;
@@ -78,6 +124,9 @@ class FileSystem {
     // ENOENT when there is no further name.
     virtual int NextName(SearchHandle search, String& name) = 0;
     virtual void EndSearch(SearchHandle search) = 0;
+
+    // Begins a walk at `folder`, an absolute path. `pattern` is that of BeginSearch for a name alone.
+    virtual int BeginWalk(const String& folder, const String& pattern, std::unique_ptr<FolderWalk>& walk) = 0;
 
     // EEXIST if a folder or a file of that name stands.
     virtual int MakeFolder(const String& path) = 0;

@@ -11,6 +11,7 @@
 #include <utility>
 
 #include "qn/dsc/osdep/FolderSearch_linux.h"
+#include "qn/dsc/osdep/FolderWalk_linux.h"
 #include "qn/dsc/osdep/NativeFolder_linux.h"
 #include "qn/dsc/osdep/NativePath.h"
 
@@ -50,18 +51,6 @@ int ReadStatus(const String& path, struct stat& status) {
         }
         return native.endsInSeparator && !S_ISDIR(status.st_mode) ? ENOTDIR : 0;
     });
-}
-
-// 100 ns ticks since 1601. Times that file times can't express become the nearest that they can.
-uint64_t FileTimeOf(const timespec& time) {
-    constexpr int64_t secondsTo1970 = 11644473600;
-    constexpr int64_t ticksPerSecond = 10000000;
-    constexpr int64_t lastSecond = INT64_MAX / ticksPerSecond - 1;
-    const int64_t seconds = std::clamp<int64_t>(time.tv_sec, -secondsTo1970, lastSecond - secondsTo1970);
-    if (seconds != time.tv_sec) {
-        return seconds < 0 ? 0 : static_cast<uint64_t>(INT64_MAX);
-    }
-    return static_cast<uint64_t>((seconds + secondsTo1970) * ticksPerSecond + time.tv_nsec / 100);
 }
 
 int OpenNative(const std::string& path, int flags, mode_t permissions, int& descriptor) {
@@ -143,6 +132,7 @@ class NativeFileSystem final : public FileSystem {
     int BeginSearch(const String& pattern, SearchHandle& search, String& firstName) override;
     int NextName(SearchHandle search, String& name) override;
     void EndSearch(SearchHandle search) override;
+    int BeginWalk(const String& folder, const String& pattern, std::unique_ptr<FolderWalk>& walk) override;
     int MakeFolder(const String& path) override;
     int OpenBinary(const String& path, uint32_t mode, FileHandle& file) override;
     int OpenText(const String& path, TextMode mode, FileHandle& file) override;
@@ -158,7 +148,7 @@ int NativeFileSystem::ReadAttributes(const String& path, FileAttributes& attribu
     struct stat status;
     const int error = ReadStatus(path, status);
     if (error == 0) {
-        attributes = {S_ISDIR(status.st_mode), FileTimeOf(status.st_mtim)};
+        attributes = {S_ISDIR(status.st_mode), NativeFileTime(status.st_mtim)};
     }
     return error;
 }
@@ -196,6 +186,15 @@ int NativeFileSystem::NextName(SearchHandle search, String& name) {
 
 void NativeFileSystem::EndSearch(SearchHandle search) {
     const std::unique_ptr<FolderSearch> ended(SearchOf(search));
+}
+
+int NativeFileSystem::BeginWalk(const String& folder, const String& pattern, std::unique_ptr<FolderWalk>& walk) {
+    auto begun = std::make_unique<NativeFolderWalk>(pattern);
+    const int error = begun->Begin(folder);
+    if (error == 0) {
+        walk = std::move(begun);
+    }
+    return error;
 }
 
 int NativeFileSystem::MakeFolder(const String& path) {

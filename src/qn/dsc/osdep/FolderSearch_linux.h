@@ -5,9 +5,9 @@
 #include <cstddef>
 #include <string>
 #include <string_view>
-#include <vector>
 
 #include "qn/dsc/StringBase.h"
+#include "qn/dsc/osdep/NameList_linux.h"
 
 namespace qn::dsc::osdep {
 
@@ -21,27 +21,7 @@ class FolderSearch {
     bool Next(String& name);
 
   private:
-    struct Name {
-        // The first four units of the upper case, first unit highest: this decides most comparisons without the text.
-        uint64_t start;
-        // Where the name begins in `names`, and its upper case in `upperNames`.
-        size_t offset;
-        size_t length;
-    };
-
-    std::u16string_view TextOf(const Name& name) const {
-        return std::u16string_view(names).substr(name.offset, name.length);
-    }
-    std::u16string_view UpperOf(const Name& name) const {
-        return std::u16string_view(upperNames).substr(name.offset, name.length);
-    }
-    bool IsBefore(const Name& left, const Name& right) const;
-    void Add(std::string_view name, std::u16string_view upperPattern);
-
-    // All names one behind the other, and their upper case; both have the same offsets.
-    std::u16string names;
-    std::u16string upperNames;
-    std::vector<Name> order;
+    NameList names;
     size_t next = 0;
 };
 

@@ -6,6 +6,7 @@
 
 #include <algorithm>
 #include <cerrno>
+#include <cstdint>
 #include <cstdlib>
 #include <utility>
 #include <vector>
@@ -118,7 +119,10 @@ size_t EndOfStanding(const std::string& path, size_t known) {
 
 }  // namespace
 
-PathStart::PathStart(const std::string& path) : folder(AT_FDCWD), rest(path.c_str()) {
+PathStart::PathStart() : folder(AT_FDCWD) {}
+
+PathStart::PathStart(const std::string& path) : PathStart() {
+    rest = path.c_str();
     const char* const end = path.data() + path.size();
     while (error == 0 && static_cast<size_t>(end - rest) > longestCall) {
         const std::string_view reach(rest, longestCall);
@@ -173,6 +177,17 @@ int ReadNativeIdentity(const std::string& path, FileIdentity& identity) {
     }
     identity = {status.st_dev, status.st_ino};
     return 0;
+}
+
+uint64_t NativeFileTime(const timespec& time) {
+    constexpr int64_t secondsTo1970 = 11644473600;
+    constexpr int64_t ticksPerSecond = 10000000;
+    constexpr int64_t lastSecond = INT64_MAX / ticksPerSecond - 1;
+    const int64_t seconds = std::clamp<int64_t>(time.tv_sec, -secondsTo1970, lastSecond - secondsTo1970);
+    if (seconds != time.tv_sec) {
+        return seconds < 0 ? 0 : static_cast<uint64_t>(INT64_MAX);
+    }
+    return static_cast<uint64_t>((seconds + secondsTo1970) * ticksPerSecond + time.tv_nsec / 100);
 }
 
 int ReadNativeWorkingFolder(std::string& path) {

@@ -5,6 +5,8 @@
 
 #include <dirent.h>
 
+#include <cstdint>
+#include <ctime>
 #include <memory>
 #include <string>
 #include <string_view>
@@ -32,8 +34,11 @@ class PathStart {
     const char* Rest() const { return rest; }
 
   private:
+    // Delegated to, so that the destructor closes what was opened before the memory gave out.
+    PathStart();
+
     int folder;
-    const char* rest;
+    const char* rest = nullptr;
     int error = 0;
 };
 
@@ -46,6 +51,9 @@ using OpenFolder = std::unique_ptr<DIR, FolderCloser>;
 int OpenNativeFolder(const std::string& path, OpenFolder& folder);
 int ReadNativeIdentity(const std::string& path, FileIdentity& identity);
 int ReadNativeWorkingFolder(std::string& path);
+
+// 100 ns ticks since 1601. Times that file times can't express become the nearest that they can.
+uint64_t NativeFileTime(const timespec& time);
 
 // The next name but "." and ".."; null at the end.
 const char* NextNativeName(DIR* folder);

@@ -11,6 +11,7 @@
 // by the search for names of other letter case.) Nothing in this unit touches the disk but the working folder of a
 // relative path.
 
+#include <cstddef>
 #include <string>
 #include <string_view>
 
@@ -24,6 +25,9 @@ void AppendNameUnits(std::string_view name, std::u16string& units);
 // A native path, absolute or relative, in the system's form. Repeated slashes count as one; a slash at the end stays.
 // A relative path that would read as one with a drive gets ".\" before it.
 String SystemPathFromNative(std::string_view native);
+
+// As many units as an NTFS path can have. A copy of a folder into itself by ways that can't be seen ends here.
+inline constexpr size_t longestSystemPath = 32767;
 
 struct NativePath {
     // Absolute, with neither "." nor ".." nor an empty name; no slash at the end, but for the root.

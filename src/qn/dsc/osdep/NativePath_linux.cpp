@@ -14,9 +14,6 @@ namespace {
 
 constexpr char16_t nativeBackslash = 0xF05C;
 
-// As many units as an NTFS path can have. A copy of a folder into itself by ways that can't be seen ends here.
-constexpr size_t longestPath = 32767;
-
 bool IsSeparator(char16_t unit) {
     return unit == u'\\' || unit == u'/';
 }
@@ -134,7 +131,7 @@ int MakeNativePath(const String& path, NativePath& native) {
     if (rest.empty() || IsNetworkPath(rest) || StartsWithTwoLetterDrive(rest)) {
         return ENOENT;
     }
-    if (rest.size() > longestPath) {
+    if (rest.size() > longestSystemPath) {
         return ENAMETOOLONG;
     }
     if (StartsWithDrive(rest)) {
