@@ -125,8 +125,8 @@ class ResourceFileWalk {
         }
     }
 
-    // Whether the present folder is also one of those above. Asks the disk only behind something indirect; a folder that
-    // can't be identified is none of the others. The length of a path bounds the levels, and so this search.
+    // Whether the present folder is also one of those above. Asks the disk only behind something indirect; a folder
+    // that can't be identified is none of the others. The length of a path bounds the levels, and so this search.
     bool IsOnPathTwice() {
         Level& present = levels.back();
         present.mayRepeat = present.way == WayIn::Indirect || levels[levels.size() - 2].mayRepeat;

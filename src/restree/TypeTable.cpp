@@ -27,9 +27,10 @@ bool TypeTable::NameOrder::operator()(qn::dsc::TextArgument left, qn::dsc::TextA
 }
 
 void TypeTable::AddTypeRelation(std::u16string_view type, std::u16string_view base) {
-    auto found = records.find(type);
-    if (found == records.end()) {
-        found = records.emplace(String(type), std::make_unique<TypeRecord>(type)).first;
+    StopSharing();
+    auto found = records->find(type);
+    if (found == records->end()) {
+        found = records->emplace(String(type), std::make_unique<TypeRecord>(type)).first;
     }
     // An empty base is none, also where there is a type without a name.
     if (const TypeRecord* baseRecord = base.empty() ? nullptr : Find(base)) {
@@ -38,15 +39,23 @@ void TypeTable::AddTypeRelation(std::u16string_view type, std::u16string_view ba
 }
 
 const TypeRecord* TypeTable::Find(std::u16string_view type) const {
-    const auto found = records.find(type);
-    return found == records.end() ? nullptr : found->second.get();
+    if (records == nullptr) {
+        return nullptr;
+    }
+    const auto found = records->find(type);
+    return found == records->end() ? nullptr : found->second.get();
 }
 
 std::unique_ptr<TypeTable> TypeTable::Copy() const {
     auto copy = std::make_unique<TypeTable>();
-    for (const auto& [name, record] : records) {
-        copy->CopyRecord(*record);
+    if (records != nullptr && recordsOfCopies == nullptr) {
+        TypeTable first;
+        for (const auto& [name, record] : *records) {
+            first.CopyRecord(*record);
+        }
+        recordsOfCopies = std::move(first.records);
     }
+    copy->records = recordsOfCopies;
     return copy;
 }
 
@@ -60,6 +69,26 @@ void TypeTable::CopyRecord(const TypeRecord& record) {
         CopyRecord(*base);
         AddTypeRelation(record.name.View(), base->name.View());
     }
+}
+
+// Gives the table records that nobody else holds, alike in every base.
+void TypeTable::StopSharing() {
+    recordsOfCopies = nullptr;
+    if (records != nullptr && records.use_count() == 1) {
+        return;
+    }
+    auto own = std::make_shared<Records>();
+    if (records != nullptr) {
+        for (const auto& [name, record] : *records) {
+            own->emplace(name, std::make_unique<TypeRecord>(record->name.View()));
+        }
+        for (const auto& [name, record] : *records) {
+            for (const TypeRecord* base : record->bases) {
+                own->find(name)->second->bases.push_back(own->find(base->name)->second.get());
+            }
+        }
+    }
+    records = std::move(own);
 }
 
 }  // namespace zkhw

@@ -36,13 +36,14 @@ class TypeTable {
     TypeTable& operator=(const TypeTable&) = delete;
 
     // Makes sure that there is a record for `type` and adds `base` to its bases if `base` is a type of the table.
-    // An unknown or empty `base` is dropped.
+    // An unknown or empty `base` is dropped. Records that were found before may be gone.
     void AddTypeRelation(std::u16string_view type, std::u16string_view base);
 
-    // The record of `type`, or null.
+    // The record of `type`, or null. Lives until the next AddTypeRelation on this table, or its end.
     const TypeRecord* Find(std::u16string_view type) const;
 
-    // A table of its own with the same relations.
+    // A table of its own with the same relations. A tree has a copy for each of its targets, and hardly any is ever
+    // changed: the copies of a table share their records until then, so all but the first cost no more than a pointer.
     std::unique_ptr<TypeTable> Copy() const;
 
   private:
@@ -50,10 +51,15 @@ class TypeTable {
         using is_transparent = void;
         bool operator()(qn::dsc::TextArgument left, qn::dsc::TextArgument right) const;
     };
+    using Records = std::map<String, std::unique_ptr<TypeRecord>, NameOrder>;
 
     void CopyRecord(const TypeRecord& record);
+    void StopSharing();
 
-    std::map<String, std::unique_ptr<TypeRecord>, NameOrder> records;
+    // Null: no records. Not to be changed while others hold it.
+    std::shared_ptr<Records> records;
+    // What copies are made of; null before the first copy and after a change.
+    mutable std::shared_ptr<Records> recordsOfCopies;
 };
 
 }  // namespace zkhw

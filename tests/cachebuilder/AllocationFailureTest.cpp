@@ -4,10 +4,15 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
+#include <filesystem>
+#include <iterator>
 #include <new>
 #include <string>
+#include <vector>
 
 #include "cachebuilder/SmallInstallation.h"
+#include "cachebuilder/TargetDiscovery.h"
 #include "qn/dsc/exception/Exception.h"
 #include "support/AllocationFaultScope.h"
 
@@ -35,6 +40,11 @@ std::string OutcomeOf(SmallInstallation& installation) {
         // IsDirectory never throws: without memory it finds none, and the copy of the menus then fails in its own way.
         return "failed copy";
     }
+}
+
+std::ptrdiff_t OpenDescriptors() {
+    const std::filesystem::directory_iterator begin("/proc/self/fd");
+    return std::distance(begin, std::filesystem::directory_iterator());
 }
 
 uint64_t CountAllocations(SmallInstallation& installation) {
@@ -91,6 +101,66 @@ TEST(ToolOutOfMemory, GivesOutOfMemoryWhenTheRootCannotBeAllocated) {
         found += OutcomeOf(installation) == "out of memory" ? 1U : 0U;
     }
     EXPECT_EQ(found, 1U);
+}
+
+// Folders, a link to one of them, and one that is met after deep ones.
+void FillForAWalk(const qn::dsc::osdep::TemporaryFolder& folder) {
+    folder.WriteFile("0_resource.xml", "");
+    folder.WriteFile("a/a_resource.xml", "");
+    folder.WriteFile("a/in/d_resource.xml", "");
+    folder.WriteFile("b/b_resource.xml", "");
+    folder.MakeLink("../b", "a/to");
+    folder.MakeNestedFolders(std::string(120, 'c'), 40);
+    folder.WriteFile("d/d_resource.xml", "");
+}
+
+TEST(WalkOutOfMemory, NeverThrowsKeepsWhatWasFoundAndLeavesNothingOpen) {
+    const qn::dsc::osdep::TemporaryFolder folder;
+    FillForAWalk(folder);
+    const qn::dsc::String directory = folder.System();
+    const qn::dsc::String pattern(u"*resource.xml");
+    std::vector<qn::dsc::String> all;
+    FindResourceFiles(directory, pattern, all);
+    ASSERT_EQ(all.size(), 6U);
+    const std::ptrdiff_t openBefore = OpenDescriptors();
+    for (const bool fromThenOn : {false, true}) {
+        bool wasReached = true;
+        for (uint64_t nth = 1; wasReached; ++nth) {
+            std::vector<qn::dsc::String> found;
+            {
+                const AllocationFaultScope fault(nth, fromThenOn);
+                EXPECT_NO_THROW(FindResourceFiles(directory, pattern, found)) << "allocation " << nth;
+                wasReached = qn::dsc::osdep::AllocationCount() >= nth;
+            }
+            auto next = all.begin();
+            for (const qn::dsc::String& file : found) {
+                next = std::find(next, all.end(), file);
+                ASSERT_NE(next, all.end()) << "allocation " << nth;
+                ++next;
+            }
+            EXPECT_TRUE(wasReached || found.size() == all.size());
+            ASSERT_EQ(OpenDescriptors(), openBefore) << "allocation " << nth;
+        }
+    }
+}
+
+TEST(WalkOutOfMemory, TheTestForNewerFilesNeverThrows) {
+    const qn::dsc::osdep::TemporaryFolder folder;
+    FillForAWalk(folder);
+    folder.SetFileTime("b/b_resource.xml", 5000000000, 0);
+    const qn::dsc::String directory = folder.System();
+    const qn::dsc::String pattern(u"*resource.xml");
+    const qn::dsc::osdep::TimeStamp time{2082844800 + 4900000000, 0};
+    ASSERT_TRUE(IsAnyResourceFileNewer(directory, pattern, time));
+    bool wasReached = true;
+    uint64_t timesFound = 0;
+    for (uint64_t nth = 1; wasReached; ++nth) {
+        const AllocationFaultScope fault(nth);
+        EXPECT_NO_THROW(timesFound += IsAnyResourceFileNewer(directory, pattern, time) ? 1U : 0U);
+        wasReached = qn::dsc::osdep::AllocationCount() >= nth;
+    }
+    // The file is there by two paths, so hardly any failure hides it.
+    EXPECT_GT(timesFound, 1U);
 }
 
 }  // namespace

@@ -255,6 +255,37 @@ TEST_F(ResourceCacheReader, FileWhoseTimeCannotBeReadIsOld) {
     EXPECT_EQ(Read(), 0);
 }
 
+TEST_F(ResourceCacheReader, LinkIsAsOldAsTheFileItLeadsTo) {
+    BuildCache();
+    installation.Write("elsewhere.txt", "");
+    installation.Root().MakeLink("elsewhere.txt", Installation::Below("l_resource.xml"));
+    SetTime("elsewhere.txt", 1000000, 0);
+    EXPECT_EQ(Read(), 0);
+    SetTime("elsewhere.txt", 2000000, 0);
+    EXPECT_EQ(Read(), 1);
+}
+
+TEST_F(ResourceCacheReader, NewFolderWithTheNameOfAResourceFileMakesTheCacheStale) {
+    BuildCache();
+    installation.Root().MakeFolder(Installation::Below("f_resource.xml"));
+    SetTime("f_resource.xml", 1000000, 0);
+    EXPECT_EQ(Read(), 0);
+    SetTime("f_resource.xml", 2000000, 0);
+    EXPECT_EQ(Read(), 1);
+}
+
+TEST_F(ResourceCacheReader, FileWithoutAReadableTimeIsNewerThanACacheOfBefore1904) {
+    BuildCache();
+    for (const char* file : {"a_resource.xml", "b_resource.xml", "x/x_resource.xml"}) {
+        SetTime(file, -2082844900, 0);
+    }
+    host.Files().FailFromThenOn(FileCall::ReadWriteTime, 1, EIO);
+    SetTime("resource_cache.xml", -2082844800, 0);
+    EXPECT_EQ(Read(), 0);
+    SetTime("resource_cache.xml", -2082844801, 0);
+    EXPECT_EQ(Read(), 1);
+}
+
 TEST_F(ResourceCacheReader, CacheWhoseTimeCannotBeReadIsStale) {
     BuildCache();
     SetTimes(1000);

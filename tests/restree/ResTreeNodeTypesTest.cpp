@@ -100,6 +100,59 @@ TEST(TypeTable, CopyStandsAlone) {
     EXPECT_EQ(Bases(*copy, u"New"), "Target");
 }
 
+TEST(TypeTable, CopiesStandAloneFromEachOther) {
+    TypeTable table;
+    table.AddTypeRelation(u"Z", u"");
+    table.AddTypeRelation(u"M", u"Z");
+    table.AddTypeRelation(u"A", u"M");
+    const std::unique_ptr<TypeTable> first = table.Copy();
+    const std::unique_ptr<TypeTable> second = table.Copy();
+    first->AddTypeRelation(u"A", u"Z");
+    EXPECT_EQ(Bases(*first, u"A"), "M Z");
+    // The change keeps what the copy had.
+    EXPECT_EQ(Bases(*first, u"M"), "Z Z");
+    EXPECT_EQ(first->Find(u"A")->bases[0], first->Find(u"M"));
+    EXPECT_EQ(Bases(*second, u"A"), "M");
+    EXPECT_EQ(Bases(table, u"A"), "M");
+}
+
+TEST(TypeTable, CopyKnowsNothingOfLaterRelations) {
+    TypeTable table;
+    table.AddTypeRelation(u"Z", u"");
+    const std::unique_ptr<TypeTable> before = table.Copy();
+    table.AddTypeRelation(u"A", u"Z");
+    const std::unique_ptr<TypeTable> after = table.Copy();
+    EXPECT_EQ(before->Find(u"A"), nullptr);
+    EXPECT_EQ(Bases(*after, u"A"), "Z");
+}
+
+TEST(TypeTable, CopyOutlivesTheTable) {
+    auto table = std::make_unique<TypeTable>();
+    table->AddTypeRelation(u"Z", u"");
+    table->AddTypeRelation(u"A", u"Z");
+    const std::unique_ptr<TypeTable> copy = table->Copy();
+    table.reset();
+    EXPECT_EQ(Bases(*copy, u"A"), "Z");
+    EXPECT_TRUE(copy->Find(u"A")->IsA(u"Z"));
+}
+
+TEST(TypeTable, CopyOfACopyHasTheSameRelations) {
+    TypeTable table;
+    table.AddTypeRelation(u"Z", u"");
+    table.AddTypeRelation(u"A", u"Z");
+    const std::unique_ptr<TypeTable> copy = table.Copy()->Copy();
+    EXPECT_EQ(Bases(*copy, u"A"), "Z");
+}
+
+TEST(TypeTable, CopyOfAnEmptyTableIsEmptyAndCanGrow) {
+    const TypeTable table;
+    const std::unique_ptr<TypeTable> copy = table.Copy();
+    EXPECT_EQ(copy->Find(u"A"), nullptr);
+    copy->AddTypeRelation(u"A", u"");
+    EXPECT_EQ(Bases(*copy, u"A"), "");
+    EXPECT_EQ(table.Find(u"A"), nullptr);
+}
+
 TEST(TypeTable, CopyHasTypesWhoseBasesComeLaterInTheTable) {
     TypeTable table;
     table.AddTypeRelation(u"Z", u"");
