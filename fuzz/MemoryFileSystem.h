@@ -13,6 +13,7 @@
 #include <utility>
 #include <vector>
 
+#include "SearchingFolderWalk.h"
 #include "qn/dsc/StringBase.h"
 #include "qn/dsc/osdep/FileSystem.h"
 
@@ -99,6 +100,12 @@ class MemoryFileSystem : public qn::dsc::osdep::FileSystem {
     }
 
     void EndSearch(qn::dsc::osdep::SearchHandle) override {}
+
+    int BeginWalk(const String& folder, const String& pattern,
+                  std::unique_ptr<qn::dsc::osdep::FolderWalk>& walk) override {
+        walk = std::make_unique<SearchingFolderWalk>(*this, Trimmed(folder), pattern.View());
+        return 0;
+    }
 
     int MakeFolder(const String&) override { return EACCES; }
 

@@ -96,8 +96,8 @@ HRESULT ResTreeNodeAdapter::CloneDetached(LPCWSTR name, IzkhwResourceTreeNode** 
     const HRESULT made = CreateNodeAdapter(copy.get(), observers.get(), &view, true);
     if (SUCCEEDED(made)) {
         *clone = static_cast<IzkhwResourceTreeNode4*>(view);
-        copy.release();
-        observers.release();
+        static_cast<void>(copy.release());
+        static_cast<void>(observers.release());
     }
     return made;
 }

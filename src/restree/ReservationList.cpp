@@ -129,7 +129,7 @@ void ReservationList::Append(Reservation&& record) {
         index->Add(record);
     }
     records.push_back(std::move(record));
-    NoteChange({Edit::Append});
+    NoteChange({Edit::AddLast});
 }
 
 void ReservationList::SetMode(size_t at, uint32_t mode) noexcept {
@@ -207,7 +207,7 @@ String ReservationList::Text() const {
 void ReservationList::EditText(String& text) const {
     const auto offset = static_cast<uint32_t>(edit.offset);
     const auto count = static_cast<uint32_t>(edit.count);
-    if (edit.kind == Edit::Append) {
+    if (edit.kind == Edit::AddLast) {
         text.Append(Piece(records.back(), records.size() == 1));
     } else if (edit.kind == Edit::Remove) {
         text.Erase(offset, count, true);

@@ -66,9 +66,9 @@ class ReservationList {
     struct Edit {
         enum Kind : uint8_t {
             Anything,
-            Append,  // The last record comes.
-            Remove,  // `count` units at `offset` go.
-            Modes,   // The same, and the modes of the record `at` come in their place.
+            AddLast,  // The last record comes.
+            Remove,   // `count` units at `offset` go.
+            Modes,    // The same, and the modes of the record `at` come in their place.
         } kind;
         size_t offset = 0;
         size_t count = 0;
