@@ -334,7 +334,7 @@ TEST_F(FindResourceFilesIn, DeepFoldersTakeNoStack) {
 
 TEST_F(FindResourceFilesIn, WalkEndsWherePathsBecomeTooLong) {
     // A path has at most 32767 units: no folder further down has a path.
-    folder.MakeNestedFolders("d", 20000);
+    folder.MakeNestedFolders(std::string(200, 'd'), 200);
     folder.WriteFile("a_resource.xml", "");
     folder.WriteFile("e/e_resource.xml", "");
     Names found;
