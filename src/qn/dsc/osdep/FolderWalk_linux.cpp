@@ -2,9 +2,7 @@
 
 #include <dirent.h>
 #include <fcntl.h>
-#include <linux/openat2.h>
 #include <sys/stat.h>
-#include <sys/syscall.h>
 #include <unistd.h>
 
 #include <cerrno>
@@ -32,14 +30,29 @@ bool IsDotName(const char* name) {
     return name[0] == '.' && (name[1] == '\0' || (name[1] == '.' && name[2] == '\0'));
 }
 
+// Whether an open folder is the root of a mount. True where the system can't tell.
+bool IsMountRoot(int folder) {
+    struct statx status;
+    if (statx(folder, "", AT_EMPTY_PATH, 0, &status) != 0 ||
+        (status.stx_attributes_mask & STATX_ATTR_MOUNT_ROOT) == 0) {
+        return true;
+    }
+    return (status.stx_attributes & STATX_ATTR_MOUNT_ROOT) != 0;
+}
+
 // Opens a folder that stands in `folder` itself, neither behind a link nor on another mount, so that it can't be one
-// that leads to `folder`. Systems that can't tell refuse.
+// that leads to `folder`. Refuses any other. One call (openat2) could do both, but not every system has it, and tools
+// that watch a host from below don't know it.
 int OpenDirect(int folder, const char* name, int& descriptor) {
-    open_how how{};
-    how.flags = static_cast<uint64_t>(folderFlags | O_NOFOLLOW);
-    how.resolve = RESOLVE_NO_XDEV;
-    descriptor = static_cast<int>(syscall(SYS_openat2, folder, name, &how, sizeof how));
-    return descriptor < 0 ? errno : 0;
+    descriptor = openat(folder, name, folderFlags | O_NOFOLLOW);
+    if (descriptor < 0) {
+        return errno;
+    }
+    if (IsMountRoot(descriptor)) {
+        close(std::exchange(descriptor, -1));
+        return EXDEV;
+    }
+    return 0;
 }
 
 int OpenByPath(const std::string& path, int& descriptor) {
