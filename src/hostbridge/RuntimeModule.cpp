@@ -1,7 +1,10 @@
 #include "hostbridge/RuntimeModule.h"
 
+#include <atomic>
+
 namespace zkhw {
 
+using qn::dsc::osdep::CountLoadedModules;
 using qn::dsc::osdep::FindExport;
 using qn::dsc::osdep::FindLoadedModule;
 using qn::dsc::osdep::GetMainModule;
@@ -9,6 +12,27 @@ using qn::dsc::osdep::ReadThreadSlot;
 
 ModuleHandle runtimeModule = nullptr;
 uint32_t runtimeTlsIndex = noThreadSlot;
+
+namespace {
+
+// How many modules had been loaded when there was no run-time among them; UINT64_MAX: nobody has looked yet. A look in
+// vain costs some fifty failing system calls.
+std::atomic<uint64_t> modulesWithoutRuntime = UINT64_MAX;
+
+// One that nobody has named.
+ModuleHandle FindUnnamedModule() {
+    const ModuleHandle main = GetMainModule();
+    if (main != nullptr &&
+        (FindExport(main, "gZKRTVersion") != nullptr || FindExport(main, "HostNewHandle") != nullptr)) {
+        return main;
+    }
+    if (const ModuleHandle runtime = FindLoadedModule("zkrt.dll")) {
+        return runtime;
+    }
+    return FindLoadedModule("zkffrt.dll");
+}
+
+}  // namespace
 
 ModuleHandle FindRuntimeModule() {
     if (runtimeTlsIndex != noThreadSlot) {
@@ -19,15 +43,16 @@ ModuleHandle FindRuntimeModule() {
     if (runtimeModule != nullptr) {
         return runtimeModule;
     }
-    const ModuleHandle main = GetMainModule();
-    if (main != nullptr &&
-        (FindExport(main, "gZKRTVersion") != nullptr || FindExport(main, "HostNewHandle") != nullptr)) {
-        return main;
+    // Before the look: what is loaded meanwhile is looked at the next time.
+    const uint64_t loadedModules = CountLoadedModules();
+    if (loadedModules == modulesWithoutRuntime.load(std::memory_order_relaxed)) {
+        return nullptr;
     }
-    if (const ModuleHandle runtime = FindLoadedModule("zkrt.dll")) {
-        return runtime;
+    const ModuleHandle found = FindUnnamedModule();
+    if (found == nullptr) {
+        modulesWithoutRuntime.store(loadedModules, std::memory_order_relaxed);
     }
-    return FindLoadedModule("zkffrt.dll");
+    return found;
 }
 
 }  // namespace zkhw

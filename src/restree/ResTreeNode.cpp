@@ -97,6 +97,9 @@ NodeEntry* ResTreeNode::Find(std::u16string_view key) {
     if (NodeEntry* entry = FindRaw(key)) {
         return entry;
     }
+    if (!HasDeferredContents()) {
+        return nullptr;
+    }
     // The load may remove this very node.
     const ReleaseScope scope;
     EnsureDeferredLoaded();

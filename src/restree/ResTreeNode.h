@@ -388,6 +388,7 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     int32_t LoadIncludedFile(const NarrowString& path, bool asChild, ResTreeNode** node, const LoadChain& includer);
     int32_t LoadFile(const NarrowString& path, bool asChild, ResTreeNode** node, const LoadChain& chain);
     void TakeOrder(bool ordered);
+    bool HasDeferredContents() const;
     bool TakeDeferredPaths(std::vector<String>& paths);
 
     String name;

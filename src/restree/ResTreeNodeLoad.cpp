@@ -216,6 +216,10 @@ void ResTreeNode::TakeOrder(bool ordered) {
 }
 
 // Takes the entry of the deferred paths away and gives what it named; false if there is none.
+bool ResTreeNode::HasDeferredContents() const {
+    return !entries.IsEmpty() && FindRaw(deferredPathKey) != nullptr;
+}
+
 bool ResTreeNode::TakeDeferredPaths(std::vector<String>& paths) {
     NodeEntry* entry = FindRaw(deferredPathKey);
     if (entry == nullptr || !entry->IsText()) {

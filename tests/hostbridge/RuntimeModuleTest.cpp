@@ -86,6 +86,23 @@ TEST(RuntimeModule, ZkrtComesBeforeZkffrt) {
     });
 }
 
+TEST(RuntimeModule, OneThatComesAfterLooksInVainIsFound) {
+    EXPECT_IN_CHILD([] {
+        const bool wasFound = FindRuntimeModule() != nullptr || FindRuntimeModule() != nullptr;
+        void* module = LoadModule(STAND_IN_RUNTIME);
+        return !wasFound && FindRuntimeModule() == module;
+    });
+}
+
+TEST(RuntimeModule, OneThatHasGoneAndComeAgainIsFound) {
+    EXPECT_IN_CHILD([] {
+        dlclose(LoadModule(STAND_IN_RUNTIME));
+        const bool wasFound = FindRuntimeModule() != nullptr;
+        void* module = LoadModule(STAND_IN_RUNTIME);
+        return !wasFound && FindRuntimeModule() == module;
+    });
+}
+
 TEST(RuntimeModule, LookingKeepsNoModuleLoaded) {
     EXPECT_IN_CHILD([] {
         void* module = LoadModule(STAND_IN_RUNTIME);

@@ -17,6 +17,10 @@ ModuleHandle GetMainModule();
 // is libx.so on Linux, and "x" with any other ending is x.so.
 ModuleHandle FindLoadedModule(const char* name);
 
+// How many modules have been loaded into the process so far, those that have gone included. While the number stays, no
+// module has come: one that was looked for in vain isn't there still.
+uint64_t CountLoadedModules();
+
 // The address of an export of `module`; null if it has none of that name.
 CodePointer FindExport(ModuleHandle module, const char* name);
 

@@ -63,6 +63,17 @@ ModuleHandle FindLoadedModule(const char* name) {
     return search.path == nullptr ? nullptr : OpenUncounted(search.path, RTLD_LAZY | RTLD_NOLOAD);
 }
 
+uint64_t CountLoadedModules() {
+    uint64_t count = 0;
+    dl_iterate_phdr(
+        [](dl_phdr_info* module, size_t, void* context) {
+            *static_cast<uint64_t*>(context) = module->dlpi_adds;
+            return 1;
+        },
+        &count);
+    return count;
+}
+
 CodePointer FindExport(ModuleHandle module, const char* name) {
     void* const address = dlsym(module, name);
     CodePointer code = nullptr;
