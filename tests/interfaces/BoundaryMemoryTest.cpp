@@ -102,6 +102,26 @@ TEST(BoundaryTaskMemory, BlocksAreAlignedAndOfTheirOwn) {
     CoTaskMemFree(second);
 }
 
+TEST(BoundaryTaskMemory, BlocksOfEverySizeAreAlignedTo16Bytes) {
+    std::vector<void*> blocks;
+    for (size_t size = 1; size <= 200; ++size) {
+        blocks.push_back(CoTaskMemAlloc(size));
+        EXPECT_EQ(reinterpret_cast<uintptr_t>(blocks.back()) % 16, 0U) << size;
+    }
+    for (size_t index = 0; index < blocks.size(); ++index) {
+        blocks[index] = CoTaskMemRealloc(blocks[index], index + 24);
+        EXPECT_EQ(reinterpret_cast<uintptr_t>(blocks[index]) % 16, 0U) << index;
+        CoTaskMemFree(blocks[index]);
+    }
+}
+
+TEST(BoundaryTaskMemory, ASizeThatCannotBeRoundedUpGivesNull) {
+    EXPECT_EQ(CoTaskMemAlloc(SIZE_MAX), nullptr);
+    void* const block = CoTaskMemAlloc(10);
+    EXPECT_EQ(CoTaskMemRealloc(block, SIZE_MAX), nullptr);
+    CoTaskMemFree(block);
+}
+
 TEST(BoundaryTaskMemory, ReallocKeepsWhatFits) {
     auto* block = static_cast<char*>(CoTaskMemRealloc(nullptr, 4));
     std::memcpy(block, "abcd", 4);

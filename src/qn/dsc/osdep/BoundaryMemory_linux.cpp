@@ -24,6 +24,11 @@ struct StringHead {
     uint32_t byteLength;  // Without the NUL unit.
 };
 
+// Task memory aligns to 16 bytes only what is a multiple of them. 0 for a size that can't be rounded up.
+constexpr size_t RoundUp(size_t size) {
+    return (size + 15) & ~size_t{15};
+}
+
 StringHead* HeadOf(BSTR string) {
     StringHead* head = reinterpret_cast<StringHead*>(string) - 1;
     if (head->mark != StringHead::stringMark) {
@@ -35,11 +40,13 @@ StringHead* HeadOf(BSTR string) {
 }  // namespace
 
 void* CoTaskMemAlloc(size_t size) {
-    return TaskMemAlloc(size);
+    const size_t rounded = RoundUp(size);
+    return rounded < size ? nullptr : TaskMemAlloc(rounded);
 }
 
 void* CoTaskMemRealloc(void* block, size_t size) {
-    return TaskMemRealloc(block, size);
+    const size_t rounded = RoundUp(size);
+    return rounded < size ? nullptr : TaskMemRealloc(block, rounded);
 }
 
 void CoTaskMemFree(void* block) {

@@ -73,6 +73,7 @@ struct PoolAllocator::Store {
             // The first span of a region has no place for a block of the greatest class.
             if (blockCount != 0) {
                 region->spanClasses[offset / spanSize] = static_cast<uint8_t>(sizeClass);
+                cache.blockSize = static_cast<uint32_t>(blockSize);
                 cache.fresh = span + head;
                 cache.freshEnd = cache.fresh + blockCount * blockSize;
                 return true;
@@ -94,9 +95,9 @@ struct PoolAllocator::Store {
     }
 
     void* Allocate(ClassCache& cache, uint32_t sizeClass) {
-        void* block = TakeBlock(cache, SizeOfClass(sizeClass));
+        void* block = TakeBlock(cache);
         if (block == nullptr && Refill(cache, sizeClass)) {
-            block = TakeBlock(cache, SizeOfClass(sizeClass));
+            block = TakeBlock(cache);
         }
         return block;
     }
@@ -179,7 +180,7 @@ void* PoolAllocator::AllocateSlowly(size_t size) {
     Store& store = Store::store;
     ThreadCache* cache = store.CacheOfThread();
     if (cache != nullptr) {
-        if (void* block = TakeBlock(cache->classes[sizeClass], SizeOfClass(sizeClass)); block != nullptr) {
+        if (void* block = TakeBlock(cache->classes[sizeClass]); block != nullptr) {
             return block;
         }
     }

@@ -58,6 +58,8 @@ class PoolAllocator {
         char* freshEnd = nullptr;
         // How many more blocks may be freed before the list goes to the common store.
         int32_t room = 0;
+        // Of the class; set with the first span.
+        uint32_t blockSize = 0;
     };
 
     struct ThreadCache {
@@ -84,7 +86,7 @@ class PoolAllocator {
     }
 
     // A block that `cache` has; null if it has none.
-    static void* TakeBlock(ClassCache& cache, size_t blockSize) {
+    static void* TakeBlock(ClassCache& cache) {
         if (FreeBlock* block = cache.freeBlocks; block != nullptr) {
             cache.freeBlocks = block->next;
             ++cache.room;
@@ -92,7 +94,7 @@ class PoolAllocator {
         }
         if (cache.fresh != cache.freshEnd) {
             void* block = cache.fresh;
-            cache.fresh += blockSize;
+            cache.fresh += cache.blockSize;
             return block;
         }
         return nullptr;
@@ -126,7 +128,7 @@ inline void* PoolAllocator::AllocateUncounted(size_t size) {
         return AllocateSlowly(size);
     }
     const uint32_t sizeClass = SizeClassOf(size);
-    void* block = TakeBlock(cache->classes[sizeClass], SizeOfClass(sizeClass));
+    void* block = TakeBlock(cache->classes[sizeClass]);
     return block != nullptr ? block : AllocateSlowly(size);
 }
 

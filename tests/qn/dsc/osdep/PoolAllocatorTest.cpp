@@ -33,7 +33,7 @@ TEST(PoolAllocator, ReallocationWithinTheClassKeepsThePlace) {
     struct {
         size_t from;
         size_t to;
-    } const rows[] = {{1, 16}, {16, 1}, {17, 32}, {500, 512}, {513, 640}, {700, 768}, {28673, 32768}};
+    } const rows[] = {{1, 16}, {16, 1}, {17, 24}, {25, 32}, {500, 512}, {513, 640}, {700, 768}, {28673, 32768}};
     for (const auto& row : rows) {
         void* block = PoolAllocator::Allocate(row.from);
         EXPECT_EQ(PoolAllocator::Reallocate(block, row.to), block) << row.from << " to " << row.to;
@@ -65,7 +65,7 @@ TEST(PoolAllocator, WhatWasFreedLastIsTakenFirst) {
 
 TEST(PoolAllocator, CountsReallocationsFromTheFirstByteOfTheNextClassOn) {
     const support::AllocationCounter counter;
-    void* block = PoolAllocator::Allocate(33);
+    void* block = PoolAllocator::Allocate(41);
     block = PoolAllocator::Reallocate(block, 48);
     EXPECT_EQ(counter.Count(), 1U);
     block = PoolAllocator::Reallocate(block, 49);
