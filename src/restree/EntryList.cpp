@@ -11,8 +11,8 @@
 namespace zkhw {
 
 using qn::dsc::osdep::Compare;
+using qn::dsc::osdep::TaskMemAlloc;
 using qn::dsc::osdep::TaskMemFree;
-using qn::dsc::osdep::TaskMemRealloc;
 
 struct EntryList::LongForm {
     EntryPieces pieces{true};
@@ -41,7 +41,7 @@ void EntryList::ReleaseContainer() noexcept {
 void EntryList::Reset(bool newOrdered) noexcept {
     if (isLong) {
         for (EntryPosition position = Begin(); !position.IsEnd(); position = Next(position)) {
-            At(position)->piece = nullptr;
+            At(position)->pieceNumber = 0;
         }
     }
     ReleaseContainer();
@@ -94,7 +94,7 @@ EntryPosition EntryList::FollowingMoved(EntryPosition position, const NodeEntry*
         return Next(position);
     }
     if (isLong) {
-        if (entry->piece != nullptr) {
+        if (EntryPieces::IsMarked(entry)) {
             return Next(Locate(entry));
         }
     } else if (const EntryPosition place = Locate(entry); place.slot < count) {
@@ -158,16 +158,29 @@ EntryList::Place EntryList::SearchSorted(std::u16string_view key) const {
     return {low < count ? EntryPosition{0, low} : EntryPosition{}, nullptr};
 }
 
+void EntryList::Reserve(uint32_t size) {
+    if (!isLong && size > capacity && size <= shortLimit) {
+        GrowArray(size);
+    }
+}
+
+void EntryList::GrowArray(uint32_t size) {
+    auto* grown = static_cast<NodeEntry**>(TaskMemAlloc(size * sizeof(NodeEntry*)));
+    if (grown == nullptr) {
+        throw std::bad_alloc();
+    }
+    if (items != nullptr) {
+        std::copy(items, items + count, grown);
+        TaskMemFree(static_cast<void*>(items));
+    }
+    items = grown;
+    capacity = static_cast<uint16_t>(size);
+}
+
 void EntryList::InsertInArray(uint32_t slot, NodeEntry* entry) {
     if (count == capacity) {
-        // Two entries fill the smallest block of the node memory.
-        const uint32_t grown = capacity == 0 ? 2 : capacity < 8 ? capacity * 2U : capacity + 8U;
-        void* memory = TaskMemRealloc(static_cast<void*>(items), grown * sizeof(NodeEntry*));
-        if (memory == nullptr) {
-            throw std::bad_alloc();
-        }
-        items = static_cast<NodeEntry**>(memory);
-        capacity = static_cast<uint16_t>(grown);
+        // Two entries fill the smallest block of the node memory; most nodes have fewer than eight.
+        GrowArray(capacity + (capacity < 8 ? 2U : capacity < 16 ? 4U : 8U));
     }
     std::copy_backward(items + slot, items + count, items + count + 1);
     items[slot] = entry;
@@ -185,7 +198,7 @@ void EntryList::MakeLong() {
     isLong = true;
 }
 
-EntryPosition EntryList::Insert(EntryPosition position, NodeEntry* entry) {
+EntryPosition EntryList::InsertAnywhere(EntryPosition position, NodeEntry* entry) {
     if (!isLong) {
         const uint32_t slot = position.IsEnd() ? count : position.slot;
         if (count < shortLimit) {
@@ -211,7 +224,7 @@ EntryPosition EntryList::Detach(EntryPosition position) noexcept {
         return position.slot < count ? position : EntryPosition{};
     }
     if (longForm->index) {
-        longForm->index->Remove(longForm->pieces.At(position));
+        RemoveFromIndex(longForm->pieces.At(position));
     }
     --count;
     const EntryPosition next = longForm->pieces.Erase(position);
@@ -224,10 +237,10 @@ EntryPosition EntryList::Detach(EntryPosition position) noexcept {
 void EntryList::AssignKey(NodeEntry* entry, String&& key) noexcept {
     const bool isIndexed = isLong && longForm->index;
     if (isIndexed) {
-        longForm->index->Remove(entry);
+        RemoveFromIndex(entry);
     }
     entry->key.Swap(key);
-    if (isIndexed) {
+    if (isIndexed && longForm->index) {
         AddToIndex(entry, false);
     }
 }
@@ -237,6 +250,14 @@ void EntryList::AddToIndex(NodeEntry* entry, bool atEnd) noexcept {
         longForm->index->Add(entry, atEnd);
     } catch (...) {
         longForm->index.reset();  // It is built anew when next asked for.
+    }
+}
+
+void EntryList::RemoveFromIndex(const NodeEntry* entry) noexcept {
+    try {
+        longForm->index->Remove(entry);
+    } catch (...) {
+        longForm->index.reset();
     }
 }
 

@@ -3,8 +3,8 @@
 // The one collection of a node's entries, in either form: in order of insertion, equal keys allowed, or sorted by
 // key with each key once. Keys are compared with Compare, so blind to letter case.
 //
-// A short list is one array. A long one stands in pieces; if it is ordered, a sorted index of its keys is built at
-// the first search and kept from then on, so that no search is linear in a long list.
+// A short list is one array. A long one stands in pieces; if it is ordered, an index of its keys is built at the first
+// search and kept from then on, so that no search is linear in a long list.
 //
 // The list owns its entries. Positions are invalidated by any insertion or removal; entries stay where they are.
 
@@ -68,9 +68,19 @@ class EntryList {
     };
     Place FindPlace(std::u16string_view key) const;
 
+    // Makes room for `size` entries in all, if that is a short list. Throws bad_alloc.
+    void Reserve(uint32_t size);
+
     // Stores `entry` in front of `position`. A sorted list takes the position as it stands: it must be what FindPlace
     // gave. Throws bad_alloc; then nothing has changed and `entry` is still the caller's.
-    EntryPosition Insert(EntryPosition position, NodeEntry* entry);
+    EntryPosition Insert(EntryPosition position, NodeEntry* entry) {
+        // Nearly always: at the end of a short list with room. Long lists have no capacity.
+        if (position.IsEnd() && count < capacity) {
+            items[count] = entry;
+            return {0, count++};
+        }
+        return InsertAnywhere(position, entry);
+    }
 
     // Takes an entry out without releasing it; gives the position of the one that followed it.
     EntryPosition Detach(EntryPosition position) noexcept;
@@ -93,8 +103,11 @@ class EntryList {
     bool IsValid(EntryPosition position) const;
     NodeEntry* FindInIndex(std::u16string_view key) const;
     Place SearchSorted(std::u16string_view key) const;
+    EntryPosition InsertAnywhere(EntryPosition position, NodeEntry* entry);
+    void GrowArray(uint32_t size);
     void InsertInArray(uint32_t slot, NodeEntry* entry);
     void AddToIndex(NodeEntry* entry, bool atEnd) noexcept;
+    void RemoveFromIndex(const NodeEntry* entry) noexcept;
     void MakeLong();
     void ReleaseContainer() noexcept;
 

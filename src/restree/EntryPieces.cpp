@@ -55,21 +55,37 @@ EntryPosition EntryPieces::AtIndex(uint32_t index) const {
 }
 
 EntryPosition EntryPieces::Locate(const NodeEntry* entry) const {
-    const EntryPiece& piece = *entry->piece;
+    const EntryPiece& piece = *numbered[entry->pieceNumber - 1];
     const auto* found = std::find(piece.items, piece.items + piece.count, entry);
     return {piece.ordinal, static_cast<uint32_t>(found - piece.items)};
 }
 
 EntryPiece* EntryPieces::AddPiece(uint32_t ordinal) {
     pieces.reserve(pieces.size() + 1 > pieces.capacity() ? pieces.capacity() * 2 + 8 : 0);
+    const uint32_t number = marksEntries ? TakeNumber() : 0;
     void* memory = qn::dsc::osdep::TaskMemAlloc(sizeof(EntryPiece));
     if (memory == nullptr) {
         throw std::bad_alloc();
     }
     EntryPiece* piece = new (memory) EntryPiece;
+    piece->number = number;
+    if (number != 0) {
+        numbered[number - 1] = piece;
+    }
     pieces.insert(pieces.begin() + ordinal, piece);
     Renumber(ordinal);
     return piece;
+}
+
+// A number that no piece has; it stays free until a piece is put into its place.
+uint32_t EntryPieces::TakeNumber() {
+    auto place = numbered.end();
+    if (numbered.size() > pieces.size()) {
+        place = std::find(numbered.begin(), numbered.end(), nullptr);
+    } else {
+        place = numbered.insert(numbered.end(), nullptr);
+    }
+    return static_cast<uint32_t>(place - numbered.begin()) + 1;
 }
 
 void EntryPieces::Renumber(uint32_t from) noexcept {
@@ -81,7 +97,7 @@ void EntryPieces::Renumber(uint32_t from) noexcept {
 void EntryPieces::Mark(EntryPiece& piece, uint32_t from) noexcept {
     if (marksEntries) {
         for (uint32_t i = from; i < piece.count; ++i) {
-            piece.items[i]->piece = &piece;
+            piece.items[i]->pieceNumber = piece.number;
         }
     }
 }
@@ -112,7 +128,7 @@ EntryPosition EntryPieces::Insert(EntryPosition position, NodeEntry* entry) {
     piece->items[position.slot] = entry;
     ++piece->count;
     if (marksEntries) {
-        entry->piece = piece;
+        entry->pieceNumber = piece->number;
     }
     return position;
 }
@@ -120,11 +136,14 @@ EntryPosition EntryPieces::Insert(EntryPosition position, NodeEntry* entry) {
 EntryPosition EntryPieces::Erase(EntryPosition position) noexcept {
     EntryPiece* piece = pieces[position.piece];
     if (marksEntries) {
-        piece->items[position.slot]->piece = nullptr;
+        piece->items[position.slot]->pieceNumber = 0;
     }
     std::copy(piece->items + position.slot + 1, piece->items + piece->count, piece->items + position.slot);
     --piece->count;
     if (piece->count == 0) {
+        if (marksEntries) {
+            numbered[piece->number - 1] = nullptr;
+        }
         qn::dsc::osdep::TaskMemFree(piece);
         pieces.erase(pieces.begin() + position.piece);
         Renumber(position.piece);

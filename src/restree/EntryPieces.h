@@ -26,6 +26,7 @@ struct EntryPiece {
     static constexpr uint32_t capacity = 126;
 
     uint32_t ordinal = 0;  // Index of this piece in its sequence.
+    uint32_t number = 0;   // By which its entries know it, from 1; it stays while pieces come and go before this one.
     uint32_t count = 0;    // 1 to capacity: an empty piece is dropped.
     NodeEntry* items[capacity];
 };
@@ -51,6 +52,9 @@ class EntryPieces {
     uint32_t IndexOf(EntryPosition position) const;
     EntryPosition AtIndex(uint32_t index) const;
 
+    // Whether `entry` is in a marking sequence.
+    static bool IsMarked(const NodeEntry* entry) { return entry->pieceNumber != 0; }
+
     // Where `entry`, which must be in this marking sequence, stands.
     EntryPosition Locate(const NodeEntry* entry) const;
 
@@ -66,10 +70,12 @@ class EntryPieces {
 
   private:
     EntryPiece* AddPiece(uint32_t ordinal);
+    uint32_t TakeNumber();
     void Renumber(uint32_t from) noexcept;
     void Mark(EntryPiece& piece, uint32_t from) noexcept;
 
     std::vector<EntryPiece*> pieces;
+    std::vector<EntryPiece*> numbered;  // By number - 1, null for a number that is free; only if entries are marked.
     bool marksEntries;
 };
 

@@ -14,9 +14,8 @@ namespace zkhw {
 using qn::dsc::String;
 
 class ResTreeNode;
-struct EntryPiece;
 
-enum EntryKind : uint32_t {
+enum EntryKind : uint8_t {
     EmptyEntry = 0,          // The payload has been released.
     TextEntry = 1,           // A plain property value.
     ChildEntry = 2,          // An owned child node.
@@ -85,7 +84,7 @@ class NodeEntry {
     inline ResTreeNode* ChildPayload() const;
 
     String key;
-    EntryPiece* piece = nullptr;  // The piece of a long list that holds the entry; null in a short list.
+    uint32_t pieceNumber = 0;  // Of the piece of a long list that holds the entry (EntryPieces.h); 0 in a short list.
     EntryKind kind;
     bool textShape;  // Which shape was allocated; the kind may have become EmptyEntry since.
     bool textMarked = false;

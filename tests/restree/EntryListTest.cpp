@@ -253,7 +253,7 @@ TEST(EntryList, FailedInsertChangesNothing) {
 
 // --- Against a plain model ---
 
-// How the keys below compare: by their letters, blind to case and width.
+// How the keys below compare: by their letters, blind to case and width, and without control characters.
 char16_t Folded(char16_t unit) {
     if (unit >= 0xFF21 && unit <= 0xFF3A) {
         unit = static_cast<char16_t>(unit - 0xFF21 + u'A');
@@ -264,7 +264,9 @@ char16_t Folded(char16_t unit) {
 std::u16string Folded(const std::u16string& key) {
     std::u16string folded;
     for (const char16_t unit : key) {
-        folded.push_back(Folded(unit));
+        if (unit != 1) {
+            folded.push_back(Folded(unit));
+        }
     }
     return folded;
 }
@@ -278,14 +280,17 @@ class Random {
     std::mt19937 engine;
 };
 
-// One of `variety` keys in one of its spellings.
-std::u16string RandomKey(Random& random, uint32_t variety) {
+// One of `variety` keys in one of its spellings; those outside ASCII come only if `wide`.
+std::u16string RandomKey(Random& random, uint32_t variety, bool wide) {
     uint32_t number = random.Below(variety);
     std::u16string key;
     while (number != 0) {
         const char16_t letter = static_cast<char16_t>(number % 5);
         constexpr char16_t bases[] = {u'a', u'A', 0xFF21};
-        key.push_back(static_cast<char16_t>(bases[random.Below(64) == 0 ? 2 : random.Below(2)] + letter));
+        key.push_back(static_cast<char16_t>(bases[wide && random.Below(64) == 0 ? 2 : random.Below(2)] + letter));
+        if (random.Below(32) == 0) {
+            key.push_back(1);
+        }
         number /= 5;
     }
     return key;
@@ -298,7 +303,7 @@ class OrderedModel {
         uint32_t number;
     };
 
-    explicit OrderedModel(uint32_t seed) : random(seed), variety(1 + random.Below(60)) {}
+    explicit OrderedModel(uint32_t seed) : random(seed), variety(1 + random.Below(60)), hasWideKeys(seed % 2 != 0) {}
 
     void Run(uint32_t operations) {
         for (uint32_t i = 0; i < operations; ++i) {
@@ -341,7 +346,7 @@ class OrderedModel {
     }
 
     void Insert() {
-        const std::u16string key = RandomKey(random, variety);
+        const std::u16string key = RandomKey(random, variety, hasWideKeys);
         const size_t index = AnyPlace(items.size());
         list.Insert(list.AtIndex(static_cast<uint32_t>(index)), MakeNumbered(key, made));
         items.insert(items.begin() + static_cast<std::ptrdiff_t>(index), {Folded(key), made});
@@ -361,7 +366,7 @@ class OrderedModel {
     }
 
     void Find() {
-        const std::u16string key = RandomKey(random, variety);
+        const std::u16string key = RandomKey(random, variety, hasWideKeys);
         const std::u16string folded = Folded(key);
         const auto expected =
             std::find_if(items.begin(), items.end(), [&](const Item& item) { return item.key == folded; });
@@ -373,7 +378,7 @@ class OrderedModel {
     }
 
     void Assign() {
-        const std::u16string key = RandomKey(random, variety);
+        const std::u16string key = RandomKey(random, variety, hasWideKeys);
         const size_t index = random.Below(static_cast<uint32_t>(items.size()));
         list.AssignKey(list.At(list.AtIndex(static_cast<uint32_t>(index))), String(std::u16string_view(key)));
         items[index].key = Folded(key);
@@ -381,6 +386,7 @@ class OrderedModel {
 
     Random random;
     uint32_t variety;
+    bool hasWideKeys;
     uint32_t made = 0;
     EntryList list{true};
     std::vector<Item> items;
@@ -399,7 +405,7 @@ TEST(EntryList, OrderedListDoesWhatAVectorDoes) {
 
 class SortedModel {
   public:
-    explicit SortedModel(uint32_t seed) : random(seed), variety(1 + random.Below(4000)) {}
+    explicit SortedModel(uint32_t seed) : random(seed), variety(1 + random.Below(4000)), hasWideKeys(seed % 2 != 0) {}
 
     void Run(uint32_t operations) {
         for (uint32_t i = 0; i < operations; ++i) {
@@ -414,7 +420,7 @@ class SortedModel {
 
   private:
     void Step() {
-        const std::u16string key = RandomKey(random, variety);
+        const std::u16string key = RandomKey(random, variety, hasWideKeys);
         const auto item = items.find(Folded(key));
         const bool isThere = item != items.end();
         const EntryList::Place place = list.FindPlace(key);
@@ -437,6 +443,7 @@ class SortedModel {
 
     Random random;
     uint32_t variety;
+    bool hasWideKeys;
     uint32_t made = 0;
     EntryList list{false};
     std::map<std::u16string, uint32_t> items;
@@ -499,6 +506,82 @@ TEST(EntryList, ManyEqualKeysGiveTheFirstWhileTheFrontGrowsAndShrinks) {
         }
     }
     EXPECT_EQ(NumberOf(*list.Find(u"K")), many - 1);
+}
+
+// A hundred entries of keys of their own, found once.
+void FillLong(EntryList& list) {
+    for (uint32_t i = 0; i < 100; ++i) {
+        list.Insert(EntryList::End(), MakeNumbered(KeyOf(i), i));
+    }
+    ASSERT_EQ(NumberOf(*list.Find(KeyOf(50))), 50u);
+}
+
+TEST(EntryList, LongOrderedListFindsAKeyBehindTheFirstOfItThatHasGone) {
+    EntryList list(true);
+    FillLong(list);
+    list.Insert(EntryList::End(), MakeNumbered(u"K05", 100));
+    ASSERT_EQ(NumberOf(*list.Find(u"k05")), 50u);
+    Remove(list, list.AtIndex(50));
+    EXPECT_EQ(NumberOf(*list.Find(u"k05")), 100u);
+    Remove(list, list.Last());
+    EXPECT_EQ(list.Find(u"k05"), nullptr);
+}
+
+TEST(EntryList, LongOrderedListFindsAnEqualKeyThatWasPutInFront) {
+    EntryList list(true);
+    FillLong(list);
+    list.Insert(list.AtIndex(10), MakeNumbered(u"K05", 100));
+    EXPECT_EQ(NumberOf(*list.Find(u"k05")), 100u);
+}
+
+TEST(EntryList, LongOrderedListTellsKeysApartThatDifferInAMarkAlone) {
+    EntryList list(true);
+    FillLong(list);
+    list.Insert(EntryList::End(), MakeNumbered(u"x-y", 100));
+    list.Insert(EntryList::End(), MakeNumbered(u"xy", 101));
+    list.Insert(EntryList::End(), MakeNumbered(u"x'y", 102));
+    EXPECT_EQ(NumberOf(*list.Find(u"X-Y")), 100u);
+    EXPECT_EQ(NumberOf(*list.Find(u"XY")), 101u);
+    EXPECT_EQ(NumberOf(*list.Find(u"X'Y")), 102u);
+    EXPECT_EQ(list.Find(u"-xy"), nullptr);
+}
+
+TEST(EntryList, LongOrderedListFindsAsciiKeysByWideOnesAndTheOtherWayRound) {
+    EntryList list(true);
+    FillLong(list);
+    list.Insert(EntryList::End(), MakeNumbered(u"ab", 100));
+    EXPECT_EQ(NumberOf(*list.Find(u"\uFF21\uFF42")), 100u);
+    list.Insert(EntryList::End(), MakeNumbered(u"\uFF43d", 101));
+    EXPECT_EQ(NumberOf(*list.Find(u"CD")), 101u);
+    EXPECT_EQ(NumberOf(*list.Find(u"AB")), 100u);
+}
+
+TEST(EntryList, PiecesThatGoFromALongOrderedListLeaveTheOthersFindable) {
+    EntryList list(true);
+    for (uint32_t i = 0; i < 1000; ++i) {
+        list.Insert(EntryList::End(), MakeNumbered(KeyOf(i), i));
+    }
+    for (uint32_t i = 0; i < 300; ++i) {
+        Remove(list, list.AtIndex(200));
+    }
+    for (uint32_t i = 0; i < 500; ++i) {
+        list.Insert(list.AtIndex(100), MakeNumbered(u"new" + KeyOf(i), 1000 + i));
+    }
+    for (EntryPosition position = list.Begin(); !position.IsEnd(); position = list.Next(position)) {
+        ASSERT_EQ(list.Locate(list.At(position)), position);
+        ASSERT_EQ(list.Find(list.At(position)->Key().View()), list.At(position));
+    }
+}
+
+TEST(EntryList, RoomThatIsReservedChangesNothing) {
+    EntryList list(false);
+    list.Reserve(20);
+    EXPECT_TRUE(list.IsEmpty());
+    InsertSorted(list, u"b", 1);
+    list.Reserve(3);
+    list.Reserve(100);
+    InsertSorted(list, u"a", 0);
+    EXPECT_EQ(Walk(list), UpTo(2));
 }
 
 TEST(EntryList, ManyEntriesAreInsertedAndRemovedInTheMiddle) {
