@@ -152,6 +152,10 @@ bool ResTreeNode::SetEntryText(NodeEntry* entry, String&& value) {
     if (text == nullptr) {
         return false;
     }
+    if (!MayBeHeard() && (parent == nullptr || !parent->MayBeHeard())) {
+        text->Swap(value);
+        return true;
+    }
     const bool isDisplayName = Compare(entry->Key().View(), displayNameKey) == 0;
     text->Swap(value);
     const ReleaseScope scope;

@@ -222,7 +222,7 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
 
     // Notes `changes`, and delivers at once unless delivery is held back.
     void Raise(uint32_t changes) {
-        if (attachments || suspendCount != 0) {
+        if (MayBeHeard()) {
             RaiseObserved(changes);
         }
     }
@@ -373,6 +373,8 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     template <typename Visit>
     static void VisitWithDependants(ResTreeNode& top, Visit visit);
 
+    // False if there is nobody to tell of a change, now or when delivery is held back no longer.
+    bool MayBeHeard() const { return attachments || suspendCount != 0; }
     void RaiseObserved(uint32_t changes);
     bool Register(ResTreeNodeChangeObserver* observer, uint32_t mask, int32_t context, ResTreeNode* chained);
     bool Unregister(ResTreeNodeChangeObserver* observer, int32_t context);

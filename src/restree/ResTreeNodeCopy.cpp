@@ -3,9 +3,9 @@
 // above it; and what the merge removes stays readable until it ends (ReleaseScope).
 
 #include <utility>
-#include <vector>
 
 #include "restree/EntryWalk.h"
+#include "restree/LevelStack.h"
 #include "restree/NodePath.h"
 #include "restree/ReleaseScope.h"
 #include "restree/ResTreeNode.h"
@@ -20,11 +20,16 @@ struct ResTreeNode::MergeWalk {
         // What is done for an entry may change the source: observers do, and a source that stands below the target
         // can be replaced or filled by the merge itself.
         EntryWalk walk;
+        // As long as the target has nothing but what was copied from a source of its own form: how many entries. They
+        // then come in the target's order. Else unknownOrder.
+        uint32_t copiedInOrder;
         // Paths of the two, made for the first link.
         String sourcePath = String::WithoutBuffer();
         String targetPath = String::WithoutBuffer();
         bool hasPaths = false;
     };
+
+    static constexpr uint32_t unknownOrder = 0xFFFFFFFF;
 
     MergeWalk(ResTreeNode& target, ResTreeNode& source, bool overwrite) : top(&target), overwrite(overwrite) {
         Enter(target, source);
@@ -33,26 +38,31 @@ struct ResTreeNode::MergeWalk {
     void Run();
     void Enter(ResTreeNode& target, ResTreeNode& source) {
         if (&target != &source) {
-            levels.push_back({&target, &source, {}});
+            uint32_t copiedInOrder = unknownOrder;
+            if (target.entries.IsEmpty()) {
+                target.entries.Reserve(source.entries.Size());
+                copiedInOrder = target.IsOrdered() || source.IsOrdered() ? unknownOrder : 0;
+            }
+            levels.Push({&target, &source, {}, copiedInOrder});
         }
     }
-    void MergeText(ResTreeNode& target, const NodeEntry& entry);
+    void MergeText(Level& level, const NodeEntry& entry);
     void MergeLink(Level& level, const NodeEntry& entry);
 
     const ReleaseScope scope;
     ResTreeNode* top;
     bool overwrite;
-    std::vector<Level> levels;
+    LevelStack<Level> levels;
 };
 
 void ResTreeNode::MergeWalk::Run() {
-    while (!levels.empty()) {
-        Level& level = levels.back();
+    while (!levels.IsEmpty()) {
+        Level& level = levels.Top();
         const NodeEntry* entry = level.walk.Next(level.source->entries);
         if (entry == nullptr) {
-            levels.pop_back();
+            levels.Pop();
         } else if (entry->IsText()) {
-            MergeText(*level.target, *entry);
+            MergeText(level, *entry);
         } else if (entry->LinkPath() != nullptr) {
             MergeLink(level, *entry);
         } else if (ResTreeNode* sourceChild = entry->Child(); sourceChild != nullptr && sourceChild != top) {
@@ -65,8 +75,16 @@ void ResTreeNode::MergeWalk::Run() {
     }
 }
 
-void ResTreeNode::MergeWalk::MergeText(ResTreeNode& target, const NodeEntry& entry) {
+void ResTreeNode::MergeWalk::MergeText(Level& level, const NodeEntry& entry) {
+    ResTreeNode& target = *level.target;
     String text(*entry.Text());
+    if (level.copiedInOrder == target.entries.Size()) {
+        // The search would end at the end.
+        ++level.copiedInOrder;
+        target.Store(EntryList::End(), NodeEntry::MakeText(String(entry.Key()), entry.Kind(), std::move(text)),
+                     PropertyAdded);
+        return;
+    }
     const Added added = target.AddTextEntry(String(entry.Key()), std::move(text), entry.Kind());
     if (!added.isNew && overwrite) {
         // NOLINTNEXTLINE(bugprone-use-after-move): the text was taken only if an entry was made.
@@ -110,16 +128,18 @@ ResTreeNode* ResTreeNode::PrepareClone(EntryPosition position, std::u16string_vi
             }
             RemoveIfMismatched(!overwrite, key, source.type.View(), source.IsOrdered());
             position = isThatEntry ? EntryList::End() : entries.AtIndex(index);
-        } else {
+        } else if (!overwrite && HasDeferredContents()) {
+            // What comes in now may bring what is to be removed.
             const uint32_t index = position.IsEnd() ? 0 : entries.IndexOf(position);
-            RemoveIfMismatched(!overwrite, key, source.type.View(), source.IsOrdered());
+            RemoveEntryByName(key);
             position = position.IsEnd() ? position : entries.AtIndex(index);
         }
-    } else {
-        RemoveIfMismatched(!overwrite, key, source.type.View(), source.IsOrdered());
     }
     ResTreeNode* child = nullptr;
-    entry = AddChildAt(position, String(key), String(source.type), source.IsOrdered(), child).entry;
+    String childType(source.type);
+    entry = IsOrdered()
+                ? AddChildAt(position, String(key), std::move(childType), source.IsOrdered(), child).entry
+                : ReplaceChild(!overwrite, String(key), std::move(childType), source.IsOrdered(), child, nullptr).entry;
     return StillHolds(entry) ? child : nullptr;
 }
 
