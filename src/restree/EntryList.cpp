@@ -20,9 +20,7 @@ struct EntryList::LongForm {
 };
 
 EntryList::~EntryList() {
-    for (EntryPosition position = Begin(); !position.IsEnd(); position = Next(position)) {
-        NodeEntry::Release(At(position));
-    }
+    VisitUnordered([](NodeEntry* entry) { NodeEntry::Release(entry); });
     ReleaseContainer();
 }
 
@@ -36,6 +34,7 @@ void EntryList::ReleaseContainer() noexcept {
     count = 0;
     capacity = 0;
     isLong = false;
+    isSettled = true;
 }
 
 void EntryList::Reset(bool newOrdered) noexcept {
@@ -52,6 +51,7 @@ EntryPosition EntryList::Last() const {
     if (isLong) {
         return longForm->pieces.Last();
     }
+    Settle();
     return count == 0 ? EntryPosition{} : EntryPosition{0, count - 1};
 }
 
@@ -74,6 +74,7 @@ EntryPosition EntryList::AtIndex(uint32_t index) const {
     if (isLong) {
         return longForm->pieces.AtIndex(index);
     }
+    Settle();
     return index < count ? EntryPosition{0, index} : EntryPosition{};
 }
 
@@ -81,6 +82,7 @@ EntryPosition EntryList::Locate(const NodeEntry* entry) const {
     if (isLong) {
         return longForm->pieces.Locate(entry);
     }
+    Settle();
     return {0, static_cast<uint32_t>(std::find(items, items + count, entry) - items)};
 }
 
@@ -89,6 +91,7 @@ bool EntryList::IsValid(EntryPosition position) const {
 }
 
 EntryPosition EntryList::FollowingMoved(EntryPosition position, const NodeEntry* entry) const {
+    Settle();
     const bool isValid = IsValid(position);
     if (isValid && At(position) == entry) {
         return Next(position);
@@ -103,19 +106,51 @@ EntryPosition EntryList::FollowingMoved(EntryPosition position, const NodeEntry*
     return isValid ? position : EntryPosition{};
 }
 
-NodeEntry* EntryList::Find(std::u16string_view key) const {
-    if (!ordered) {
-        return SearchSorted(key).entry;
+NodeEntry* EntryList::Find(HashedKey key) const {
+    if (!isLong) {
+        return FindInArray(key);
     }
-    if (isLong) {
-        return FindInIndex(key);
-    }
+    return ordered ? FindInIndex(key.text) : SearchSorted(key.text).entry;
+}
+
+// Keys that aren't plain have the hash 0 and may equal one of any hash.
+NodeEntry* EntryList::FindInArray(HashedKey key) const {
     for (uint32_t i = 0; i < count; ++i) {
-        if (Compare(items[i]->Key().View(), key) == 0) {
+        const uint8_t hash = items[i]->KeyHash();
+        const bool mayBeEqual = hash == key.hash || hash == 0 || key.hash == 0;
+        if (mayBeEqual && Compare(items[i]->Key().View(), key.text) == 0) {
             return items[i];
         }
     }
     return nullptr;
+}
+
+// The same in an array of plain keys. False, and nothing is known, if there is another one.
+bool EntryList::FindPlain(HashedKey key, NodeEntry*& entry) const {
+    entry = nullptr;
+    for (uint32_t i = 0; i < count; ++i) {
+        const uint8_t hash = items[i]->KeyHash();
+        if (hash == 0) {
+            return false;
+        }
+        if (hash == key.hash && entry == nullptr && Compare(items[i]->Key().View(), key.text) == 0) {
+            entry = items[i];
+        }
+    }
+    return key.hash != 0;
+}
+
+// With plain keys nothing can fail. Stable, and quick where little is out of order.
+void EntryList::SortArray() const noexcept {
+    for (uint32_t i = 1; i < count; ++i) {
+        NodeEntry* entry = items[i];
+        uint32_t slot = i;
+        for (; slot != 0 && Compare(entry->Key().View(), items[slot - 1]->Key().View()) < 0; --slot) {
+            items[slot] = items[slot - 1];
+        }
+        items[slot] = entry;
+    }
+    isSettled = true;
 }
 
 NodeEntry* EntryList::FindInIndex(std::u16string_view key) const {
@@ -125,12 +160,18 @@ NodeEntry* EntryList::FindInIndex(std::u16string_view key) const {
     return longForm->index->Find(key);
 }
 
-EntryList::Place EntryList::FindPlace(std::u16string_view key) const {
-    // Copies and caches come in order.
-    if (count == 0 || Compare(At(Last())->Key().View(), key) < 0) {
+EntryList::Place EntryList::FindPlace(HashedKey key) const {
+    if (count == 0) {
         return {{}, nullptr};
     }
-    return SearchSorted(key);
+    if (NodeEntry* entry = nullptr; !isLong && FindPlain(key, entry)) {
+        return {EntryPosition::Unsettled(), entry};
+    }
+    // Copies and caches come in order.
+    if (Compare(At(Last())->Key().View(), key.text) < 0) {
+        return {{}, nullptr};
+    }
+    return SearchSorted(key.text);
 }
 
 EntryList::Place EntryList::SearchSorted(std::u16string_view key) const {
@@ -141,6 +182,7 @@ EntryList::Place EntryList::SearchSorted(std::u16string_view key) const {
         const bool found = !position.IsEnd() && Compare(pieces.At(position)->Key().View(), key) == 0;
         return {position, found ? pieces.At(position) : nullptr};
     }
+    Settle();
     uint32_t low = 0;
     uint32_t high = count;
     while (low < high) {
@@ -174,7 +216,7 @@ void EntryList::GrowArray(uint32_t size) {
         TaskMemFree(static_cast<void*>(items));
     }
     items = grown;
-    capacity = static_cast<uint16_t>(size);
+    capacity = static_cast<uint8_t>(size);
 }
 
 void EntryList::InsertInArray(uint32_t slot, NodeEntry* entry) {
@@ -188,6 +230,7 @@ void EntryList::InsertInArray(uint32_t slot, NodeEntry* entry) {
 }
 
 void EntryList::MakeLong() {
+    Settle();
     auto grown = std::make_unique<LongForm>();
     for (uint32_t i = 0; i < count; ++i) {
         grown->pieces.Insert({}, items[i]);
@@ -203,10 +246,15 @@ EntryPosition EntryList::InsertAnywhere(EntryPosition position, NodeEntry* entry
         const uint32_t slot = position.IsEnd() ? count : position.slot;
         if (count < shortLimit) {
             InsertInArray(slot, entry);
+            isSettled = isSettled && (ordered || position != EntryPosition::Unsettled());
             return {0, slot};
         }
         MakeLong();
-        position = slot == count ? EntryPosition{} : longForm->pieces.AtIndex(slot);
+        if (!ordered && position == EntryPosition::Unsettled()) {
+            position = SearchSorted(entry->Key().View()).position;
+        } else {
+            position = slot == count ? EntryPosition{} : longForm->pieces.AtIndex(slot);
+        }
     }
     const bool atEnd = position.IsEnd();
     const EntryPosition place = longForm->pieces.Insert(position, entry);
@@ -240,6 +288,7 @@ void EntryList::AssignKey(NodeEntry* entry, String&& key) noexcept {
         RemoveFromIndex(entry);
     }
     entry->key.Swap(key);
+    entry->keyHash = HashKey(entry->key.View());
     if (isIndexed && longForm->index) {
         AddToIndex(entry, false);
     }

@@ -18,6 +18,9 @@ struct EntryPosition {
     uint32_t slot = 0;
 
     bool IsEnd() const { return piece == endPiece; }
+
+    // The end, for an entry that is to be put into its order later.
+    static EntryPosition Unsettled() { return {endPiece, 1}; }
     friend bool operator==(const EntryPosition&, const EntryPosition&) = default;
 };
 

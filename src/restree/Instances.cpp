@@ -12,16 +12,11 @@ void ReplicateInstances(ParseFrame& frame) {
     }
     for (size_t i = 1; i < frame.instances.size(); ++i) {
         const InstanceRecord& record = frame.instances[i];
-        // Found anew each time: observers and deferred loads may have changed the node since.
-        EntryIterator behind = node.PositionOf(last);
-        if (!behind.IsEnd()) {
-            ++behind;
-        }
         ResTreeNode* copy = nullptr;
-        const EntryIterator placed =
-            node.CloneSubtreeInto(behind, record.name.View(), *pattern, frame.mergeExisting, copy);
+        const NodeEntry* placed =
+            node.CloneSubtreeBehind(last, record.name.View(), *pattern, frame.mergeExisting, copy);
         if (copy != nullptr) {
-            last = &*placed;
+            last = placed;
             copy->ApplyInstance(record.name, record.variable, record.index);
         }
     }

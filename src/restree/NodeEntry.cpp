@@ -4,6 +4,7 @@
 #include <utility>
 
 #include "qn/dsc/osdep/TaskMemory.h"
+#include "restree/HashedKey.h"
 
 namespace zkhw {
 
@@ -20,13 +21,23 @@ void* Allocate(size_t size) {
 }  // namespace
 
 NodeEntry* NodeEntry::MakeText(String&& key, EntryKind kind, String&& text) {
+    const uint8_t keyHash = HashKey(key.View());
+    return MakeText(std::move(key), keyHash, kind, std::move(text));
+}
+
+NodeEntry* NodeEntry::MakeText(String&& key, uint8_t keyHash, EntryKind kind, String&& text) {
     // Both shapes fill a size class: any further field costs a tree 8 bytes an entry.
     static_assert(sizeof(void*) != 8 || (sizeof(TextShape) == 56 && sizeof(ChildShape) == 40));
-    return new (Allocate(sizeof(TextShape))) TextShape(std::move(key), kind, std::move(text));
+    return new (Allocate(sizeof(TextShape))) TextShape(std::move(key), keyHash, kind, std::move(text));
 }
 
 NodeEntry* NodeEntry::MakeChild(String&& key, ResTreeNode* child) {
-    return new (Allocate(sizeof(ChildShape))) ChildShape(std::move(key), child);
+    const uint8_t keyHash = HashKey(key.View());
+    return MakeChild(std::move(key), keyHash, child);
+}
+
+NodeEntry* NodeEntry::MakeChild(String&& key, uint8_t keyHash, ResTreeNode* child) {
+    return new (Allocate(sizeof(ChildShape))) ChildShape(std::move(key), keyHash, child);
 }
 
 void NodeEntry::Release(NodeEntry* entry) noexcept {

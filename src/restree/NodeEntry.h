@@ -25,11 +25,14 @@ enum EntryKind : uint8_t {
 
 class NodeEntry {
   public:
-    // A text or link entry. Both strings are moved from. Throws bad_alloc; then both are as they were.
+    // A text or link entry. Both strings are moved from. Throws bad_alloc; then both are as they were. `keyHash` is
+    // HashKey of the key, for who has it.
     static NodeEntry* MakeText(String&& key, EntryKind kind, String&& text);
+    static NodeEntry* MakeText(String&& key, uint8_t keyHash, EntryKind kind, String&& text);
 
     // A child entry that takes `child`. Throws bad_alloc; then `key` is as it was and `child` still the caller's.
     static NodeEntry* MakeChild(String&& key, ResTreeNode* child);
+    static NodeEntry* MakeChild(String&& key, uint8_t keyHash, ResTreeNode* child);
 
     // Frees the entry. A child must have been taken out with TakeChild.
     static void Release(NodeEntry* entry) noexcept;
@@ -38,6 +41,7 @@ class NodeEntry {
     NodeEntry& operator=(const NodeEntry&) = delete;
 
     const String& Key() const { return key; }
+    uint8_t KeyHash() const { return keyHash; }
     EntryKind Kind() const { return kind; }
     bool IsText() const { return kind == TextEntry || kind == LocalizedTextEntry; }
 
@@ -75,8 +79,8 @@ class NodeEntry {
     struct TextShape;
     struct ChildShape;
 
-    NodeEntry(String&& key, EntryKind kind, bool textShape)
-        : key(static_cast<String&&>(key)), kind(kind), textShape(textShape) {}
+    NodeEntry(String&& key, uint8_t keyHash, EntryKind kind, bool textShape)
+        : key(static_cast<String&&>(key)), keyHash(keyHash), kind(kind), textShape(textShape) {}
     ~NodeEntry() = default;
 
     inline String& Payload();
@@ -85,20 +89,21 @@ class NodeEntry {
 
     String key;
     uint32_t pieceNumber = 0;  // Of the piece of a long list that holds the entry (EntryPieces.h); 0 in a short list.
+    uint8_t keyHash;           // HashKey of the key.
     EntryKind kind;
     bool textShape;  // Which shape was allocated; the kind may have become EmptyEntry since.
     bool textMarked = false;
 };
 
 struct NodeEntry::TextShape : NodeEntry {
-    TextShape(String&& key, EntryKind kind, String&& text)
-        : NodeEntry(static_cast<String&&>(key), kind, true), text(static_cast<String&&>(text)) {}
+    TextShape(String&& key, uint8_t keyHash, EntryKind kind, String&& text)
+        : NodeEntry(static_cast<String&&>(key), keyHash, kind, true), text(static_cast<String&&>(text)) {}
     String text;
 };
 
 struct NodeEntry::ChildShape : NodeEntry {
-    ChildShape(String&& key, ResTreeNode* child)
-        : NodeEntry(static_cast<String&&>(key), ChildEntry, false), child(child) {}
+    ChildShape(String&& key, uint8_t keyHash, ResTreeNode* child)
+        : NodeEntry(static_cast<String&&>(key), keyHash, ChildEntry, false), child(child) {}
     ResTreeNode* child;
 };
 

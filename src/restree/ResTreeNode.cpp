@@ -93,7 +93,7 @@ EntryIterator ResTreeNode::FindEntry(std::u16string_view key) {
     return entry == nullptr ? End() : PositionOf(entry);
 }
 
-NodeEntry* ResTreeNode::Find(std::u16string_view key) {
+NodeEntry* ResTreeNode::Find(HashedKey key) {
     if (NodeEntry* entry = FindRaw(key)) {
         return entry;
     }
@@ -106,12 +106,12 @@ NodeEntry* ResTreeNode::Find(std::u16string_view key) {
     return FindRaw(key);
 }
 
-const String* ResTreeNode::GetProperty(std::u16string_view key) {
+const String* ResTreeNode::GetProperty(HashedKey key) {
     const NodeEntry* entry = Find(key);
     return entry == nullptr ? nullptr : entry->Text();
 }
 
-const String& ResTreeNode::GetPropertyOrEmpty(std::u16string_view key) {
+const String& ResTreeNode::GetPropertyOrEmpty(HashedKey key) {
     static const String empty;
     const String* value = GetProperty(key);
     return value == nullptr ? empty : *value;
@@ -190,56 +190,50 @@ ResTreeNode::Added ResTreeNode::Store(EntryPosition position, NodeEntry* entry, 
 }
 
 ResTreeNode::Added ResTreeNode::AddTextEntry(String&& key, String&& value, EntryKind kind, const String* before) {
-    EntryPosition position = PositionBefore(before);
-    if (!IsOrdered()) {
-        const EntryList::Place place = entries.FindPlace(key.View());
-        if (place.entry != nullptr) {
-            return {place.entry, false};
-        }
-        position = place.position;
-    }
-    return Store(position, NodeEntry::MakeText(std::move(key), kind, std::move(value)), PropertyAdded);
+    return AddText(std::move(key), std::move(value), kind, PropertyAdded, before);
 }
 
 ResTreeNode::Added ResTreeNode::AddLinkEntry(String&& key, String&& path, const String* before) {
+    return AddText(std::move(key), std::move(path), LinkEntry, ChildAdded, before);
+}
+
+ResTreeNode::Added ResTreeNode::AddText(String&& key, String&& text, EntryKind kind, uint32_t change,
+                                        const String* before) {
     EntryPosition position = PositionBefore(before);
+    const HashedKey hashed(key.View());
     if (!IsOrdered()) {
-        const EntryList::Place place = entries.FindPlace(key.View());
+        const EntryList::Place place = entries.FindPlace(hashed);
         if (place.entry != nullptr) {
             return {place.entry, false};
         }
         position = place.position;
     }
-    return Store(position, NodeEntry::MakeText(std::move(key), LinkEntry, std::move(path)), ChildAdded);
+    return Store(position, NodeEntry::MakeText(std::move(key), hashed.hash, kind, std::move(text)), change);
 }
 
 ResTreeNode::Added ResTreeNode::AddChildEntry(std::u16string_view key, std::u16string_view childType, bool childOrdered,
                                               ResTreeNode*& child, const String* before) {
-    return AddChild(String(key), String(childType), childOrdered, child, before);
+    return AddChildAt(PositionBefore(before), key, String(key), String(childType), childOrdered, child);
 }
 
-ResTreeNode::Added ResTreeNode::AddChild(String&& key, String&& childType, bool childOrdered, ResTreeNode*& child,
-                                         const String* before) {
-    return AddChildAt(PositionBefore(before), std::move(key), std::move(childType), childOrdered, child);
-}
-
-ResTreeNode::Added ResTreeNode::AddChildAt(EntryPosition position, String&& key, String&& childType, bool childOrdered,
-                                           ResTreeNode*& child) {
+// Here and below `hashed` is that of `key`, which is moved from.
+ResTreeNode::Added ResTreeNode::AddChildAt(EntryPosition position, HashedKey hashed, String&& key, String&& childType,
+                                           bool childOrdered, ResTreeNode*& child) {
     if (!IsOrdered()) {
-        const EntryList::Place place = entries.FindPlace(key.View());
+        const EntryList::Place place = entries.FindPlace(hashed);
         if (place.entry != nullptr) {
             child = place.entry->Child();
             return {place.entry, false};
         }
         position = place.position;
     }
-    return MakeChildAt(position, std::move(key), std::move(childType), childOrdered, child);
+    return MakeChildAt(position, hashed, std::move(key), std::move(childType), childOrdered, child);
 }
 
-ResTreeNode::Added ResTreeNode::MakeChildAt(EntryPosition position, String&& key, String&& childType, bool childOrdered,
-                                            ResTreeNode*& child) {
+ResTreeNode::Added ResTreeNode::MakeChildAt(EntryPosition position, HashedKey hashed, String&& key, String&& childType,
+                                            bool childOrdered, ResTreeNode*& child) {
     auto made = std::make_unique<ResTreeNode>(String(key), std::move(childType), childOrdered, this);
-    NodeEntry* entry = NodeEntry::MakeChild(std::move(key), made.get());
+    NodeEntry* entry = NodeEntry::MakeChild(std::move(key), hashed.hash, made.get());
     child = made.release();
     return Store(position, entry, ChildAdded);
 }
@@ -247,46 +241,54 @@ ResTreeNode::Added ResTreeNode::MakeChildAt(EntryPosition position, String&& key
 // RemoveIfMismatched and AddChildEntry in one, with one search where one is enough.
 ResTreeNode::Added ResTreeNode::ReplaceChild(bool unconditional, String&& key, String&& childType, bool childOrdered,
                                              ResTreeNode*& child, const String* before) {
+    const HashedKey hashed(key.View());
     if (unconditional || IsOrdered() || before != nullptr) {
-        RemoveIfMismatched(unconditional, key.View(), childType.View(), childOrdered);
-        return AddChild(std::move(key), std::move(childType), childOrdered, child, before);
+        RemoveIfMismatched(unconditional, hashed, childType.View(), childOrdered);
+    } else {
+        const EntryList::Place place = entries.FindPlace(hashed);
+        if (place.entry == nullptr) {
+            return MakeChildAt(place.position, hashed, std::move(key), std::move(childType), childOrdered, child);
+        }
+        if (IsChildOfKind(*place.entry, childType.View(), childOrdered)) {
+            child = place.entry->Child();
+            return {place.entry, false};
+        }
+        RemoveEntry(place.entry);
     }
-    const EntryList::Place place = entries.FindPlace(key.View());
-    if (place.entry == nullptr) {
-        return MakeChildAt(place.position, std::move(key), std::move(childType), childOrdered, child);
-    }
-    if (IsChildOfKind(*place.entry, childType.View(), childOrdered)) {
-        child = place.entry->Child();
-        return {place.entry, false};
-    }
-    RemoveEntry(place.entry);
-    return AddChild(std::move(key), std::move(childType), childOrdered, child, before);
+    return AddChildAt(PositionBefore(before), hashed, std::move(key), std::move(childType), childOrdered, child);
+}
+
+// Where an unordered node takes an entry with this key: in front of the one that has it, if there is one.
+EntryPosition ResTreeNode::PlaceInFront(std::u16string_view key) const {
+    const EntryList::Place place = entries.FindPlace(key);
+    return place.entry == nullptr ? place.position : entries.Locate(place.entry);
 }
 
 EntryIterator ResTreeNode::InsertEntry(EntryIterator position, std::u16string_view key, EntryKind kind,
                                        std::u16string_view text) {
-    const EntryPosition place = IsOrdered() ? position.Position() : entries.FindPlace(key).position;
+    const EntryPosition place = IsOrdered() ? position.Position() : PlaceInFront(key);
     NodeEntry* entry = NodeEntry::MakeText(String(key), kind, String(text));
     try {
-        return {entries, entries.Insert(place, entry)};
+        entries.Insert(place, entry);
     } catch (...) {
         NodeEntry::Release(entry);
         throw;
     }
+    return {entries, entries.Locate(entry)};
 }
 
 EntryIterator ResTreeNode::InsertEntry(EntryIterator position, std::u16string_view key,
                                        std::unique_ptr<ResTreeNode> child) {
-    const EntryPosition place = IsOrdered() ? position.Position() : entries.FindPlace(key).position;
+    const EntryPosition place = IsOrdered() ? position.Position() : PlaceInFront(key);
     NodeEntry* entry = NodeEntry::MakeChild(String(key), child.get());
     try {
-        const EntryPosition stored = entries.Insert(place, entry);
-        child.release()->parent = this;
-        return {entries, stored};
+        entries.Insert(place, entry);
     } catch (...) {
         NodeEntry::Release(entry);
         throw;
     }
+    child.release()->parent = this;
+    return {entries, entries.Locate(entry)};
 }
 
 bool ResTreeNode::RenameEntry(std::u16string_view oldKey, std::u16string_view newKey) {
@@ -331,7 +333,7 @@ void ResTreeNode::SetOrdered(bool ordered) {
     entries.Reset(ordered);
 }
 
-void ResTreeNode::RemoveIfMismatched(bool unconditional, std::u16string_view entryName, std::u16string_view entryType,
+void ResTreeNode::RemoveIfMismatched(bool unconditional, HashedKey entryName, std::u16string_view entryType,
                                      bool entryOrdered) {
     if (unconditional) {
         RemoveEntryByName(entryName);

@@ -90,11 +90,11 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     // The entry `key` as things stand; the first one in an ordered node. The end position, or null, on a miss.
     // Logarithmic. Find... gives the entry itself, which stays where it is until it is removed.
     EntryIterator FindEntryRaw(std::u16string_view key);
-    NodeEntry* FindRaw(std::u16string_view key) const { return entries.Find(key); }
+    NodeEntry* FindRaw(HashedKey key) const { return entries.Find(key); }
 
     // The same; a miss on a node whose contents are deferred loads them first and looks once more.
     EntryIterator FindEntry(std::u16string_view key);
-    NodeEntry* Find(std::u16string_view key);
+    NodeEntry* Find(HashedKey key);
 
     // The position of an entry of this node; the end if it has been removed, where a ReleaseScope still keeps it.
     EntryIterator PositionOf(const NodeEntry* entry) {
@@ -103,10 +103,10 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
 
     // The value of the text entry `key`; null if there is none or the entry is of another kind. May load (FindEntry).
     // The result lives in the node until the entry is changed or removed.
-    const String* GetProperty(std::u16string_view key);
+    const String* GetProperty(HashedKey key);
 
     // As GetProperty, with one shared empty String in place of null.
-    const String& GetPropertyOrEmpty(std::u16string_view key);
+    const String& GetPropertyOrEmpty(HashedKey key);
 
     // The node that the entry stands for: a child, or where a link leads. Null at the end, for a text and for a link
     // that leads nowhere. Following a link may load.
@@ -144,7 +144,7 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     void RemoveEntry(NodeEntry* entry);
 
     // The same by name, after a deferred load if need be; a missing entry does nothing.
-    void RemoveEntryByName(std::u16string_view key);
+    void RemoveEntryByName(HashedKey key);
 
     // Removes every child entry. Texts and links stay.
     void RemoveChildNodes();
@@ -161,8 +161,7 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     void SetOrdered(bool ordered);
 
     // Removes the entry `name`: always when `unconditional`, else unless it is a child of just this type and order.
-    void RemoveIfMismatched(bool unconditional, std::u16string_view entryName, std::u16string_view entryType,
-                            bool entryOrdered);
+    void RemoveIfMismatched(bool unconditional, HashedKey entryName, std::u16string_view entryType, bool entryOrdered);
 
     // Copies the entries of `source`, as they stand, to the end of this node; children deeply, links re-expressed
     // from here. Texts that are there already are overwritten on demand. A node may be merged with one of its own
@@ -174,6 +173,11 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     // if an observer has removed the child meanwhile.
     EntryIterator CloneSubtreeInto(EntryIterator position, std::u16string_view key, ResTreeNode& source, bool overwrite,
                                    ResTreeNode*& child);
+
+    // The same behind the entry `behind`, or at the end if that has left the node; gives the entry of the copy. Null,
+    // and `child` too, if an observer has removed it meanwhile.
+    NodeEntry* CloneSubtreeBehind(const NodeEntry* behind, std::u16string_view key, ResTreeNode& source, bool overwrite,
+                                  ResTreeNode*& child);
 
     // A detached copy with its own type table, if this node has one. The caller owns it.
     std::unique_ptr<ResTreeNode> Clone();
@@ -346,14 +350,20 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     Attachments& GetAttachments();
     Added Store(EntryPosition position, NodeEntry* entry, uint32_t change);
     EntryPosition PositionBefore(const String* before);
-    Added AddChildAt(EntryPosition position, String&& key, String&& childType, bool childOrdered, ResTreeNode*& child);
-    Added AddChild(String&& key, String&& childType, bool childOrdered, ResTreeNode*& child, const String* before);
+    EntryPosition PlaceInFront(std::u16string_view key) const;
+    Added AddText(String&& key, String&& text, EntryKind kind, uint32_t change, const String* before);
+    Added AddChildAt(EntryPosition position, HashedKey hashed, String&& key, String&& childType, bool childOrdered,
+                     ResTreeNode*& child);
     Added ReplaceChild(bool unconditional, String&& key, String&& childType, bool childOrdered, ResTreeNode*& child,
                        const String* before);
-    Added MakeChildAt(EntryPosition position, String&& key, String&& childType, bool childOrdered, ResTreeNode*& child);
+    Added MakeChildAt(EntryPosition position, HashedKey hashed, String&& key, String&& childType, bool childOrdered,
+                      ResTreeNode*& child);
     static bool IsChildOfKind(const NodeEntry& entry, std::u16string_view entryType, bool entryOrdered);
-    ResTreeNode* PrepareClone(EntryPosition position, std::u16string_view key, ResTreeNode& source, bool overwrite,
+    ResTreeNode* PrepareClone(EntryPosition position, HashedKey key, ResTreeNode& source, bool overwrite,
                               NodeEntry*& entry);
+
+    NodeEntry* CloneAt(EntryPosition position, std::u16string_view key, ResTreeNode& source, bool overwrite,
+                       ResTreeNode*& child);
 
     void FinishRemoval(NodeEntry* entry);
     std::vector<NodeEntry*> ChildEntriesInRemovalOrder() const;

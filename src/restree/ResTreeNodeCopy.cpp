@@ -67,8 +67,8 @@ void ResTreeNode::MergeWalk::Run() {
             MergeLink(level, *entry);
         } else if (ResTreeNode* sourceChild = entry->Child(); sourceChild != nullptr && sourceChild != top) {
             NodeEntry* placed = nullptr;
-            if (ResTreeNode* child = level.target->PrepareClone(EntryList::End(), entry->Key().View(), *sourceChild,
-                                                                overwrite, placed)) {
+            if (ResTreeNode* child = level.target->PrepareClone(
+                    EntryList::End(), {entry->Key().View(), entry->KeyHash()}, *sourceChild, overwrite, placed)) {
                 Enter(*child, *sourceChild);
             }
         }
@@ -81,7 +81,8 @@ void ResTreeNode::MergeWalk::MergeText(Level& level, const NodeEntry& entry) {
     if (level.copiedInOrder == target.entries.Size()) {
         // The search would end at the end.
         ++level.copiedInOrder;
-        target.Store(EntryList::End(), NodeEntry::MakeText(String(entry.Key()), entry.Kind(), std::move(text)),
+        target.Store(EntryList::End(),
+                     NodeEntry::MakeText(String(entry.Key()), entry.KeyHash(), entry.Kind(), std::move(text)),
                      PropertyAdded);
         return;
     }
@@ -114,8 +115,8 @@ void ResTreeNode::MergeFrom(ResTreeNode& source, bool overwrite) {
 
 // All of CloneSubtreeInto but the merge. Gives the child that is to receive it, or null if another kind of entry holds
 // the place or an observer has removed the child already.
-ResTreeNode* ResTreeNode::PrepareClone(EntryPosition position, std::u16string_view key, ResTreeNode& source,
-                                       bool overwrite, NodeEntry*& entry) {
+ResTreeNode* ResTreeNode::PrepareClone(EntryPosition position, HashedKey key, ResTreeNode& source, bool overwrite,
+                                       NodeEntry*& entry) {
     if (IsOrdered()) {
         if (const NodeEntry* found = FindRaw(key)) {
             const EntryPosition foundPosition = entries.Locate(found);
@@ -138,24 +139,41 @@ ResTreeNode* ResTreeNode::PrepareClone(EntryPosition position, std::u16string_vi
     ResTreeNode* child = nullptr;
     String childType(source.type);
     entry = IsOrdered()
-                ? AddChildAt(position, String(key), std::move(childType), source.IsOrdered(), child).entry
-                : ReplaceChild(!overwrite, String(key), std::move(childType), source.IsOrdered(), child, nullptr).entry;
+                ? AddChildAt(position, key, String(key.text), std::move(childType), source.IsOrdered(), child).entry
+                : ReplaceChild(!overwrite, String(key.text), std::move(childType), source.IsOrdered(), child, nullptr)
+                      .entry;
     return StillHolds(entry) ? child : nullptr;
+}
+
+NodeEntry* ResTreeNode::CloneAt(EntryPosition position, std::u16string_view key, ResTreeNode& source, bool overwrite,
+                                ResTreeNode*& child) {
+    const ReleaseScope scope;
+    NodeEntry* entry = nullptr;
+    child = PrepareClone(position, key, source, overwrite, entry);
+    if (child != nullptr) {
+        child->MergeFrom(source, overwrite);
+    }
+    if (!StillHolds(entry)) {
+        child = nullptr;
+        return nullptr;
+    }
+    return entry;
 }
 
 EntryIterator ResTreeNode::CloneSubtreeInto(EntryIterator position, std::u16string_view key, ResTreeNode& source,
                                             bool overwrite, ResTreeNode*& child) {
-    const ReleaseScope scope;
-    NodeEntry* entry = nullptr;
-    child = PrepareClone(position.Position(), key, source, overwrite, entry);
-    if (child != nullptr) {
-        child->MergeFrom(source, overwrite);
+    NodeEntry* entry = CloneAt(position.Position(), key, source, overwrite, child);
+    return {entries, entry == nullptr ? EntryList::End() : entries.Locate(entry)};
+}
+
+NodeEntry* ResTreeNode::CloneSubtreeBehind(const NodeEntry* behind, std::u16string_view key, ResTreeNode& source,
+                                           bool overwrite, ResTreeNode*& child) {
+    EntryPosition position = EntryList::End();
+    // An unordered node has no use for a position, and need not be put into its order for one.
+    if (IsOrdered() && StillHolds(behind)) {
+        position = entries.Next(entries.Locate(behind));
     }
-    const EntryIterator placed = PositionOf(entry);
-    if (placed.IsEnd()) {
-        child = nullptr;
-    }
-    return placed;
+    return CloneAt(position, key, source, overwrite, child);
 }
 
 std::unique_ptr<ResTreeNode> ResTreeNode::Clone() {

@@ -26,7 +26,7 @@ constexpr int32_t success = 0;
 constexpr int32_t generalFailure = static_cast<int32_t>(0x80004005);
 
 constexpr std::u16string_view parseErrorsKey = u"XMLParseErrors";
-constexpr std::u16string_view deferredPathKey = u":DeferredLoadPath";
+constexpr HashedKey deferredPathKey(u":DeferredLoadPath");
 
 // Holds back a node's notices for the length of a load, so that they are delivered in one go.
 template <typename Load>

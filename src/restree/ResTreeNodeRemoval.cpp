@@ -21,11 +21,11 @@ ResTreeNode::~ResTreeNode() {
         TearDown();
     }
     // What observers have added to a node that was torn down already.
-    for (EntryIterator entry = Begin(); !entry.IsEnd(); ++entry) {
+    entries.VisitUnordered([](NodeEntry* entry) {
         if (entry->Child() != nullptr) {
             DestroySubtree(entry->TakeChild());
         }
-    }
+    });
 }
 
 void ResTreeNode::TearDown() noexcept {
@@ -94,13 +94,13 @@ void ResTreeNode::DestroySubtree(ResTreeNode* top) noexcept {
     while (pending != nullptr) {
         ResTreeNode* node = pending;
         pending = node->parent;
-        for (EntryIterator entry = node->Begin(); !entry.IsEnd(); ++entry) {
+        node->entries.VisitUnordered([&pending](NodeEntry* entry) {
             if (entry->Child() != nullptr) {
                 ResTreeNode* child = entry->TakeChild();
                 child->parent = pending;
                 pending = child;
             }
-        }
+        });
         if (node->attachments) {
             for (NodeEntry* entry : node->attachments->lostEntries) {
                 if (entry->Child() != nullptr) {
@@ -274,7 +274,7 @@ void ResTreeNode::RemoveChildNodes() {
     }
 }
 
-void ResTreeNode::RemoveEntryByName(std::u16string_view key) {
+void ResTreeNode::RemoveEntryByName(HashedKey key) {
     if (NodeEntry* entry = Find(key)) {
         RemoveEntry(entry);
     }

@@ -114,7 +114,7 @@ TEST(EntryList, FullWidthKeyIsTheSameKey) {
     EXPECT_EQ(NumberOf(*ordered.Find(u"ab")), 2u);
 }
 
-TEST(EntryList, PlaceOfAMissingKeyIsInFrontOfTheNextKey) {
+TEST(EntryList, MissingKeyIsInsertedInFrontOfTheNextKey) {
     // "b", "bb", "bbb" and so on, with room in front of each.
     for (const uint32_t count : {5u, 100u}) {
         EntryList list(false);
@@ -122,13 +122,15 @@ TEST(EntryList, PlaceOfAMissingKeyIsInFrontOfTheNextKey) {
             InsertSorted(list, std::u16string(i + 1, u'b'), i);
         }
         for (uint32_t i = 0; i < count; ++i) {
-            const EntryList::Place place = list.FindPlace(std::u16string(i, u'b') + u'a');
-            EXPECT_EQ(place.entry, nullptr);
-            EXPECT_EQ(list.IndexOf(place.position), i);
+            const std::u16string key = std::u16string(i, u'b') + u'a';
+            InsertSorted(list, key, count + i);
+            const NodeEntry* entry = list.Find(key);
+            ASSERT_EQ(NumberOf(*entry), count + i);
+            EXPECT_EQ(list.IndexOf(list.Locate(entry)), i);
+            Remove(list, list.Locate(entry));
         }
-        const EntryList::Place behind = list.FindPlace(u"c");
-        EXPECT_EQ(behind.entry, nullptr);
-        EXPECT_TRUE(behind.position.IsEnd());
+        InsertSorted(list, u"c", count);
+        EXPECT_EQ(Walk(list), UpTo(count + 1));
     }
 }
 
@@ -428,14 +430,13 @@ class SortedModel {
         ASSERT_EQ(list.Find(key), place.entry);
         if (isThere) {
             ASSERT_EQ(NumberOf(*place.entry), item->second);
-            ASSERT_EQ(list.At(place.position), place.entry);
-            ASSERT_EQ(list.Locate(place.entry), place.position);
+            ASSERT_EQ(list.At(list.Locate(place.entry)), place.entry);
         }
         if (!isThere) {
             list.Insert(place.position, MakeNumbered(key, made));
             items.emplace(Folded(key), made++);
         } else if (random.Below(2) == 0) {
-            Remove(list, place.position);
+            Remove(list, list.Locate(place.entry));
             items.erase(item);
         }
         ASSERT_EQ(list.Size(), items.size());
@@ -570,6 +571,60 @@ TEST(EntryList, PiecesThatGoFromALongOrderedListLeaveTheOthersFindable) {
     for (EntryPosition position = list.Begin(); !position.IsEnd(); position = list.Next(position)) {
         ASSERT_EQ(list.Locate(list.At(position)), position);
         ASSERT_EQ(list.Find(list.At(position)->Key().View()), list.At(position));
+    }
+}
+
+TEST(EntryList, PlainAndOtherKeysMixInASortedList) {
+    EntryList list(false);
+    InsertSorted(list, u"d", 4);
+    InsertSorted(list, u"a", 0);
+    // The full-width c, and a key with a mark, which come into an array that isn't in order yet.
+    InsertSorted(list, u"\uFF23", 3);
+    InsertSorted(list, u"b-", 2);
+    InsertSorted(list, u"b", 1);
+    EXPECT_EQ(NumberOf(*list.Find(u"c")), 3u);
+    EXPECT_EQ(NumberOf(*list.FindPlace(u"C").entry), 3u);
+    EXPECT_EQ(NumberOf(*list.Find(u"\uFF41")), 0u);
+    EXPECT_EQ(list.Find(u"-b"), nullptr);
+    EXPECT_EQ(Walk(list), UpTo(5));
+}
+
+TEST(EntryList, SortedListThatGrowsLongIsInOrderAllTheWay) {
+    EntryList list(false);
+    for (uint32_t i = 0; i < 100; ++i) {
+        const uint32_t number = i * 37 % 100;
+        const char16_t key[] = {static_cast<char16_t>(u'0' + number / 10), static_cast<char16_t>(u'0' + number % 10)};
+        InsertSorted(list, {key, 2}, number);
+        if (i % 9 == 8) {
+            const std::vector<uint32_t> numbers = Walk(list);
+            ASSERT_TRUE(std::is_sorted(numbers.begin(), numbers.end()));
+            ASSERT_EQ(numbers.size(), i + 1);
+        }
+    }
+    EXPECT_EQ(Walk(list), UpTo(100));
+}
+
+TEST(EntryList, WalkGoesOnInOrderBehindWhatWasInsertedMeanwhile) {
+    EntryList list(false);
+    InsertSorted(list, u"b", 0);
+    InsertSorted(list, u"d", 1);
+    const EntryPosition position = list.Begin();
+    const NodeEntry* entry = list.At(position);
+    InsertSorted(list, u"c", 2);
+    InsertSorted(list, u"a", 3);
+    EXPECT_EQ(NumberOf(*list.At(list.Following(position, entry))), 2u);
+}
+
+TEST(EntryList, VisitReachesEveryEntryOnce) {
+    for (const uint32_t count : {0u, 7u, 200u}) {
+        EntryList list(false);
+        for (uint32_t i = 0; i < count; ++i) {
+            InsertSorted(list, KeyOf(count - 1 - i), i);
+        }
+        std::vector<uint32_t> numbers;
+        list.VisitUnordered([&](const NodeEntry* visited) { numbers.push_back(NumberOf(*visited)); });
+        std::sort(numbers.begin(), numbers.end());
+        EXPECT_EQ(numbers, UpTo(count));
     }
 }
 
