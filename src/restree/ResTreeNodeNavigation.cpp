@@ -150,7 +150,7 @@ class ClimbingPath {
             return false;
         }
         first -= name.size();
-        std::copy(name.begin(), name.end(), &units[first]);
+        std::copy(name.begin(), name.end(), units.data() + first);
         units[--first] = u'/';
         return true;
     }
@@ -161,7 +161,7 @@ class ClimbingPath {
         return unit != u'/' && unit < 0x80 && qn::dsc::osdep::asciiWeights[unit] != 0;
     }
 
-    std::u16string_view View() const { return {&units[first], size - first}; }
+    std::u16string_view View() const { return {units.data() + first, size - first}; }
 
   private:
     static constexpr size_t size = 256;

@@ -8,8 +8,10 @@
 #include <cstring>
 #include <memory>
 #include <string_view>
+#include <utility>
 
 #include "qn/dsc/StringBase.h"
+#include "qn/dsc/Utf8ToWide.h"
 
 namespace qn::dsc {
 
@@ -34,6 +36,15 @@ class TextBuilder {
             Grow(1);
         }
         units[size++] = unit;
+    }
+
+    // Appends text of ASCII, one unit for each byte.
+    void AppendAscii(std::string_view part) {
+        if (part.size() > capacity - size) [[unlikely]] {
+            Grow(part.size());
+        }
+        WidenAscii(part.data(), part.size(), units + size);
+        size += part.size();
     }
 
     bool IsEmpty() const { return size == 0; }

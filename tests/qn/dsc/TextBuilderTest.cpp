@@ -68,5 +68,15 @@ TEST(TextBuilder, TakesAPieceOfExactlyTheRoomThatIsLeft) {
     }
 }
 
+TEST(TextBuilder, WidensAscii) {
+    for (size_t length = 0; length <= 300; length += length < 40 ? 1 : 20) {
+        TextBuilder builder;
+        builder.Append(u'<');
+        builder.AppendAscii(std::string(length, 'a'));
+        builder.Append(u'>');
+        EXPECT_EQ(builder.View(), u'<' + std::u16string(length, u'a') + u'>');
+    }
+}
+
 }  // namespace
 }  // namespace qn::dsc
