@@ -48,15 +48,15 @@ class MapParameters : public Parameters {
 class InstanceParameters : public Parameters {
   public:
     // `variable` may be empty. Both texts outlive the object.
-    InstanceParameters(const String& name, const String& variable, int32_t index)
+    InstanceParameters(std::u16string_view name, std::u16string_view variable, int32_t index)
         : instanceName(name), variable(variable), index(index) {}
 
     bool IsEmpty() const override { return false; }
     bool AppendValue(std::u16string_view name, TextBuilder& text) const override;
 
   private:
-    const String& instanceName;
-    const String& variable;
+    std::u16string_view instanceName;
+    std::u16string_view variable;
     int32_t index;
 };
 

@@ -105,24 +105,18 @@ TEST(HasVariables, TellsAMark) {
 }
 
 TEST(InstanceParameters, AreTheNameAndTheLoopVariable) {
-    const String name(u"Bank7");
-    const String variable(u"i");
-    const InstanceParameters parameters(name, variable, -2147483647 - 1);
+    const InstanceParameters parameters(u"Bank7", u"i", -2147483647 - 1);
     EXPECT_FALSE(parameters.IsEmpty());
     EXPECT_EQ(ExactText(ExpandVariables(u"#{name} #{NAME} #{i} #{I} #{j} #{}", parameters)),
               "Bank7 Bank7 -2147483648 -2147483648 #{j} #{}");
 }
 
 TEST(InstanceParameters, EmptyVariableIsNone) {
-    const String name(u"Bank7");
-    const String variable;
-    EXPECT_EQ(ExactText(ExpandVariables(u"#{name}#{}#{ }", InstanceParameters(name, variable, 1))), "Bank7#{}#{}");
+    EXPECT_EQ(ExactText(ExpandVariables(u"#{name}#{}#{ }", InstanceParameters(u"Bank7", u"", 1))), "Bank7#{}#{}");
 }
 
 TEST(InstanceParameters, NameWinsOverAVariableOfThatName) {
-    const String name(u"x");
-    const String variable(u"Name");
-    EXPECT_EQ(ExactText(ExpandVariables(u"#{name}", InstanceParameters(name, variable, 1))), "x");
+    EXPECT_EQ(ExactText(ExpandVariables(u"#{name}", InstanceParameters(u"x", u"Name", 1))), "x");
 }
 
 TEST(ExpandVariables, WithoutAnyParameterTheTextStaysWithItsBlanks) {
