@@ -38,7 +38,7 @@ void ChooseLanguage(String& chosen) {
 
 }  // namespace
 
-String GetResourceLanguage() {
+const String& GetResourceLanguage() {
     static String resourceLanguage;
     if (resourceLanguage.IsEmpty()) {
         ChooseLanguage(resourceLanguage);

@@ -1,8 +1,9 @@
 #include "restree/AttributeList.h"
 
 #include <algorithm>
+#include <cstring>
 
-#include "qn/dsc/osdep/Compare.h"
+#include "restree/SoughtName.h"
 #include "restree/TextList.h"
 #include "restree/Utf8Text.h"
 
@@ -15,26 +16,48 @@ struct KnownName {
     std::u16string_view wide;
 };
 
-// In the order of AttributeName.
+// In the order of AttributeName, so that those of one length stand together.
 constexpr std::array<KnownName, 10> knownNames = {{{"name", u"name"},
-                                                   {"names", u"names"},
-                                                   {"prototype", u"prototype"},
+                                                   {"next", u"next"},
                                                    {"type", u"type"},
+                                                   {"what", u"what"},
+                                                   {"names", u"names"},
                                                    {"ordered", u"ordered"},
                                                    {"replace", u"replace"},
-                                                   {"next", u"next"},
                                                    {"localize", u"localize"},
-                                                   {"xml:space", u"xml:space"},
-                                                   {"what", u"what"}}};
+                                                   {"prototype", u"prototype"},
+                                                   {"xml:space", u"xml:space"}}};
 
-// Equality under Compare of an ASCII name and any wide one.
-bool EqualsWide(std::string_view name, std::u16string_view wide) {
-    std::array<char16_t, 64> units;
-    if (name.size() > units.size()) {
-        return Widen(name) == wide;
+constexpr size_t longestKnownName = knownNames.back().lowerCase.size();
+
+// By the length of a name, the first known name that is as long or longer.
+constexpr auto firstOfLength = [] {
+    std::array<size_t, longestKnownName + 2> first{};
+    for (size_t length = 0; length < first.size(); ++length) {
+        while (first[length] < knownNames.size() && knownNames[first[length]].lowerCase.size() < length) {
+            ++first[length];
+        }
     }
-    std::copy(name.begin(), name.end(), units.begin());
-    return qn::dsc::osdep::Equal({units.data(), name.size()}, wide);
+    return first;
+}();
+
+// Which of them is equal to an attribute's name; their number if none is.
+size_t FindKnownName(std::string_view name, bool isPlain) {
+    if (isPlain) {
+        const size_t length = std::min(name.size(), longestKnownName + 1);
+        for (size_t i = firstOfLength[length]; i < knownNames.size() && knownNames[i].lowerCase.size() == length; ++i) {
+            if (EqualsWord(name, knownNames[i].lowerCase)) {
+                return i;
+            }
+        }
+        return knownNames.size();
+    }
+    const String wide = Widen(name);
+    size_t i = 0;
+    while (i < knownNames.size() && !(wide == knownNames[i].wide)) {
+        ++i;
+    }
+    return i;
 }
 
 }  // namespace
@@ -51,71 +74,68 @@ void AttributeList::Assign(const char* const* attributes) {
         return;
     }
     for (; *attributes != nullptr; attributes += 2) {
-        const std::string_view name = attributes[0];
-        const std::string_view value = attributes[1];
-        const Item item{static_cast<uint32_t>(text.size()), static_cast<uint32_t>(text.size() + name.size() + 1)};
-        text.append(name).push_back('\0');
-        text.append(value).push_back('\0');
+        Item item;
+        item.name = static_cast<uint32_t>(text.size());
+        // With the NULs behind them.
+        text.append(attributes[0], std::strlen(attributes[0]) + 1);
+        item.value = static_cast<uint32_t>(text.size());
+        text.append(attributes[1], std::strlen(attributes[1]) + 1);
+        item.end = static_cast<uint32_t>(text.size());
+        item.hasPlainName = IsPlain(NameOf(item));
         items.push_back(item);
-        Note(name, item.value);
+        Note(item);
     }
 }
 
 // The first of equal names stays.
-void AttributeList::Note(std::string_view name, uint32_t value) {
-    if (IsAscii(name)) {
-        for (size_t i = 0; i < knownCount; ++i) {
-            if (EqualsWord(name, knownNames[i].lowerCase)) {
-                known[i] = std::min(known[i], value);
-                return;
-            }
-        }
-        return;
-    }
-    const String wide = Widen(name);
-    for (size_t i = 0; i < knownCount; ++i) {
-        if (wide == knownNames[i].wide) {
-            known[i] = std::min(known[i], value);
-            return;
-        }
+void AttributeList::Note(const Item& item) {
+    const size_t name = FindKnownName(NameOf(item), item.hasPlainName);
+    if (name < knownCount) {
+        known[name] = std::min(known[name], static_cast<uint32_t>(items.size() - 1));
     }
 }
 
 String AttributeList::Value(AttributeName name) const {
-    return Widen(TextAt(known[static_cast<size_t>(name)]));
+    return Widen(ValueOf(name));
 }
 
-AttributeList::Place AttributeList::Find(std::u16string_view name) const {
-    for (const Item& item : items) {
-        const std::string_view candidate = TextAt(item.name);
-        if (IsAscii(candidate) ? EqualsWide(candidate, name) : Widen(candidate) == name) {
-            return item.value;
+AttributeList::Place AttributeList::Find(const SoughtName& name) const {
+    for (size_t place = 0; place < items.size(); ++place) {
+        if (name.Equals(NameOf(items[place]), items[place].hasPlainName)) {
+            return static_cast<Place>(place);
         }
     }
     return nowhere;
 }
 
-String AttributeList::NameOf(const Item& item) const {
-    return Widen(TextAt(item.name));
+void AttributeList::AppendValueAt(Place place, TextBuilder& target) const {
+    const std::string_view value = ValueOf(items[place]);
+    if (IsAscii(value)) {
+        target.AppendAscii(value);
+    } else {
+        target.Append(Widen(value).View());
+    }
 }
 
-String AttributeList::ValueAt(Place place) const {
-    return Widen(TextAt(place));
+String AttributeList::WideName(const Item& item) const {
+    return Widen(NameOf(item));
 }
 
-bool AttributeList::Is(AttributeName name, std::u16string_view word) const {
-    return Has(name) && Value(name) == word;
+bool AttributeList::IsValue(AttributeName name, std::u16string_view word) const {
+    const std::string_view value = ValueOf(name);
+    return SoughtName(word).Equals(value, IsPlain(value));
 }
 
-bool AttributeList::IsTrue(AttributeName name) const {
-    return Has(name) && ParseBool(Value(name));
+bool AttributeList::IsValueTrue(AttributeName name) const {
+    const std::string_view value = ValueOf(name);
+    return EqualsWord(value, "true") || ParseBool(Widen(value));
 }
 
 std::vector<AttributeList::Attribute> AttributeList::InOrder() const {
     std::vector<Attribute> ordered;
     ordered.reserve(items.size());
     for (const Item& item : items) {
-        ordered.emplace_back(NameOf(item), Widen(TextAt(item.value)));
+        ordered.emplace_back(WideName(item), Widen(ValueOf(item)));
     }
     std::stable_sort(ordered.begin(), ordered.end(),
                      [](const Attribute& left, const Attribute& right) { return left.first < right.first; });

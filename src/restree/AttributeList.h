@@ -11,13 +11,17 @@
 #include <vector>
 
 #include "qn/dsc/StringBase.h"
+#include "qn/dsc/TextBuilder.h"
 
 namespace zkhw {
 
 using qn::dsc::String;
+using qn::dsc::TextBuilder;
 
-// The attributes that the resource language knows.
-enum class AttributeName : uint8_t { Name, Names, Prototype, Type, Ordered, Replace, Next, Localize, XmlSpace, What };
+class SoughtName;
+
+// The attributes that the resource language knows, by the length of their names.
+enum class AttributeName : uint8_t { Name, Next, Type, What, Names, Ordered, Replace, Localize, Prototype, XmlSpace };
 
 class AttributeList {
   public:
@@ -35,20 +39,20 @@ class AttributeList {
     String Value(AttributeName name) const;
 
     // True if the attribute is there and its value equals `word`, or is a true word, by Compare.
-    bool Is(AttributeName name, std::u16string_view word) const;
-    bool IsTrue(AttributeName name) const;
+    bool Is(AttributeName name, std::u16string_view word) const { return Has(name) && IsValue(name, word); }
+    bool IsTrue(AttributeName name) const { return Has(name) && IsValueTrue(name); }
 
     // Where the attribute `name` stands, the first of equal ones; linear. And the value there.
     using Place = uint32_t;
     static constexpr Place nowhere = 0xFFFFFFFF;
-    Place Find(std::u16string_view name) const;
-    String ValueAt(Place place) const;
+    Place Find(const SoughtName& name) const;
+    void AppendValueAt(Place place, TextBuilder& target) const;
 
     // Hands name and place of each to `take`, in document order; equal names all the same.
     template <typename Take>
     void ForEach(Take take) const {
-        for (const Item& item : items) {
-            take(NameOf(item), item.value);
+        for (size_t place = 0; place < items.size(); ++place) {
+            take(WideName(items[place]), static_cast<Place>(place));
         }
     }
 
@@ -57,20 +61,26 @@ class AttributeList {
 
   private:
     struct Item {
-        uint32_t name;  // Offsets into `text`, of NUL-terminated texts.
+        uint32_t name;  // Offsets into `text`, of NUL-terminated texts; the next item's name is at `end`.
         uint32_t value;
+        uint32_t end;
+        bool hasPlainName;
     };
     static constexpr uint32_t absent = 0xFFFFFFFF;
     static constexpr size_t knownCount = 10;
 
-    std::string_view TextAt(uint32_t offset) const { return text.data() + offset; }
-    String NameOf(const Item& item) const;
-    void Note(std::string_view name, uint32_t value);
+    std::string_view NameOf(const Item& item) const { return {text.data() + item.name, item.value - item.name - 1}; }
+    std::string_view ValueOf(const Item& item) const { return {text.data() + item.value, item.end - item.value - 1}; }
+    std::string_view ValueOf(AttributeName name) const { return ValueOf(items[known[static_cast<size_t>(name)]]); }
+    String WideName(const Item& item) const;
+    bool IsValue(AttributeName name, std::u16string_view word) const;
+    bool IsValueTrue(AttributeName name) const;
+    void Note(const Item& item);
 
     std::string text;
     std::vector<Item> items;  // In document order; equal names stand here all the same.
     std::array<uint32_t, knownCount> known = {absent, absent, absent, absent, absent,
-                                              absent, absent, absent, absent, absent};  // Offsets of their values.
+                                              absent, absent, absent, absent, absent};  // Where each stands in `items`.
 };
 
 }  // namespace zkhw

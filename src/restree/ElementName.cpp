@@ -23,13 +23,36 @@ qn::dsc::String ElementName::Wide() const {
     return Widen(text);
 }
 
-// Hyphens and apostrophes count in an equality of ASCII texts, so letter by letter is enough here.
+// Hyphens and apostrophes count in an equality of ASCII texts, so letter by letter is enough here. The last letter
+// leaves one word at most.
 void ElementName::ClassifyAscii() {
-    isLink = EqualsWord(text, ":link");
-    isInclude = EqualsWord(text, ":include");
-    isReserves = EqualsWord(text, "reserves");
-    endsInPathOrDir = EndsWithWord(text, "path") || EndsWithWord(text, "dir");
-    endsInList = EndsWithWord(text, "list");
+    isLink = false;
+    isInclude = false;
+    isReserves = false;
+    endsInPathOrDir = false;
+    endsInList = false;
+    switch (text.empty() ? '\0' : LowerAscii(text.back())) {
+        case 'k':
+            isLink = EqualsWord(text, ":link");
+            break;
+        case 'e':
+            isInclude = EqualsWord(text, ":include");
+            break;
+        case 's':
+            isReserves = EqualsWord(text, "reserves");
+            break;
+        case 'h':
+            endsInPathOrDir = EndsWithWord(text, "path");
+            break;
+        case 'r':
+            endsInPathOrDir = EndsWithWord(text, "dir");
+            break;
+        case 't':
+            endsInList = EndsWithWord(text, "list");
+            break;
+        default:
+            break;
+    }
 }
 
 // Other scripts have letters that equal ASCII ones but for their width, and signs that count for nothing.

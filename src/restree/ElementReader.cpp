@@ -18,6 +18,36 @@ namespace zkhw {
 
 using qn::dsc::osdep::JoinPath;
 
+namespace {
+
+// A file path of pieces that are joined one by one. In a text without backslashes no piece is an absolute path, and
+// that comes to this: a run of slashes is one separator, and none at the front. Written over the text itself, which
+// saves the memory for a copy; gives its new end.
+char* JoinPlainPieces(char* begin, const char* end) {
+    char* joined = begin;
+    for (const char* next = begin; next != end; ++next) {
+        if (*next != '/') {
+            *joined++ = *next;
+        } else if (joined != begin && joined[-1] != '\\') {
+            *joined++ = '\\';
+        }
+    }
+    return joined;
+}
+
+// The same for any text.
+String JoinPieces(std::string_view text) {
+    std::vector<String> pieces;
+    SplitList(Widen(text).View(), u'/', pieces, false);
+    String path;
+    for (const String& piece : pieces) {
+        qn::dsc::osdep::AppendPathPart(path, piece);
+    }
+    return path;
+}
+
+}  // namespace
+
 void ElementReader::FlushPendingElement(ElementMode mode, std::string_view nextName,
                                         const char* const* nextAttributes) {
     if (frame.position != nullptr) {
@@ -191,25 +221,19 @@ void ElementReader::MakeValue(String&& entryName) {
     frame.xmlDepth = 0;
 }
 
-String ElementReader::ReadValueText(bool isPath) const {
+String ElementReader::ReadValueText(bool isPath) {
     std::string_view text = frame.text;
     if (!Attributes().Is(AttributeName::XmlSpace, u"preserve")) {
-        constexpr std::string_view blanks = " \t\r\n";
-        const size_t first = text.find_first_not_of(blanks);
-        text = first == std::string_view::npos ? std::string_view()
-                                               : text.substr(first, text.find_last_not_of(blanks) + 1 - first);
+        text = TrimmedPart(text);
     }
-    String wide = Widen(text);
     if (!isPath) {
-        return wide;
+        return Widen(text);
     }
-    std::vector<String> pieces;
-    SplitList(wide.View(), u'/', pieces, false);
-    String path;
-    for (const String& piece : pieces) {
-        qn::dsc::osdep::AppendPathPart(path, piece);
+    if (text.find('\\') != std::string_view::npos) {
+        return JoinPieces(text);
     }
-    return path;
+    char* begin = frame.text.data() + (text.data() - frame.text.data());
+    return Widen({begin, JoinPlainPieces(begin, begin + text.size())});
 }
 
 void ElementReader::MakeOrdinaryValue(String&& text, bool isReferenceList) {

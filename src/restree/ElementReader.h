@@ -34,7 +34,7 @@ class ElementReader {
     ResTreeNode* Lookup(const String& path);
 
     void MakeValue(String&& entryName);
-    String ReadValueText(bool isPath) const;
+    String ReadValueText(bool isPath);
     void MakeOrdinaryValue(String&& text, bool isReferenceList);
     void StoreText(String&& text, EntryKind kind);
     void MakeLink(String&& entryName, const String& text);

@@ -17,12 +17,12 @@ void ReplicateInstances(ParseFrame& frame) {
             node.CloneSubtreeBehind(last, record.name.View(), *pattern, frame.mergeExisting, copy);
         if (copy != nullptr) {
             last = placed;
-            copy->ApplyInstance(record.name, record.variable, record.index);
+            copy->ApplyInstance(record.name.View(), record.variable, record.index);
         }
     }
     // The pattern stays unexpanded until all copies have been made from it.
     const InstanceRecord& first = frame.instances.front();
-    pattern->ApplyInstance(first.name, first.variable, first.index);
+    pattern->ApplyInstance(first.name.View(), first.variable, first.index);
 }
 
 }  // namespace zkhw

@@ -3,6 +3,8 @@
 #include <string_view>
 #include <vector>
 
+#include "qn/dsc/FindUnit.h"
+#include "qn/dsc/TextBuilder.h"
 #include "qn/dsc/osdep/Compare.h"
 #include "restree/TextList.h"
 
@@ -10,6 +12,7 @@ namespace zkhw {
 
 namespace {
 
+using qn::dsc::TextBuilder;
 using qn::dsc::osdep::Equal;
 
 constexpr std::u16string_view separator = u"/";
@@ -20,6 +23,69 @@ bool IsSameComponent(const PieceReader& a, const PieceReader& b) {
         return Equal(a.Raw(), b.Raw());
     }
     return UnescapeText(a.Raw(), separator) == UnescapeText(b.Raw(), separator);
+}
+
+bool HasBackslash(std::u16string_view text) {
+    return qn::dsc::FindUnit(text, u'\\') != text.size();
+}
+
+// Appends the components of a path from that of `reader` on; `isFirst` if nothing of the path stands in front of them.
+void AppendComponents(TextBuilder& result, PieceReader& reader, bool isFirst) {
+    if (!isFirst) {
+        result.Append(separator);
+    }
+    if (!HasBackslash(reader.RawToTheEnd())) {
+        // As nearly always: the components stand as they are, with the separators between them.
+        result.Append(reader.RawToTheEnd());
+        return;
+    }
+    const String first = UnescapeText(reader.Raw(), separator);
+    result.Append(isFirst ? first.View() : EscapeText(first, separator).View());
+    while (reader.Next()) {
+        // The component takes the escapes that EscapeText gives it, which need not be those that it has here: a
+        // backslash before any other unit stands for itself and gets another one.
+        result.Append(separator);
+        result.Append(EscapeText(UnescapeText(reader.Raw(), separator), separator).View());
+    }
+}
+
+// Appends what MakeRelativeNodePath gives.
+void AppendRelativePath(TextBuilder& result, std::u16string_view target, std::u16string_view base) {
+    PieceReader targetReader(target, separator, false);
+    PieceReader baseReader(base, separator, false);
+    bool hasTarget = targetReader.Next();
+    bool hasBase = baseReader.Next();
+    while (hasTarget && hasBase && IsSameComponent(targetReader, baseReader)) {
+        hasTarget = targetReader.Next();
+        hasBase = baseReader.Next();
+    }
+    if (hasBase) {
+        result.Append(u"..");
+        while (baseReader.Next()) {
+            result.Append(u"/..");
+        }
+    }
+    if (hasTarget) {
+        AppendComponents(result, targetReader, !hasBase);
+    }
+}
+
+// RebaseListPaths for a list without backslashes: there is nothing to take the escapes out of, and nothing that a piece
+// of the result needs them for. `base` may have them, but none of it gets into the result.
+String RebasePlainList(std::u16string_view list, std::u16string_view base) {
+    TextBuilder result;
+    PieceReader pieces(list, u",", true);
+    for (bool isFirst = true; pieces.Next(); isFirst = false) {
+        if (!isFirst) {
+            result.Append(u',');
+        }
+        if (pieces.Raw().starts_with(u'/')) {
+            AppendRelativePath(result, pieces.Raw(), base);
+        } else {
+            result.Append(pieces.Raw());
+        }
+    }
+    return result.Text();
 }
 
 }  // namespace
@@ -39,34 +105,15 @@ String JoinDisplayPath(TextArgument parentPath, TextArgument name, const String*
 }
 
 String MakeRelativeNodePath(TextArgument target, TextArgument base) {
-    PieceReader targetReader(target.View(), separator, false);
-    PieceReader baseReader(base.View(), separator, false);
-    bool hasTarget = targetReader.Next();
-    bool hasBase = baseReader.Next();
-    while (hasTarget && hasBase && IsSameComponent(targetReader, baseReader)) {
-        hasTarget = targetReader.Next();
-        hasBase = baseReader.Next();
-    }
-    String result;
-    if (hasBase) {
-        result.Append(u"..");
-        while (baseReader.Next()) {
-            result.Append(u"/..");
-        }
-    } else if (hasTarget) {
-        result = UnescapeText(targetReader.Raw(), separator);
-        hasTarget = targetReader.Next();
-    }
-    for (; hasTarget; hasTarget = targetReader.Next()) {
-        // The component takes the escapes that EscapeText gives it, which need not be those that it has here: a
-        // backslash before any other unit stands for itself and gets another one.
-        result.Append(separator);
-        result.Append(EscapeText(UnescapeText(targetReader.Raw(), separator), separator));
-    }
-    return result;
+    TextBuilder result;
+    AppendRelativePath(result, target.View(), base.View());
+    return result.Text();
 }
 
 String RebaseListPaths(TextArgument list, TextArgument base) {
+    if (!HasBackslash(list.View())) {
+        return RebasePlainList(list.View(), base.View());
+    }
     std::vector<String> pieces;
     SplitList(list, u',', pieces, true);
     for (String& piece : pieces) {

@@ -5,6 +5,7 @@
 
 #include "qn/dsc/osdep/Compare.h"
 #include "restree/ParseStack.h"
+#include "restree/SoughtName.h"
 
 namespace zkhw {
 
@@ -79,8 +80,9 @@ const String& OpenElementParameters::DocumentRootPath() const {
     return *documentRootPath;
 }
 
-bool OpenElementParameters::AppendValue(std::u16string_view name, std::u16string& text) const {
-    if (Equal(name, nameKey)) {
+bool OpenElementParameters::AppendValue(std::u16string_view name, TextBuilder& text) const {
+    const SoughtName sought(name);
+    if (sought.Equals("name", true)) {
         return false;
     }
     ++questions;
@@ -92,7 +94,7 @@ bool OpenElementParameters::AppendValue(std::u16string_view name, std::u16string
         if (HasLoopVariable(*frame, name)) {
             return false;
         }
-        const AttributeList::Place found = frame->pendingAttributes.Find(name);
+        const AttributeList::Place found = frame->pendingAttributes.Find(sought);
         if (found != AttributeList::nowhere) {
             outermost = {frame, found};
         }
@@ -105,11 +107,11 @@ bool OpenElementParameters::AppendValue(std::u16string_view name, std::u16string
         outermost = further.frame == nullptr ? outermost : further;
     }
     if (outermost.frame != nullptr) {
-        text.append(outermost.frame->pendingAttributes.ValueAt(outermost.place).View());
+        outermost.frame->pendingAttributes.AppendValueAt(outermost.place, text);
         return true;
     }
     if (stack.GetDocumentRoot() != nullptr && Equal(name, documentRootKey)) {
-        text.append(DocumentRootPath().View());
+        text.Append(DocumentRootPath().View());
         return true;
     }
     return false;

@@ -25,7 +25,7 @@ class OpenElementParameters : public Parameters {
     ~OpenElementParameters() override;
 
     bool IsEmpty() const override;
-    bool AppendValue(std::u16string_view name, std::u16string& text) const override;
+    bool AppendValue(std::u16string_view name, TextBuilder& text) const override;
 
   private:
     // After so many questions the top frame is taken in too: it may have as many attributes as there are questions.

@@ -2,16 +2,18 @@
 
 #include <vector>
 
+#include "qn/dsc/FindUnit.h"
 #include "qn/dsc/osdep/Compare.h"
 #include "qn/dsc/osdep/IntegerToString.h"
 #include "restree/EntryWalk.h"
 #include "restree/ReleaseScope.h"
 #include "restree/ResTreeNode.h"
 #include "restree/TextList.h"
-#include "restree/Utf8Text.h"
 
 namespace zkhw {
 
+using qn::dsc::FindUnit;
+using qn::dsc::osdep::DecimalText;
 using qn::dsc::osdep::Equal;
 
 namespace {
@@ -19,32 +21,37 @@ namespace {
 constexpr std::u16string_view openMark = u"#{";
 constexpr std::u16string_view nameKey = u"name";
 
-std::u16string_view TrimBlanks(std::u16string_view text) {
-    constexpr std::u16string_view blanks = u" \t\r\n";
-    const size_t first = text.find_first_not_of(blanks);
-    return first == std::u16string_view::npos ? std::u16string_view()
-                                              : text.substr(first, text.find_last_not_of(blanks) + 1 - first);
+// The offset of the next "#{", or the size. A "#" is looked for by itself: texts hardly ever hold one for anything
+// else.
+size_t FindOpenMark(std::u16string_view text, size_t from) {
+    size_t at = FindUnit(text, openMark[0], from);
+    while (at + 1 < text.size() && text[at + 1] != openMark[1]) {
+        at = FindUnit(text, openMark[0], at + 1);
+    }
+    return at + 1 < text.size() ? at : text.size();
+}
+
+// Equal, and quicker for names that are spelled alike, as nearly all are.
+bool IsSameName(std::u16string_view a, std::u16string_view b) {
+    return a == b || Equal(a, b);
 }
 
 }  // namespace
 
-bool MapParameters::AppendValue(std::u16string_view name, std::u16string& text) const {
+bool MapParameters::AppendValue(std::u16string_view name, TextBuilder& text) const {
     const auto found = values.find(String(name));
     if (found == values.end()) {
         return false;
     }
-    text.append(found->second.View());
+    text.Append(found->second.View());
     return true;
 }
 
-InstanceParameters::InstanceParameters(const String& name, const String& variable, int32_t index)
-    : instanceName(name), variable(variable), index(qn::dsc::osdep::IntegerToString(index, 10)) {}
-
-bool InstanceParameters::AppendValue(std::u16string_view name, std::u16string& text) const {
-    if (Equal(name, nameKey)) {
-        text.append(instanceName.View());
-    } else if (!variable.IsEmpty() && Equal(name, variable.View())) {
-        text.append(index.View());
+bool InstanceParameters::AppendValue(std::u16string_view name, TextBuilder& text) const {
+    if (IsSameName(name, nameKey)) {
+        text.Append(instanceName);
+    } else if (!variable.empty() && IsSameName(name, variable)) {
+        text.Append(DecimalText(index).View());
     } else {
         return false;
     }
@@ -52,7 +59,7 @@ bool InstanceParameters::AppendValue(std::u16string_view name, std::u16string& t
 }
 
 bool HasVariables(const String& text) {
-    return text.View().find(openMark) != std::u16string_view::npos;
+    return FindOpenMark(text.View(), 0) != text.View().size();
 }
 
 String ExpandVariables(const String& text, const Parameters& parameters) {
@@ -60,32 +67,27 @@ String ExpandVariables(const String& text, const Parameters& parameters) {
         return text;
     }
     const std::u16string_view source = text.View();
-    // Kept from one text to the next: nearly every text of a copy comes through here.
-    static thread_local std::u16string result;
-    result.clear();
+    TextBuilder result;
     size_t done = 0;
-    size_t open = source.find(openMark);
-    while (open != std::u16string_view::npos) {
-        const size_t close = source.find(u'}', open + openMark.size());
-        if (close == std::u16string_view::npos) {
+    size_t open = FindOpenMark(source, 0);
+    while (open < source.size()) {
+        const size_t inside = open + openMark.size();
+        const size_t close = FindUnit(source, u'}', inside);
+        if (close == source.size()) {
             break;
         }
-        result.append(source.substr(done, open - done));
-        const std::u16string_view key =
-            TrimBlanks(source.substr(open + openMark.size(), close - open - openMark.size()));
+        result.Append(source.substr(done, open - done));
+        const std::u16string_view key = TrimmedPart(source.substr(inside, close - inside));
         if (!parameters.AppendValue(key, result)) {
-            result.append(openMark).append(key).push_back(u'}');
+            result.Append(openMark);
+            result.Append(key);
+            result.Append(u'}');
         }
         done = close + 1;
-        open = source.find(openMark, done);
+        open = FindOpenMark(source, done);
     }
-    result.append(source.substr(done));
-    String expanded{std::u16string_view(result)};
-    constexpr size_t keptCapacity = 65536;
-    if (result.capacity() > keptCapacity) {
-        result = std::u16string();
-    }
-    return expanded;
+    result.Append(source.substr(done));
+    return result.Text();
 }
 
 // --- Expansion in a subtree ---
@@ -96,26 +98,30 @@ void ResTreeNode::ApplyParameters(const Parameters& parameters) {
         EntryWalk walk;
     };
     const ReleaseScope scope;
-    std::vector<Level> levels;
+    // The outermost level stands apart, since most copies have no other and need no memory then.
+    Level outermost{this, {}};
+    std::vector<Level> inner;
     EnsureDeferredLoaded();
-    levels.push_back({this, {}});
-    while (!levels.empty()) {
-        Level& level = levels.back();
+    while (true) {
+        Level& level = inner.empty() ? outermost : inner.back();
         NodeEntry* entry = level.walk.Next(level.node->entries);
         if (entry == nullptr) {
-            levels.pop_back();
+            if (inner.empty()) {
+                return;
+            }
+            inner.pop_back();
         } else if (const String* text = entry->Text()) {
             if (HasVariables(*text)) {
                 level.node->SetEntryText(entry, ExpandVariables(*text, parameters));
             }
         } else if (ResTreeNode* child = entry->Child()) {
             child->EnsureDeferredLoaded();
-            levels.push_back({child, {}});
+            inner.push_back({child, {}});
         }
     }
 }
 
-void ResTreeNode::ApplyInstance(const String& instanceName, const String& variable, int32_t index) {
+void ResTreeNode::ApplyInstance(std::u16string_view instanceName, std::u16string_view variable, int32_t index) {
     ApplyParameters(InstanceParameters(instanceName, variable, index));
 }
 

@@ -5,14 +5,16 @@
 
 #include <cstdint>
 #include <map>
-#include <string>
 #include <string_view>
+#include <utility>
 
 #include "qn/dsc/StringBase.h"
+#include "qn/dsc/TextBuilder.h"
 
 namespace zkhw {
 
 using qn::dsc::String;
+using qn::dsc::TextBuilder;
 
 class Parameters {
   public:
@@ -25,7 +27,7 @@ class Parameters {
     virtual bool IsEmpty() const = 0;
 
     // Appends the value of the parameter `name`, blind to letter case. False if there is none.
-    virtual bool AppendValue(std::u16string_view name, std::u16string& text) const = 0;
+    virtual bool AppendValue(std::u16string_view name, TextBuilder& text) const = 0;
 };
 
 // From name to value, blind to letter case.
@@ -36,7 +38,7 @@ class MapParameters : public Parameters {
     explicit MapParameters(ParameterMap&& values) : values(std::move(values)) {}
 
     bool IsEmpty() const override { return values.empty(); }
-    bool AppendValue(std::u16string_view name, std::u16string& text) const override;
+    bool AppendValue(std::u16string_view name, TextBuilder& text) const override;
 
   private:
     ParameterMap values;
@@ -46,15 +48,16 @@ class MapParameters : public Parameters {
 class InstanceParameters : public Parameters {
   public:
     // `variable` may be empty. Both texts outlive the object.
-    InstanceParameters(const String& name, const String& variable, int32_t index);
+    InstanceParameters(std::u16string_view name, std::u16string_view variable, int32_t index)
+        : instanceName(name), variable(variable), index(index) {}
 
     bool IsEmpty() const override { return false; }
-    bool AppendValue(std::u16string_view name, std::u16string& text) const override;
+    bool AppendValue(std::u16string_view name, TextBuilder& text) const override;
 
   private:
-    const String& instanceName;
-    const String& variable;
-    String index;
+    std::u16string_view instanceName;
+    std::u16string_view variable;
+    int32_t index;
 };
 
 // `text` with every "#{name}" that has a parameter replaced by its value, in one pass. An unknown one stays, without

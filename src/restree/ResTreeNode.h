@@ -337,7 +337,7 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     void ApplyParameters(const Parameters& parameters);
 
     // ApplyParameters with "name" and, unless `variable` is empty, the loop variable.
-    void ApplyInstance(const String& instanceName, const String& variable, int32_t index);
+    void ApplyInstance(std::u16string_view instanceName, std::u16string_view variable, int32_t index);
 
   private:
     friend class ChangeDispatch;

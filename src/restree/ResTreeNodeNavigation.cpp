@@ -1,10 +1,12 @@
 // From a path to a node and back.
 
 #include <algorithm>
+#include <array>
 #include <memory>
 #include <utility>
 #include <vector>
 
+#include "qn/dsc/FindUnit.h"
 #include "qn/dsc/osdep/Compare.h"
 #include "restree/NodePath.h"
 #include "restree/ReleaseScope.h"
@@ -110,6 +112,10 @@ std::vector<ResTreeNode*> WayFromRoot(const ResTreeNode* node) {
     return way;
 }
 
+bool NeedsNoEscapes(std::u16string_view name) {
+    return qn::dsc::FindEither(name, u'/', u'\\') == name.size();
+}
+
 // A path that is built from the root downward, as JoinEscapedPath does it, but in place.
 class GrowingPath {
   public:
@@ -120,10 +126,10 @@ class GrowingPath {
         } else {
             path.Append(u"/");
         }
-        if (part.find_first_of(u"/\\") == std::u16string_view::npos) {
+        if (NeedsNoEscapes(part)) {
             path.Append(part);
         } else {
-            path.Append(EscapeText(String(part), u'/').View());
+            path.Append(EscapeText(part, u'/').View());
         }
         // With a second slash a path is never "/" again, so the comparisons are linear in all.
         isRoot = isRoot && Compare(path.View(), u"/") == 0;
@@ -135,9 +141,46 @@ class GrowingPath {
     bool isRoot = true;
 };
 
+// A path of up to 256 units that is written from its end, in one climb and without memory.
+class ClimbingPath {
+  public:
+    // Puts a slash and `name` in front; false if that is not possible.
+    bool Prepend(std::u16string_view name) {
+        if (name.size() >= first || !NeedsNoEscapes(name)) {
+            return false;
+        }
+        first -= name.size();
+        std::copy(name.begin(), name.end(), units.data() + first);
+        units[--first] = u'/';
+        return true;
+    }
+
+    // Whether the path up to its first name counts as something else than "/".
+    bool BeginsWithAName() const {
+        const char16_t unit = first + 1 < size ? units[first + 1] : u'/';
+        return unit != u'/' && unit < 0x80 && qn::dsc::osdep::asciiWeights[unit] != 0;
+    }
+
+    std::u16string_view View() const { return {units.data() + first, size - first}; }
+
+  private:
+    static constexpr size_t size = 256;
+
+    std::array<char16_t, size> units;
+    size_t first = size;
+};
+
 }  // namespace
 
 String ResTreeNode::GetPath() const {
+    ClimbingPath plain;
+    const ResTreeNode* top = this;
+    while (top->parent != nullptr && plain.Prepend(top->name.View())) {
+        top = top->parent;
+    }
+    if (top->parent == nullptr && plain.BeginsWithAName()) {
+        return String(plain.View());
+    }
     GrowingPath path;
     for (const ResTreeNode* node : WayFromRoot(this)) {
         path.Append(node->name.View());

@@ -6,12 +6,17 @@
 #include <optional>
 #include <utility>
 
+#include "qn/dsc/FindUnit.h"
+#include "qn/dsc/TextBuilder.h"
 #include "qn/dsc/osdep/Compare.h"
 
 namespace zkhw {
 
 namespace {
 
+using qn::dsc::FindEither;
+using qn::dsc::FindUnit;
+using qn::dsc::TextBuilder;
 using qn::dsc::osdep::Equal;
 
 // The length of the delimiter at the front of `text`, 0 if it doesn't stand there.
@@ -58,13 +63,19 @@ String EscapeBy(std::u16string_view text, DelimiterAt delimiterAt) {
     return result;
 }
 
+// Whether EscapeText would change the text.
+bool NeedsEscapes(std::u16string_view text, std::u16string_view delimiter) {
+    if (delimiter.size() == 1) {
+        return FindEither(text, delimiter.front(), u'\\') != text.size();
+    }
+    return FindUnit(text, u'\\') != text.size() || (!delimiter.empty() && text.find(delimiter) != text.npos);
+}
+
 // A part of a list with its escapes put in if that is wanted and makes a difference.
 class ListPart {
   public:
     ListPart(std::u16string_view text, std::u16string_view separator, bool escape) : view(text) {
-        const bool mayNeedEscapes =
-            escape && (text.find(u'\\') != text.npos || (!separator.empty() && text.find(separator) != text.npos));
-        if (mayNeedEscapes) {
+        if (escape && NeedsEscapes(text, separator)) {
             escaped.emplace(EscapeText(text, separator));
             view = escaped->View();
         }
@@ -107,8 +118,36 @@ bool PieceReader::Next() {
     return true;
 }
 
-// The offset of the next separator in `rest` that isn't escaped, or npos.
+// The offset of the next separator in `rest` that isn't escaped, or npos; and notes whether a backslash goes by.
 size_t PieceReader::FindSeparator() {
+    if (separator.size() == 1 && separator.front() != u'\\') {
+        return FindSeparatorUnit();
+    }
+    const size_t end = FindLongSeparator();
+    hasBackslash = FindUnit(rest.substr(0, end), u'\\') != std::min(end, rest.size());
+    return end;
+}
+
+// For a separator of one unit that is no backslash, which nearly all are: goes from backslash to backslash.
+size_t PieceReader::FindSeparatorUnit() {
+    const char16_t unit = separator.front();
+    hasBackslash = false;
+    size_t at = 0;
+    while ((at = FindEither(rest, unit, u'\\', at)) < rest.size()) {
+        if (rest[at] == unit) {
+            return at;
+        }
+        hasBackslash = true;
+        // Two backslashes leave what follows them as it is; one takes a separator along.
+        ++at;
+        if (at < rest.size() && (rest[at] == u'\\' || rest[at] == unit)) {
+            ++at;
+        }
+    }
+    return std::u16string_view::npos;
+}
+
+size_t PieceReader::FindLongSeparator() {
     // The run of backslashes is counted as it goes by: looking back from each separator would count a long run anew
     // for every separator that holds a backslash itself.
     size_t backslashes = backslashesBefore;
@@ -148,7 +187,7 @@ String JoinList(TextArgument a, TextArgument b, TextArgument separator, bool esc
 }
 
 String JoinAll(const std::vector<String>& list, TextArgument separator, bool escape) {
-    String result;
+    TextBuilder result;
     bool isFirst = true;
     for (const String& piece : list) {
         if (!isFirst) {
@@ -157,10 +196,13 @@ String JoinAll(const std::vector<String>& list, TextArgument separator, bool esc
         result.Append(ListPart(piece.View(), separator.View(), escape).View());
         isFirst = false;
     }
-    return result;
+    return result.Text();
 }
 
 String EscapeText(TextArgument text, TextArgument delimiter) {
+    if (!NeedsEscapes(text.View(), delimiter.View())) {
+        return String(text.View());
+    }
     return EscapeBy(text.View(),
                     [view = delimiter.View()](std::u16string_view rest) { return LengthAtFront(rest, view); });
 }
@@ -183,10 +225,9 @@ String EscapeText(TextArgument text, CharacterSet delimiters) {
 
 String UnescapeText(TextArgument text, TextArgument delimiter) {
     const std::u16string_view source = text.View();
-    String result;
-    result.Reserve(static_cast<uint32_t>(std::min<size_t>(source.size(), std::numeric_limits<int32_t>::max())));
+    TextBuilder result;
     size_t copied = 0;
-    size_t at = source.find(u'\\');
+    size_t at = FindUnit(source, u'\\');
     while (at < source.size()) {
         const std::u16string_view behind = source.substr(at + 1);
         const size_t escaped = behind.starts_with(u'\\') ? 1 : LengthAtFront(behind, delimiter.View());
@@ -195,25 +236,16 @@ String UnescapeText(TextArgument text, TextArgument delimiter) {
             result.Append(source.substr(copied, at - copied));
             copied = at + 1;
         }
-        at = source.find(u'\\', at + 1 + escaped);
+        at = FindUnit(source, u'\\', at + 1 + escaped);
     }
     result.Append(source.substr(copied));
-    return result;
+    return result.Text();
 }
 
 bool EndsWith(TextArgument text, TextArgument literal) {
     const std::u16string_view whole = text.View();
     const std::u16string_view wanted = literal.View();
     return whole.size() >= wanted.size() && Equal(whole.substr(whole.size() - wanted.size()), wanted);
-}
-
-std::u16string_view TrimmedPart(std::u16string_view text) {
-    constexpr std::u16string_view whitespace = u" \t\r\n";
-    const size_t begin = text.find_first_not_of(whitespace);
-    if (begin == text.npos) {
-        return {};
-    }
-    return text.substr(begin, text.find_last_not_of(whitespace) + 1 - begin);
 }
 
 String TrimWhitespace(TextArgument text) {

@@ -34,11 +34,18 @@ class PieceReader {
     // The piece, with its escapes; UnescapeText gives the text that it stands for.
     std::u16string_view Raw() const { return piece; }
 
-    // Whether Raw differs from the text that it stands for, or might.
-    bool MayHaveEscapes() const { return piece.find(u'\\') != std::u16string_view::npos; }
+    // The text from the piece on, with all that follows it.
+    std::u16string_view RawToTheEnd() const {
+        return {piece.data(), static_cast<size_t>(rest.data() + rest.size() - piece.data())};
+    }
+
+    // Whether there is a backslash in the piece, so that Raw may differ from the text that it stands for.
+    bool MayHaveEscapes() const { return hasBackslash; }
 
   private:
     size_t FindSeparator();
+    size_t FindSeparatorUnit();
+    size_t FindLongSeparator();
 
     // What stands behind the separator found last.
     std::u16string_view rest;
@@ -48,6 +55,7 @@ class PieceReader {
     size_t backslashesBefore = 0;
     bool trims;
     bool isAtEnd;
+    bool hasBackslash = false;
 };
 
 // Appends the pieces of `text` to `list`, each without its escapes: nothing for an empty text. With `trim` blanks,
@@ -89,7 +97,23 @@ bool EndsWith(TextArgument text, TextArgument literal);
 String TrimWhitespace(TextArgument text);
 
 // The same as a part of `text`.
-std::u16string_view TrimmedPart(std::u16string_view text);
+template <typename Unit>
+std::basic_string_view<Unit> TrimmedPartOf(std::basic_string_view<Unit> text) {
+    const auto isBlank = [](Unit unit) { return unit == ' ' || unit == '\t' || unit == '\r' || unit == '\n'; };
+    while (!text.empty() && isBlank(text.front())) {
+        text.remove_prefix(1);
+    }
+    while (!text.empty() && isBlank(text.back())) {
+        text.remove_suffix(1);
+    }
+    return text;
+}
+inline std::u16string_view TrimmedPart(std::u16string_view text) {
+    return TrimmedPartOf(text);
+}
+inline std::string_view TrimmedPart(std::string_view text) {
+    return TrimmedPartOf(text);
+}
 
 // Whether `text` is "true", "yes", "1", "on" or "enable", blind to letter case.
 bool ParseBool(TextArgument text);

@@ -7,17 +7,19 @@
 #include <string_view>
 
 #include "qn/dsc/StringBase.h"
+#include "qn/dsc/Utf8ToWide.h"
 
 namespace zkhw {
+
+inline bool IsAscii(std::string_view text) {
+    return qn::dsc::IsAscii(text.data(), text.size());
+}
 
 // True if libexpat's text can be widened. It has been checked to be UTF-8 already, so only the lead byte of a
 // four-byte sequence is refused.
 inline bool IsWidenable(std::string_view text) {
-    bool refused = false;
-    for (const char byte : text) {
-        refused |= static_cast<unsigned char>(byte) >= 0xF0;
-    }
-    return !refused;
+    return IsAscii(text) ||
+           std::none_of(text.begin(), text.end(), [](char byte) { return static_cast<unsigned char>(byte) >= 0xF0; });
 }
 
 // The wide form; empty if the text is refused.
@@ -27,14 +29,6 @@ inline qn::dsc::String Widen(std::string_view text) {
         wide = qn::dsc::String();
     }
     return wide;
-}
-
-inline bool IsAscii(std::string_view text) {
-    bool found = false;
-    for (const char byte : text) {
-        found |= static_cast<unsigned char>(byte) >= 0x80;
-    }
-    return !found;
 }
 
 constexpr char LowerAscii(char unit) {

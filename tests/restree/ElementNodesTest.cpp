@@ -337,6 +337,22 @@ TEST(ElementNodes, EverythingElseIsFalse) {
     }
 }
 
+TEST(ElementNodes, UnitsThatDoNotCountLeaveAWordTrue) {
+    for (const char* word : {"tr&#127;ue", "&#127;1", "enable&#127;"}) {
+        EXPECT_EQ(TreeOf("<R ordered='" + std::string(word) + "'><A/></R>"), "\nR:R ordered\n  A=\n") << word;
+    }
+    for (const char* word : {"tr-ue", "'true", "true-"}) {
+        EXPECT_EQ(TreeOf("<R ordered=\"" + std::string(word) + "\"><A/></R>"), "\nR:R\n  A=\n") << word;
+    }
+}
+
+TEST(ElementNodes, NamesBesideTheKnownOnesMeanNothing) {
+    for (const char* name : {"nam", "nami", "namess", "Nexts", "typ", "typo", "nome", "order", "ordering", "na-me",
+                             "prototyp", "prototypes", "xml_space", "x"}) {
+        EXPECT_EQ(TreeOf("<R><A " + std::string(name) + "='yes'>v</A></R>"), "\nR:R\n  A=v\n") << name;
+    }
+}
+
 TEST(ElementNodes, NodeOfATypeThatEndsInListIsOrdered) {
     ASSERT_TREE("<FooList><Bar/></FooList>", R"(
 FooList:FooList ordered
@@ -352,6 +368,13 @@ R:R
   b:Lists
   c:Listing
   d:aLisT ordered
+)");
+    ASSERT_TREE("<R><A\xC3\xA9List name='a'/><\xC3\xA9Li-st name='b'/><ist name='c'/><\xC3\xA9 name='d'/></R>", R"(
+R:R
+  a:A{00E9}List ordered
+  b:{00E9}Li-st
+  c:ist
+  d:{00E9}
 )");
 }
 

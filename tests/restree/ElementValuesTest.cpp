@@ -41,6 +41,22 @@ TEST(ElementValues, WordForSpaceIsBlindToCase) {
     EXPECT_EQ(ValueOf("<A XML:SPACE='PreServe'> x </A>"), "A= x ");
 }
 
+TEST(ElementValues, WordForSpaceIsComparedByTheLanguage) {
+    // A delete character counts for nothing, and the width of a letter neither.
+    EXPECT_EQ(ValueOf("<A xml:space='pre&#127;serve'> x </A>"), "A= x ");
+    EXPECT_EQ(ValueOf("<A xml:space='\xEF\xBD\x90reserve'> x </A>"), "A= x ");
+    EXPECT_EQ(ValueOf("<A xml:space='pre-serve'> x </A>"), "A=x");
+}
+
+TEST(ElementValues, TextMayHaveAnyLength) {
+    for (size_t length = 0; length <= 70; ++length) {
+        const std::string text(length, 'x');
+        EXPECT_EQ(ValueOf("<A> " + text + " </A>"), "A=" + text);
+        EXPECT_EQ(ValueOf("<A> " + text + "\xC3\xA9 </A>"), "A=" + text + "{00E9}");
+        EXPECT_EQ(ValueOf("<A>\xC3\xA9" + text + "</A>"), "A={00E9}" + text);
+    }
+}
+
 TEST(ElementValues, TextOfWhiteSpaceAloneIsEmpty) {
     EXPECT_EQ(ValueOf("<A> \n </A>"), "A=");
 }
@@ -153,6 +169,16 @@ TEST(ElementValues, SlashesInOddPlacesOfAPath) {
         {"a/b/", "a\\b\\"},
         {"a//b", "a\\b"},
         {"a///b", "a\\b"},
+        {"a//", "a\\"},
+        {"///", ""},
+        {"/ /", " \\"},
+        {"//a//b//", "a\\b\\"},
+        {"0123456789abcde/0123456789abcdef/0123456789abcdefg", "0123456789abcde\\0123456789abcdef\\0123456789abcdefg"},
+        {"\\", "\\"},
+        {"a\\", "a\\"},
+        {"a/b\\", "a\\b\\"},
+        {"C:", "C:"},
+        {"a/C:/b", "a\\C:\\b"},
         {"a / b", "a \\ b"},
         {"a\\b/c", "a\\b\\c"},
         {"a\\/b/c", "a/b\\c"},
@@ -167,6 +193,10 @@ TEST(ElementValues, SlashesInOddPlacesOfAPath) {
         EXPECT_EQ(ValueOf("<P type='path'>" + std::string(row.text) + "</P>"), "P=" + std::string(row.path))
             << row.text;
     }
+}
+
+TEST(ElementValues, PathMayHoldLettersOfAllScripts) {
+    EXPECT_EQ(ValueOf("<P type='path'>/\xC3\xA9//\xE5\x90\x8D/</P>"), "P={00E9}\\{540D}\\");
 }
 
 TEST(ElementValues, PathIsTrimmedAsAWholeUnlessItsSpaceIsPreserved) {

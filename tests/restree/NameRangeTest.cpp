@@ -17,8 +17,20 @@ std::string Shown(const std::vector<InstanceRecord>& records) {
     std::string shown;
     for (const InstanceRecord& record : records) {
         shown += shown.empty() ? "" : ", ";
-        shown += ExactText(record.name) + " " + (record.variable.IsEmpty() ? "-" : ExactText(record.variable)) + " " +
+        shown += ExactText(record.name) + " " + (record.variable.empty() ? "-" : ExactText(record.variable)) + " " +
                  std::to_string(record.index);
+    }
+    return shown;
+}
+
+// The loop variables of a list, with commas between.
+std::string VariablesOf(const char16_t* names) {
+    std::vector<InstanceRecord> records;
+    std::vector<String> loopVariables;
+    ParseNames(names, records, loopVariables);
+    std::string shown;
+    for (const String& variable : loopVariables) {
+        shown += (shown.empty() ? "" : ", ") + ExactText(variable);
     }
     return shown;
 }
@@ -162,6 +174,28 @@ TEST(NameRange, RecordsAreAppended) {
 
 TEST(NameRange, ListMixesNamesAndRanges) {
     EXPECT_EQ(NamesOf(u"x, P[i=1..2] ,y,Q[2..1],R[a..b]"), "x - 0, P1 i 1, P2 i 2, y - 0, R[a..b] - 0");
+}
+
+TEST(NameRange, ListGivesItsLoopVariables) {
+    EXPECT_EQ(VariablesOf(u"A[i=0..1],B[j=0..1],C[i=0..1]"), "i, j, i");
+    EXPECT_EQ(VariablesOf(u"A[i=0..1],x,B[I=0..1],C[i=0..1]"), "i");
+    EXPECT_EQ(VariablesOf(u"A[i=1..0],B[0..1],x,C[j=]"), "");
+    EXPECT_EQ(NamesOf(u"A[i=0..0],B[j=1..1],C[k=2..2],D[i=3..4],e,F[5..5]"),
+              "A0 i 0, B1 j 1, C2 k 2, D3 i 3, D4 i 4, e - 0, F5 - 5");
+}
+
+TEST(NameRange, VariableOfAnItemWithEscapesLastsAsLongAsTheList) {
+    EXPECT_EQ(NamesOf(u"a\\,b[x\\,y=1..2],c\\,d[z\\,z=3..3],e"), "a,b1 x,y 1, a,b2 x,y 2, c,d3 z,z 3, e - 0");
+}
+
+TEST(NameRange, NamesMayHaveAnyLength) {
+    for (size_t length = 0; length <= 40; ++length) {
+        const std::u16string part(length, u'n');
+        const std::string shown(length, 'n');
+        EXPECT_EQ(NamesOf((part + u"[i=9..10]" + part + u"," + part).c_str()),
+                  shown + "9" + shown + " i 9, " + shown + "10" + shown + " i 10" +
+                      (length == 0 ? ",  - 0" : ", " + shown + " - 0"));
+    }
 }
 
 TEST(NameRange, EscapedCommasBelongToANameOrRange) {

@@ -122,6 +122,32 @@ TEST(MakeRelativeNodePath, EmptyPathsHaveNoComponents) {
     EXPECT_EQ(Relative(u"", u"a/b"), u"../..");
 }
 
+TEST(MakeRelativeNodePath, EmptyComponentsCount) {
+    EXPECT_EQ(Relative(u"/a//b", u"/a"), u"/b");
+    EXPECT_EQ(Relative(u"/a//b", u"/a/"), u"b");
+    EXPECT_EQ(Relative(u"/a/", u"/a"), u"");
+    EXPECT_EQ(Relative(u"/a", u"/a/"), u"..");
+    EXPECT_EQ(Relative(u"/a//", u"/b"), u"../a//");
+    EXPECT_EQ(Relative(u"a", u"/a"), u"../../a");
+}
+
+TEST(MakeRelativeNodePath, BackslashInTheSharedPartOrTheBaseLeavesTheRestAlone) {
+    EXPECT_EQ(Relative(u"/a\\/b/c/d", u"/a\\/b/e"), u"../c/d");
+    EXPECT_EQ(Relative(u"/a/b", u"/c\\/d/e"), u"../../a/b");
+    EXPECT_EQ(Relative(u"/a/b", u"/c\\d"), u"../a/b");
+}
+
+TEST(MakeRelativeNodePath, BackslashFarBehindIsEscapedAnew) {
+    EXPECT_EQ(Relative(u"/a/b/c/d/e/f/g\\h", u"/z"), u"../a/b/c/d/e/f/g\\\\h");
+    EXPECT_EQ(Relative(u"/z/b/c/d/e/f/g\\h", u"/z"), u"b/c/d/e/f/g\\\\h");
+    EXPECT_EQ(Relative(u"/a\\", u"/z"), u"../a\\\\");
+}
+
+TEST(MakeRelativeNodePath, ComponentsOutsideAsciiCompareByTheLanguage) {
+    EXPECT_EQ(Relative(u"/\u00c9/b", u"/\u00e9/c"), u"../b");
+    EXPECT_EQ(Relative(u"/\uff21/b", u"/a"), u"b");
+}
+
 TEST(MakeRelativeNodePath, HundredThousandLevelsTakeLinearTime) {
     std::u16string base;
     std::u16string target;
@@ -159,6 +185,39 @@ TEST(RebaseListPaths, PiecesAreEscapedForTheList) {
     EXPECT_EQ(Rebased(u"a\\,b", u"/"), u"a\\,b");
     // The backslash that escapes the "/" is itself escaped as part of a piece.
     EXPECT_EQ(Rebased(u"/x/a\\/b", u"/y"), u"../x/a\\\\/b");
+}
+
+TEST(RebaseListPaths, BackslashAnywhereEscapesEachPieceAnew) {
+    EXPECT_EQ(Rebased(u"\\, /a/b ,/c", u"/a"), u"\\, /a/b,../c");
+    EXPECT_EQ(Rebased(u"x\\y,/a/b", u"/a"), u"x\\\\y,b");
+    EXPECT_EQ(Rebased(u"/a/b,\\", u"/a"), u"b,\\\\");
+}
+
+TEST(RebaseListPaths, BackslashInTheBaseIsNoneOfTheList) {
+    EXPECT_EQ(Rebased(u"/a/b,/x/c", u"/x\\/y/z"), u"../../a/b,../../x/c");
+    EXPECT_EQ(Rebased(u"/a/b", u"/x\\,y"), u"../a/b");
+}
+
+TEST(RebaseListPaths, BlankPiecesAreEmpty) {
+    EXPECT_EQ(Rebased(u" ", u"/a"), u"");
+    EXPECT_EQ(Rebased(u" , ", u"/a"), u",");
+    EXPECT_EQ(Rebased(u",", u"/a"), u",");
+}
+
+TEST(RebaseListPaths, SlashAloneIsTheRoot) {
+    EXPECT_EQ(Rebased(u"/", u"/a/b"), u"../../");
+    EXPECT_EQ(Rebased(u"/,x", u"/"), u",x");
+    EXPECT_EQ(Rebased(u"//", u"/a"), u"..//");
+}
+
+TEST(RebaseListPaths, ListsMayBeLong) {
+    std::u16string list;
+    std::u16string expected;
+    for (int i = 0; i < 500; ++i) {
+        list += list.empty() ? u"/board/bank" : u" , /board/bank";
+        expected += expected.empty() ? u"../bank" : u",../bank";
+    }
+    EXPECT_TRUE(Rebased(std::u16string_view(list), u"/board/x") == expected);
 }
 
 TEST(RebaseListPaths, PathOfTheNodeItselfBecomesEmpty) {

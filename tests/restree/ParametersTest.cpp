@@ -73,6 +73,52 @@ TEST(ExpandVariables, LeavesWhatIsNoMark) {
     EXPECT_EQ(Expanded(u""), "");
 }
 
+TEST(ExpandVariables, FindsAMarkAtAnyPlace) {
+    for (size_t length = 0; length <= 40; ++length) {
+        const std::u16string part(length, u'x');
+        const std::string shown(length, 'x');
+        EXPECT_EQ(Expanded((part + u"#{A}").c_str()), shown + "1");
+        EXPECT_EQ(Expanded((part + u"#{A}" + part + u"#{B C}" + part).c_str()), shown + "1" + shown + "2" + shown);
+        EXPECT_EQ(Expanded((part + u"#" + part + u"#{A").c_str()), shown + "#" + shown + "#{A");
+        EXPECT_EQ(Expanded((part + u"#").c_str()), shown + "#");
+    }
+}
+
+TEST(ExpandVariables, ResultMayHaveAnyLength) {
+    for (size_t length = 250; length <= 260; ++length) {
+        const std::u16string part(length, u'x');
+        const std::string shown(length, 'x');
+        EXPECT_EQ(Expanded((part + u"#{A}" + part).c_str()), shown + "1" + shown);
+        EXPECT_EQ(Expanded((u"#{" + part + u"}").c_str()), "#{" + shown + "}");
+    }
+}
+
+TEST(HasVariables, TellsAMark) {
+    EXPECT_TRUE(HasVariables(u"#{"));
+    EXPECT_TRUE(HasVariables(u"0123456789#{"));
+    EXPECT_TRUE(HasVariables(u"##{"));
+    EXPECT_FALSE(HasVariables(u""));
+    EXPECT_FALSE(HasVariables(u"#"));
+    EXPECT_FALSE(HasVariables(u"# {"));
+    EXPECT_FALSE(HasVariables(u"{#}"));
+    EXPECT_FALSE(HasVariables(u"0123456789#"));
+}
+
+TEST(InstanceParameters, AreTheNameAndTheLoopVariable) {
+    const InstanceParameters parameters(u"Bank7", u"i", -2147483647 - 1);
+    EXPECT_FALSE(parameters.IsEmpty());
+    EXPECT_EQ(ExactText(ExpandVariables(u"#{name} #{NAME} #{i} #{I} #{j} #{}", parameters)),
+              "Bank7 Bank7 -2147483648 -2147483648 #{j} #{}");
+}
+
+TEST(InstanceParameters, EmptyVariableIsNone) {
+    EXPECT_EQ(ExactText(ExpandVariables(u"#{name}#{}#{ }", InstanceParameters(u"Bank7", u"", 1))), "Bank7#{}#{}");
+}
+
+TEST(InstanceParameters, NameWinsOverAVariableOfThatName) {
+    EXPECT_EQ(ExactText(ExpandVariables(u"#{name}", InstanceParameters(u"x", u"Name", 1))), "x");
+}
+
 TEST(ExpandVariables, WithoutAnyParameterTheTextStaysWithItsBlanks) {
     EXPECT_EQ(ExactText(ExpandVariables(u"a#{ x }b", MapParameters(ParameterMap()))), "a#{ x }b");
 }
@@ -103,6 +149,42 @@ R:R
   A:A
     V=out
 )");
+}
+
+TEST(OpenElementParameters, UnitsThatDoNotCountMakeNoDifference) {
+    EXPECT_EQ(TreeOf("<R K='k' name='r'><V>#{K&#127;}#{&#127;K}#{na&#127;me}</V></R>"),
+              "\nr:R\n  V=kk#{na\x7F"
+              "me}\n");
+}
+
+TEST(OpenElementParameters, HyphensMakeADifference) {
+    ASSERT_TREE("<R ab='1' a-b='2'><V>#{a-b}#{A-B}#{ab}#{-ab}#{a--b}#{'ab}</V></R>", R"(
+R:R
+  V=221#{-ab}#{a--b}#{'ab}
+)");
+}
+
+TEST(OpenElementParameters, NamesOutsideAsciiAreComparedByTheLanguage) {
+    ASSERT_TREE("<R \xC3\xA9t='1' K='2'><V>#{\xC3\x89T}#{et}#{\xEF\xBC\xAB}</V></R>", R"(
+R:R
+  V=1#{et}2
+)");
+}
+
+TEST(OpenElementParameters, NamesMayHaveAnyLength) {
+    for (size_t length = 1; length <= 70; ++length) {
+        const std::string name(length, 'n');
+        EXPECT_EQ(TreeOf("<R " + name + "='v'><V>#{" + std::string(length, 'N') + "}#{" + name + "n}</V></R>"),
+                  "\nR:R\n  V=v#{" + name + "n}\n");
+    }
+}
+
+TEST(OpenElementParameters, ValuesMayHaveAnyLength) {
+    for (size_t length = 0; length <= 40; ++length) {
+        const std::string value(length, 'v');
+        EXPECT_EQ(TreeOf("<R K='" + value + "' L='\xC3\xA9" + value + "'><V>[#{K}#{L}]</V></R>"),
+                  "\nR:R\n  V=[" + value + "{00E9}" + value + "]\n");
+    }
 }
 
 TEST(OpenElementParameters, OfAttributesThatDifferOnlyInCaseTheFirstStays) {

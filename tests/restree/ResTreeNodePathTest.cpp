@@ -313,6 +313,37 @@ TEST_F(Paths, NameOfUnitsThatDoNotCountIsTakenForTheRoot) {
     EXPECT_EQ(ExactText(AddChild(*hyphen, u"x")->GetPath()), "/x");
 }
 
+TEST_F(Paths, FirstNameMayBeginWithAnyUnit) {
+    // A hyphen and an apostrophe make a difference from "/", a delete character makes none.
+    for (const char16_t* name : {u"-", u"'", u" ", u"\u00e9", u"\u0301q", u"\x7fq"}) {
+        ResTreeNode* odd = AddChild(*root, name);
+        const std::string expected = "/" + ExactText(std::u16string_view(name));
+        EXPECT_EQ(ExactText(odd->GetPath()), expected);
+        EXPECT_EQ(ExactText(AddChild(*odd, u"x")->GetPath()), expected + "/x");
+    }
+    ResTreeNode* uncounted = AddChild(*root, u"\x7f");
+    EXPECT_EQ(ExactText(AddChild(*uncounted, u"x")->GetPath()), "/x");
+}
+
+TEST_F(Paths, PathMayHaveAnyLength) {
+    for (size_t length = 240; length <= 270; ++length) {
+        const std::u16string name(length, u'n');
+        ResTreeNode* named = AddChild(*root, name.c_str());
+        const std::string expected = "/" + std::string(length, 'n');
+        EXPECT_EQ(ExactText(named->GetPath()), expected);
+        EXPECT_EQ(ExactText(AddChild(*named, u"x")->GetPath()), expected + "/x");
+        EXPECT_EQ(ExactText(AddChild(*AddChild(*named, u""), u"/")->GetPath()), expected + "//\\/");
+    }
+}
+
+TEST_F(Paths, EscapedNameMayStandAnywhere) {
+    ResTreeNode* first = AddChild(*root, u"first");
+    ResTreeNode* second = AddChild(*first, u"a name of more than eight units and a /");
+    ResTreeNode* third = AddChild(*second, u"third");
+    EXPECT_EQ(ExactText(second->GetPath()), "/first/a name of more than eight units and a \\/");
+    EXPECT_EQ(ExactText(third->GetPath()), "/first/a name of more than eight units and a \\//third");
+}
+
 TEST_F(Paths, PathFollowsTheNames) {
     b->Rename(u"new");
     EXPECT_EQ(ExactText(c->GetPath()), "/A/new/C");

@@ -200,6 +200,58 @@ TEST(PieceReader, TellsPiecesWithBackslashes) {
     EXPECT_FALSE(reader.Next());
 }
 
+TEST(PieceReader, GivesTheTextFromThePieceOn) {
+    PieceReader reader(u"a/b\\/c//d", u"/", false);
+    const Pieces expected{u"a/b\\/c//d", u"b\\/c//d", u"/d", u"d"};
+    for (const std::u16string& rest : expected) {
+        ASSERT_TRUE(reader.Next());
+        EXPECT_EQ(reader.RawToTheEnd(), rest);
+    }
+    EXPECT_FALSE(reader.Next());
+}
+
+TEST(PieceReader, GivesAnEmptyLastPieceAsTheRest) {
+    PieceReader reader(u"a/", u"/", false);
+    ASSERT_TRUE(reader.Next());
+    ASSERT_TRUE(reader.Next());
+    EXPECT_EQ(reader.RawToTheEnd(), u"");
+}
+
+TEST(PieceReader, SplitsPiecesOfAnyLength) {
+    for (size_t length = 0; length <= 40; ++length) {
+        const std::u16string piece(length, u'a');
+        EXPECT_EQ(RawPieces(piece + u"," + piece, u",", false), Pieces({piece, piece})) << length;
+        EXPECT_EQ(RawPieces(piece + u"\\," + piece + u"," + piece, u",", false),
+                  Pieces({piece + u"\\," + piece, piece}))
+            << length;
+        EXPECT_EQ(RawPieces(piece + u"\\\\," + piece, u",", false), Pieces({piece + u"\\\\", piece})) << length;
+        EXPECT_EQ(RawPieces(u" " + piece + u" , " + piece + u"\n", u",", true), Pieces({piece, piece})) << length;
+    }
+}
+
+TEST(PieceReader, TellsBackslashesForAnySeparator) {
+    for (std::u16string_view separator : {u",", u"::", u"", u"|\\"}) {
+        PieceReader plain(u"ab", separator, false);
+        ASSERT_TRUE(plain.Next());
+        EXPECT_FALSE(plain.MayHaveEscapes());
+        PieceReader escaped(u"a\\b", separator, false);
+        ASSERT_TRUE(escaped.Next());
+        EXPECT_TRUE(escaped.MayHaveEscapes());
+    }
+    // Not in the piece, but the separator itself.
+    PieceReader split(u"a\\b", u"\\", false);
+    ASSERT_TRUE(split.Next());
+    EXPECT_FALSE(split.MayHaveEscapes());
+}
+
+TEST(PieceReader, BackslashOfOnePieceIsNoneOfTheNext) {
+    PieceReader reader(u"a\\,b,c", u",", false);
+    ASSERT_TRUE(reader.Next());
+    EXPECT_TRUE(reader.MayHaveEscapes());
+    ASSERT_TRUE(reader.Next());
+    EXPECT_FALSE(reader.MayHaveEscapes());
+}
+
 TEST(EscapeText, PutsABackslashBeforeDelimitersAndBackslashes) {
     EXPECT_EQ(Units(EscapeText(u"a/b\\c", u'/')), u"a\\/b\\\\c");
     EXPECT_EQ(Units(EscapeText(u"/", u"/")), u"\\/");
@@ -242,10 +294,26 @@ TEST(EscapeText, MillionBackslashesTakeLinearTime) {
     EXPECT_TRUE(EscapeText(text.c_str(), u',').View() == std::u16string(2000000, u'\\'));
 }
 
+TEST(EscapeText, FindsADelimiterAtAnyPlace) {
+    for (size_t length = 0; length <= 40; ++length) {
+        const std::u16string part(length, u'a');
+        EXPECT_EQ(Units(EscapeText(std::u16string_view(part + u"/" + part), u'/')), part + u"\\/" + part) << length;
+        EXPECT_EQ(Units(EscapeText(std::u16string_view(part + u"\\"), u'/')), part + u"\\\\") << length;
+    }
+}
+
 TEST(UnescapeText, TakesEscapesOut) {
     EXPECT_EQ(Units(UnescapeText(u"a\\/b\\\\c", u'/')), u"a/b\\c");
     EXPECT_EQ(Units(UnescapeText(u"\\\\\\\\", u'/')), u"\\\\");
     EXPECT_EQ(Units(UnescapeText(u"\\\\/", u'/')), u"\\/");
+}
+
+TEST(UnescapeText, FindsAnEscapeAtAnyPlace) {
+    for (size_t length = 0; length <= 40; ++length) {
+        const std::u16string part(length, u'a');
+        EXPECT_EQ(Units(UnescapeText(std::u16string_view(part + u"\\/" + part), u'/')), part + u"/" + part) << length;
+        EXPECT_EQ(Units(UnescapeText(std::u16string_view(part + u"\\"), u'/')), part + u"\\") << length;
+    }
 }
 
 TEST(UnescapeText, OtherBackslashesStay) {
@@ -366,6 +434,13 @@ TEST(TrimmedPart, IsAPartOfTheText) {
     const std::u16string_view text = u"  ab ";
     EXPECT_EQ(TrimmedPart(text).data(), text.data() + 2);
     EXPECT_EQ(TrimmedPart(text).size(), 2u);
+}
+
+TEST(TrimmedPart, TakesBytesToo) {
+    EXPECT_EQ(TrimmedPart(" \t\r\na \xC2\xA0\n"sv), "a \xC2\xA0"sv);
+    EXPECT_EQ(TrimmedPart(" \t\r\n"sv), ""sv);
+    EXPECT_EQ(TrimmedPart(""sv), ""sv);
+    EXPECT_EQ(TrimmedPart("\v\f\0"sv), "\v\f\0"sv);
 }
 
 TEST(ParseBool, FiveWordsAreTrue) {

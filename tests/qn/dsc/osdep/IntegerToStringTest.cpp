@@ -9,6 +9,7 @@
 namespace {
 
 using qn::dsc::exception::UnableToConvert;
+using qn::dsc::osdep::DecimalText;
 using qn::dsc::osdep::IntegerToString;
 
 std::u16string Unsigned(uint32_t value, uint32_t radix) {
@@ -67,6 +68,16 @@ TEST(IntegerToString, ThrowSaysWhere) {
         EXPECT_STREQ(failure.GetFile(), "qn/dsc/osdep/IntegerToString");
         EXPECT_GT(failure.GetLine(), 0);
     }
+}
+
+TEST(DecimalText, HasTheDigitsAndASign) {
+    EXPECT_EQ(DecimalText(0).View(), u"0");
+    EXPECT_EQ(DecimalText(7).View(), u"7");
+    EXPECT_EQ(DecimalText(10).View(), u"10");
+    EXPECT_EQ(DecimalText(-1).View(), u"-1");
+    EXPECT_EQ(DecimalText(1234567890).View(), u"1234567890");
+    EXPECT_EQ(DecimalText(INT32_MAX).View(), u"2147483647");
+    EXPECT_EQ(DecimalText(INT32_MIN).View(), u"-2147483648");
 }
 
 }  // namespace
