@@ -1,10 +1,13 @@
-// Escaped lists and the text of node paths.
+// Escaped lists, the text of node paths, and the lists that a resource file writes.
 
 #include <vector>
 
 #include <benchmark/benchmark.h>
 
+#include "qn/dsc/FindUnit.h"
 #include "qn/dsc/StringBase.h"
+#include "restree/LocalizeText.h"
+#include "restree/NameRange.h"
 #include "restree/NodePath.h"
 #include "restree/TextList.h"
 
@@ -40,5 +43,43 @@ void MakeRelativeNodePath(benchmark::State& state) {
     }
 }
 BENCHMARK(MakeRelativeNodePath);
+
+void RebaseListPaths(benchmark::State& state) {
+    const String list(u"/Board/Bank17,../Clock");
+    const String base(u"/Board0003/Resources/IIC_Main_SerialClock_17");
+    for (auto round : state) {
+        benchmark::DoNotOptimize(zkhw::RebaseListPaths(list, base));
+    }
+}
+BENCHMARK(RebaseListPaths);
+
+void ParseNames(benchmark::State& state) {
+    const String names(u"Bank[i=0..7],Clock");
+    std::vector<zkhw::InstanceRecord> records;
+    std::vector<String> loopVariables;
+    for (auto round : state) {
+        records.clear();
+        loopVariables.clear();
+        zkhw::ParseNames(names, records, loopVariables);
+        benchmark::DoNotOptimize(records.data());
+    }
+}
+BENCHMARK(ParseNames);
+
+void LocalizeText(benchmark::State& state) {
+    const String list(u"eng=Line 17 of the board,jpn=\u7dda 17");
+    for (auto round : state) {
+        benchmark::DoNotOptimize(zkhw::LocalizeText(list));
+    }
+}
+BENCHMARK(LocalizeText);
+
+void FindUnit(benchmark::State& state) {
+    const std::u16string text(static_cast<size_t>(state.range(0)), u'a');
+    for (auto round : state) {
+        benchmark::DoNotOptimize(qn::dsc::FindUnit(text, u'#'));
+    }
+}
+BENCHMARK(FindUnit)->Arg(4)->Arg(20)->Arg(200);
 
 }  // namespace

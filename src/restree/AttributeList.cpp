@@ -81,7 +81,8 @@ void AttributeList::Assign(const char* const* attributes) {
         item.value = static_cast<uint32_t>(text.size());
         text.append(attributes[1], std::strlen(attributes[1]) + 1);
         item.end = static_cast<uint32_t>(text.size());
-        item.hasPlainName = IsPlain(NameOf(item));
+        // There are no control characters in a name.
+        item.hasPlainName = IsAscii(NameOf(item));
         items.push_back(item);
         Note(item);
     }

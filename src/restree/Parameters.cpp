@@ -33,7 +33,7 @@ size_t FindOpenMark(std::u16string_view text, size_t from) {
 
 // Equal, and quicker for names that are spelled alike, as nearly all are.
 bool IsSameName(std::u16string_view a, std::u16string_view b) {
-    return a == b || Equal(a, b);
+    return qn::dsc::HasSameUnits(a, b) || Equal(a, b);
 }
 
 }  // namespace

@@ -39,7 +39,9 @@ size_t FindStart(std::u16string_view path, ResTreeNode*& node, ResTreeNode* docu
         const size_t close = path.find(u'}', 2);
         const bool isClosed = close != std::u16string_view::npos;
         const std::u16string_view anchor = path.substr(2, isClosed ? close - 2 : close);
-        if (documentRoot != nullptr && Compare(anchor, u"document-root") == 0) {
+        constexpr std::u16string_view documentRootAnchor = u"document-root";
+        if (documentRoot != nullptr &&
+            (qn::dsc::HasSameUnits(anchor, documentRootAnchor) || Compare(anchor, documentRootAnchor) == 0)) {
             node = documentRoot;
         }
         // Behind the brace and the separator; an anchor that isn't closed leaves all but its first unit as the path.

@@ -1,12 +1,13 @@
 #pragma once
 
-// Searches for single units of UTF-16, eight at a step. The same as the searches of std::u16string_view, which go unit
-// by unit and take about four times as many instructions on texts of 20 units.
+// Searches for single units of UTF-16, eight at a step, and the equality of units. The same as what
+// std::u16string_view does unit by unit, in about four times as many instructions on texts of 20 units.
 
 #include <emmintrin.h>
 
 #include <bit>
 #include <cstddef>
+#include <cstring>
 #include <string_view>
 
 namespace qn::dsc {
@@ -43,6 +44,11 @@ inline size_t FindEither(std::u16string_view text, char16_t a, char16_t b, size_
 // The same for one unit.
 inline size_t FindUnit(std::u16string_view text, char16_t unit, size_t from = 0) {
     return FindEither(text, unit, unit, from);
+}
+
+// Whether two texts have the very same units. Such texts are equal by Compare too.
+inline bool HasSameUnits(std::u16string_view a, std::u16string_view b) {
+    return a.size() == b.size() && (a.empty() || std::memcmp(a.data(), b.data(), a.size() * sizeof(char16_t)) == 0);
 }
 
 }  // namespace qn::dsc

@@ -17,7 +17,7 @@ namespace qn::dsc {
 
 class TextBuilder {
   public:
-    TextBuilder() {}
+    TextBuilder() = default;
     TextBuilder(const TextBuilder&) = delete;
     TextBuilder& operator=(const TextBuilder&) = delete;
 

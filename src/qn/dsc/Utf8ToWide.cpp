@@ -183,6 +183,12 @@ template <>
 bool StringBase<char16_t>::TryFromUtf8(const char* bytes, uint32_t length, String& text) {
     const size_t sourceLength = bytes == nullptr ? 0 : length;
     const bool isAscii = IsAscii(bytes, sourceLength);
+    if (isAscii && text.begin == nullptr) {
+        // As nearly always: a place without a buffer.
+        text.SetFull(AllocateUnits(sourceLength), sourceLength);
+        WidenAscii(bytes, sourceLength, text.begin);
+        return true;
+    }
     const size_t count = isAscii ? sourceLength : MeasureUtf8(bytes, sourceLength);
     if (count == SIZE_MAX) {
         return false;
@@ -208,11 +214,6 @@ bool StringBase<char16_t>::TryFromUtf8(const char* bytes, uint32_t length, Strin
 template <>
 String StringBase<char16_t>::FromUtf8(const char* bytes, uint32_t length) {
     String text = WithoutBuffer();
-    if (bytes != nullptr && IsAscii(bytes, length)) [[likely]] {
-        text.SetFull(AllocateUnits(length), length);
-        WidenAscii(bytes, length, text.begin);
-        return text;
-    }
     if (!TryFromUtf8(bytes, length, text)) {
         exception::ThrowAt(exception::InvalidSequence(), moduleName, __LINE__);
     }

@@ -64,5 +64,17 @@ TEST(FindEither, LooksBehindTheTextForNothing) {
     }
 }
 
+TEST(HasSameUnits, TellsEqualTexts) {
+    EXPECT_TRUE(HasSameUnits(u"", u""));
+    EXPECT_TRUE(HasSameUnits({}, u""));
+    EXPECT_TRUE(HasSameUnits(u"abc", u"abc"));
+    EXPECT_TRUE(HasSameUnits(u"a\u540d", u"a\u540d"));
+    EXPECT_FALSE(HasSameUnits(u"abc", u"abC"));
+    EXPECT_FALSE(HasSameUnits(u"abc", u"ab"));
+    EXPECT_FALSE(HasSameUnits(u"", u"a"));
+    EXPECT_FALSE(HasSameUnits(u"\u0161", u"\u0061"));
+    EXPECT_FALSE(HasSameUnits(u"\u6101", u"\u6102"));
+}
+
 }  // namespace
 }  // namespace qn::dsc

@@ -10,7 +10,7 @@ namespace {
 using namespace std::string_view_literals;
 
 TEST(TextBuilder, IsEmptyAtFirst) {
-    const TextBuilder builder;
+    TextBuilder builder;
     EXPECT_TRUE(builder.IsEmpty());
     EXPECT_EQ(builder.View(), u""sv);
     EXPECT_EQ(builder.Text().View(), u""sv);

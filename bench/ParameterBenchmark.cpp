@@ -1,0 +1,41 @@
+// The expansion of "#{name}" in texts.
+
+#include <benchmark/benchmark.h>
+
+#include "qn/dsc/StringBase.h"
+#include "restree/Parameters.h"
+
+namespace {
+
+using qn::dsc::String;
+
+void HasVariables(benchmark::State& state) {
+    const String text(u"help/lines/digital.html");
+    for (auto round : state) {
+        benchmark::DoNotOptimize(zkhw::HasVariables(text));
+    }
+}
+BENCHMARK(HasVariables);
+
+void ExpandInstance(benchmark::State& state) {
+    const String text(u"#{name} of port 17, line #{i}");
+    const zkhw::InstanceParameters parameters(u"Bit3", u"i", 3);
+    for (auto round : state) {
+        benchmark::DoNotOptimize(zkhw::ExpandVariables(text, parameters));
+    }
+}
+BENCHMARK(ExpandInstance);
+
+void ExpandFromAMap(benchmark::State& state) {
+    const String text(u"Line on pin #{Pin} of #{Board}");
+    zkhw::ParameterMap values;
+    values.emplace(u"Board", u"Board0003");
+    values.emplace(u"Pin", u"A17");
+    const zkhw::MapParameters parameters(std::move(values));
+    for (auto round : state) {
+        benchmark::DoNotOptimize(zkhw::ExpandVariables(text, parameters));
+    }
+}
+BENCHMARK(ExpandFromAMap);
+
+}  // namespace
