@@ -103,7 +103,8 @@ class Installation:
     """The files above in a new folder that goes when this does. With `used`, an earlier run has left old bytes in the
     places of the cache and of the copies."""
 
-    def __init__(self, used=False, parent=None):
+    def __init__(self, used=False, parent=None, oldCache=OLD):
+        self.oldCache = oldCache
         self.root = pathlib.Path(tempfile.mkdtemp(prefix="trial-", dir=parent))
         self.used = used
         for name, content in FILES.items():
@@ -113,6 +114,7 @@ class Installation:
         for name, target in LINKS.items():
             (self.root / name).symlink_to(target)
         self.tool = self.root / BELOW / "Utilities" / TOOL_NAME
+        self.host = self.root / "browse"  # Where a host's program goes, for those who want one.
         self.tool.parent.mkdir()
         shutil.copy(FindTool(), self.tool)
         self.Reset()
@@ -125,7 +127,8 @@ class Installation:
 
     def Prior(self):
         """Output file -> the bytes that stand there before a run; None where nothing does."""
-        return {name: OLD if self.used else None for name in (CACHE, *COPIES)}
+        olds = {CACHE: self.oldCache, **dict.fromkeys(COPIES, OLD)}
+        return olds if self.used else dict.fromkeys(olds)
 
     def Reset(self):
         shutil.rmtree(self.root / BELOW / "one/deep", ignore_errors=True)
@@ -139,13 +142,29 @@ class Installation:
     def Output(self):
         """Output file -> its bytes, None if there is no such file; and every other file that came into being."""
         found = {name: None for name in (CACHE, *COPIES)}
-        known = {self.root / name for name in FILES} | {self.tool, self.root / BELOW / "more"}
+        known = {self.root / name for name in FILES} | {self.tool, self.host, self.root / BELOW / "more"}
         for folder, _, names in os.walk(self.root):
             for name in names:
                 path = pathlib.Path(folder) / name
                 if path not in known:
                     found[str(path.relative_to(self.root))] = path.read_bytes()
         return found
+
+    def Restore(self, output):
+        """Makes the output files what Output gave before."""
+        self.Reset()
+        for name in {*self.Output(), *output}:
+            path = self.root / name
+            if output.get(name) is None:
+                path.unlink(missing_ok=True)
+            else:
+                path.parent.mkdir(exist_ok=True)
+                path.write_bytes(output[name])
+
+    def MakeOld(self):
+        """Sets the times of all resource files back, so that any cache is newer."""
+        for name in (HOSTS, SPECS, ONE, PARTS, TWO):
+            os.utime(self.root / name, (946684800, 946684800))
 
     def Run(self, before=(), **options):
         """Runs the tool, behind the command `before`, and gives its end: "exit 5", "SIGTRAP"."""
@@ -161,9 +180,26 @@ def EndOf(status):
 
 
 def Run(command, seconds=60, **options):
+    """The end of a command; "hangs" if it took too long, and everything that it started is gone then."""
     options = {"stdin": subprocess.DEVNULL, "stdout": subprocess.DEVNULL, "stderr": subprocess.DEVNULL,
                "preexec_fn": NoCoreFiles, **options}
-    return EndOf(subprocess.run([str(part) for part in command], timeout=seconds, check=False, **options).returncode)
+    with subprocess.Popen([str(part) for part in command], start_new_session=True, **options) as process:
+        try:
+            return EndOf(process.wait(seconds))
+        except subprocess.TimeoutExpired:
+            os.killpg(process.pid, signal.SIGKILL)
+            return "hangs"
+
+
+def BuildHost(folder):
+    """The program examples/host/browse, linked to the shared library beside the tool."""
+    program = pathlib.Path(folder) / "browse"
+    sources = REPOSITORY / "examples/host/browse"
+    libraries = FindTool().parent.parent / "lib"
+    subprocess.run(["cc", "-std=c99", "-rdynamic", sources / "browse.c", sources / "runtime.c",
+                    f"-I{REPOSITORY / 'include'}", f"-L{libraries}", "-lzkfpgarestree", f"-Wl,-rpath,{libraries}",
+                    "-o", program], check=True)
+    return program
 
 
 def Shown(content):
