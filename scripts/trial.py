@@ -9,6 +9,7 @@ import pathlib
 import resource
 import shutil
 import signal
+import stat
 import subprocess
 import tempfile
 
@@ -140,14 +141,16 @@ class Installation:
                 path.write_bytes(content)
 
     def Output(self):
-        """Output file -> its bytes, None if there is no such file; and every other file that came into being."""
+        """Output file -> its bytes, None if there is no such file; and every other file that came into being. What is no
+        regular file isn't read."""
         found = {name: None for name in (CACHE, *COPIES)}
         known = {self.root / name for name in FILES} | {self.tool, self.host, self.root / BELOW / "more"}
         for folder, _, names in os.walk(self.root):
             for name in names:
                 path = pathlib.Path(folder) / name
                 if path not in known:
-                    found[str(path.relative_to(self.root))] = path.read_bytes()
+                    isRegular = stat.S_ISREG(path.lstat().st_mode)
+                    found[str(path.relative_to(self.root))] = path.read_bytes() if isRegular else b"no regular file"
         return found
 
     def Restore(self, output):
