@@ -53,7 +53,8 @@ TEST_F(DeepQueries, NamesOfAllNodesAreGiven) {
     RunOnSmallStack([this] {
         ULONG count = 0;
         BSTR* names = nullptr;
-        EXPECT_EQ(tree.Tree()->GetDescendantNames(nullptr, Text(u"recurse=true,includePath=false"), &count, &names), S_OK);
+        EXPECT_EQ(tree.Tree()->GetDescendantNames(nullptr, Text(u"recurse=true,includePath=false"), &count, &names),
+                  S_OK);
         EXPECT_EQ(CountOf(count, names, u"n"), levels);
     });
 }
@@ -73,8 +74,9 @@ TEST_F(DeepQueries, PropertiesOfTheLastNodeAreGiven) {
     RunOnSmallStack([this] {
         GivenTexts names;
         ULONG* const count = names.Count();
-        EXPECT_EQ(tree.Tree()->GetMultiplePropertyNames(Text(path.c_str()), Text(u"recurse=true"), count, names.Array()),
-                  S_OK);
+        EXPECT_EQ(
+            tree.Tree()->GetMultiplePropertyNames(Text(path.c_str()), Text(u"recurse=true"), count, names.Array()),
+            S_OK);
         EXPECT_EQ(names.Lines(), "\nP");
     });
 }
