@@ -13,7 +13,7 @@ import stat
 import subprocess
 import tempfile
 
-REPOSITORY = pathlib.Path(__file__).resolve().parent.parent
+REPOSITORY = pathlib.Path(__file__).resolve().parents[2]
 TOOL_NAME = "zkfpga_make_resource_cache"
 BELOW = "Targets/QN/FPGA"
 CACHE = f"{BELOW}/resource_cache.xml"
@@ -141,8 +141,8 @@ class Installation:
                 path.write_bytes(content)
 
     def Output(self):
-        """Output file -> its bytes, None if there is no such file; and every other file that came into being. What is no
-        regular file isn't read."""
+        """Output file -> its bytes, None if there is no such file; and every other file that came into being. What is
+        no regular file isn't read."""
         found = {name: None for name in (CACHE, *COPIES)}
         known = {self.root / name for name in FILES} | {self.tool, self.host, self.root / BELOW / "more"}
         for folder, _, names in os.walk(self.root):

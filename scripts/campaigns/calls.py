@@ -2,7 +2,7 @@
 
 import re
 
-from trial import BELOW, CACHE, HOSTS
+from campaigns.trial import BELOW, CACHE, HOSTS
 
 # The errors that each call is made to fail with. A call that isn't here is not made to fail: execve is that of strace,
 # exit_group has no failure, and those of the process's set-up can't fail in a system that runs.
