@@ -58,9 +58,7 @@ int OpenNative(const std::string& path, int flags, mode_t permissions, int& desc
     if (start.Error() != 0) {
         return start.Error();
     }
-    do {
-        descriptor = openat(start.Folder(), start.Rest(), flags, permissions);
-    } while (descriptor < 0 && errno == EINTR);
+    descriptor = OpenAt(start.Folder(), start.Rest(), flags, permissions);
     return descriptor < 0 ? errno : 0;
 }
 
@@ -85,7 +83,10 @@ int OpenOrCreate(std::string& path, int flags, mode_t permissions, int& descript
 // What was opened without waiting must be readable or, for writing alone, may be anything that takes bytes.
 int SettleOpened(int descriptor, int access) {
     if (access == O_WRONLY) {
-        return fcntl(descriptor, F_SETFL, 0) != 0 ? errno : 0;
+        // The open may have emptied a file, so it is no failure any more if this doesn't work: to a file it means
+        // nothing, and a pipe then fails where it is full.
+        fcntl(descriptor, F_SETFL, 0);
+        return 0;
     }
     struct stat status;
     if (fstat(descriptor, &status) != 0) {

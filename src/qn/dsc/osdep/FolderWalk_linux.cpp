@@ -44,7 +44,7 @@ bool IsMountRoot(int folder) {
 // that leads to `folder`. Refuses any other. One call (openat2) could do both, but not every system has it, and tools
 // that watch a host from below don't know it.
 int OpenDirect(int folder, const char* name, int& descriptor) {
-    descriptor = openat(folder, name, folderFlags | O_NOFOLLOW);
+    descriptor = OpenAt(folder, name, folderFlags | O_NOFOLLOW);
     if (descriptor < 0) {
         return errno;
     }
@@ -60,7 +60,7 @@ int OpenByPath(const std::string& path, int& descriptor) {
     if (start.Error() != 0) {
         return start.Error();
     }
-    descriptor = openat(start.Folder(), start.Rest(), folderFlags);
+    descriptor = OpenAt(start.Folder(), start.Rest(), folderFlags);
     return descriptor < 0 ? errno : 0;
 }
 
@@ -70,6 +70,15 @@ int ReadStatusByPath(const std::string& path, struct stat& status) {
         return start.Error();
     }
     return fstatat(start.Folder(), start.Rest(), &status, 0) != 0 ? errno : 0;
+}
+
+// getdents64, begun anew where a signal interrupts it.
+ssize_t ReadListing(int folder, char* listing, size_t size) {
+    ssize_t got = 0;
+    do {
+        got = getdents64(folder, listing, size);
+    } while (got < 0 && errno == EINTR);
+    return got;
 }
 
 // Cuts a path that was made longer, unless it is to be kept so.
@@ -133,7 +142,7 @@ int NativeFolderWalk::ReadNames() {
     names.Add("..", pattern, false);
     const size_t firstToSort = names.Count();
     ssize_t size = 0;
-    while ((size = getdents64(Present().descriptor, listing.get(), listingSize)) > 0) {
+    while ((size = ReadListing(Present().descriptor, listing.get(), listingSize)) > 0) {
         for (const char* at = listing.get(); at != listing.get() + size;) {
             const auto* const entry = reinterpret_cast<const dirent64*>(at);
             if (!IsDotName(entry->d_name)) {

@@ -132,7 +132,7 @@ PathStart::PathStart(const std::string& path) : PathStart() {
             break;
         }
         const std::string upper(reach.substr(0, slash));
-        const int next = openat(folder, upper.c_str(), O_PATH | O_DIRECTORY | O_CLOEXEC);
+        const int next = OpenAt(folder, upper.c_str(), O_PATH | O_DIRECTORY | O_CLOEXEC);
         error = next < 0 ? errno : 0;
         if (folder != AT_FDCWD) {
             close(folder);
@@ -148,12 +148,20 @@ PathStart::~PathStart() {
     }
 }
 
+int OpenAt(int folder, const char* path, int flags, mode_t permissions) {
+    int descriptor = -1;
+    do {
+        descriptor = openat(folder, path, flags, permissions);
+    } while (descriptor < 0 && errno == EINTR);
+    return descriptor;
+}
+
 int OpenNativeFolder(const std::string& path, OpenFolder& folder) {
     const PathStart start(path);
     if (start.Error() != 0) {
         return start.Error();
     }
-    const int descriptor = openat(start.Folder(), start.Rest(), O_RDONLY | O_DIRECTORY | O_CLOEXEC);
+    const int descriptor = OpenAt(start.Folder(), start.Rest(), O_RDONLY | O_DIRECTORY | O_CLOEXEC);
     if (descriptor < 0) {
         return errno;
     }
@@ -204,11 +212,16 @@ int ReadNativeWorkingFolder(std::string& path) {
 }
 
 const char* NextNativeName(DIR* folder) {
-    const dirent* entry = readdir(folder);
-    while (entry != nullptr && (std::string_view(entry->d_name) == "." || std::string_view(entry->d_name) == "..")) {
-        entry = readdir(folder);
+    for (;;) {
+        errno = 0;
+        const dirent* const entry = readdir(folder);
+        if (entry == nullptr && errno != EINTR) {
+            return nullptr;
+        }
+        if (entry != nullptr && std::string_view(entry->d_name) != "." && std::string_view(entry->d_name) != "..") {
+            return entry->d_name;
+        }
     }
-    return entry == nullptr ? nullptr : entry->d_name;
 }
 
 FolderNames::FolderNames(std::string folderPath, const FileIdentity& folderIdentity)

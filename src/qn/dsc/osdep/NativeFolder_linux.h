@@ -4,6 +4,7 @@
 // Paths here are native: absolute, folded, without a slash at the end but for the root (NativePath.h).
 
 #include <dirent.h>
+#include <sys/types.h>
 
 #include <cstdint>
 #include <ctime>
@@ -41,6 +42,9 @@ class PathStart {
     const char* rest = nullptr;
     int error = 0;
 };
+
+// openat, begun anew where a signal interrupts it, as it can on a file system that a network or a program serves.
+int OpenAt(int folder, const char* path, int flags, mode_t permissions = 0);
 
 struct FolderCloser {
     void operator()(DIR* folder) const { closedir(folder); }

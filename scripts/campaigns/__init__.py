@@ -1,0 +1,1 @@
+"""What the campaigns of failures share: docs/testing.md tells of them."""
