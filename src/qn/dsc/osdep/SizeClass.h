@@ -38,6 +38,15 @@ constexpr size_t SizeOfClass(uint32_t sizeClass) {
     return size_t{5 + quarter} << (doubling + 7);
 }
 
+// Whether a block that was made for `oldSize` bytes is of another class than one for `newSize`, which is more. Blocks
+// above the greatest class always are.
+constexpr bool NeedsGreaterClass(size_t oldSize, size_t newSize) {
+    if (newSize > maximumClassedSize) {
+        return true;
+    }
+    return oldSize <= maximumClassedSize && SizeClassOf(newSize) > SizeClassOf(oldSize);
+}
+
 static_assert(SizeClassOf(512) == 32 && SizeClassOf(513) == 33 && SizeClassOf(640) == 33 && SizeClassOf(641) == 34);
 static_assert(SizeClassOf(maximumClassedSize) == sizeClassCount - 1);
 static_assert(SizeOfClass(33) == 640 && SizeOfClass(36) == 1024 && SizeOfClass(56) == maximumClassedSize);
