@@ -1,41 +1,87 @@
 #include "qn/dsc/osdep/NativeFile_windows.h"
 
+#include <algorithm>
 #include <cerrno>
+#include <utility>
 
 namespace qn::dsc::osdep {
 
 namespace {
 
-// A folder's path must leave room for a short name in it.
-constexpr size_t longestPlainPath = 247;
+constexpr std::u16string_view prefix = u"\\\\?\\";
+constexpr std::u16string_view networkPrefix = u"\\\\?\\UNC\\";
 
-constexpr std::u16string_view longPrefix = u"\\\\?\\";
-constexpr std::u16string_view longNetworkPrefix = u"\\\\?\\UNC";
-
-bool IsSeparator(char16_t unit) {
-    return unit == u'\\' || unit == u'/';
+bool IsLetter(char16_t unit) {
+    return (unit >= u'a' && unit <= u'z') || (unit >= u'A' && unit <= u'Z');
 }
 
-// The absolute and folded form, with the prefix for long paths.
-int MakeLong(const std::u16string& path, std::u16string& result) {
-    const DWORD room = GetFullPathNameW(path.c_str(), 0, nullptr, nullptr);
-    if (room == 0) {
-        return LastErrno();
-    }
-    std::u16string full(room, u'\0');
-    const DWORD length = GetFullPathNameW(path.c_str(), room, full.data(), nullptr);
+// What the system makes of a path that doesn't begin at a root: the working folder, that of a drive, or a drive's root.
+int ReadStart(const char16_t* path, std::u16string& start) {
+    const DWORD room = GetFullPathNameW(path, 0, nullptr, nullptr);
+    start.resize(room);
+    const DWORD length = room == 0 ? 0 : GetFullPathNameW(path, room, start.data(), nullptr);
     if (length == 0 || length >= room) {
         return length == 0 ? LastErrno() : ENAMETOOLONG;
     }
-    full.resize(length);
-    if (full.starts_with(u"\\\\?\\") || full.starts_with(u"\\\\.\\")) {
-        result = full;
-    } else if (full.starts_with(u"\\\\")) {
-        result = std::u16string(longNetworkPrefix) + full.substr(1);
-    } else {
-        result = std::u16string(longPrefix) + full;
-    }
+    start.resize(length);
     return 0;
+}
+
+// Puts the start in front of a path that has none, so that it begins with a drive and a separator, or is a network
+// path.
+int Complete(std::u16string& path) {
+    const bool hasDrive = path.size() >= 2 && IsLetter(path[0]) && path[1] == u':';
+    const bool isRooted = path[0] == u'\\';
+    if (path.starts_with(u"\\\\") || (hasDrive && path.size() >= 3 && path[2] == u'\\')) {
+        return 0;
+    }
+    const char16_t driveFolder[] = {path[0], u':', u'.', u'\0'};
+    std::u16string start;
+    const int error = ReadStart(isRooted ? u"\\" : (hasDrive ? driveFolder : u"."), start);
+    if (error == 0) {
+        path = start + u'\\' + path.substr(hasDrive ? 2 : 0);
+    }
+    return error;
+}
+
+// Takes the next name off `rest`. False if there is none.
+bool TakeName(std::u16string_view& rest, std::u16string_view& name) {
+    rest.remove_prefix(std::min(rest.find_first_not_of(u'\\'), rest.size()));
+    const size_t end = std::min(rest.find(u'\\'), rest.size());
+    name = rest.substr(0, end);
+    rest.remove_prefix(end);
+    return !name.empty();
+}
+
+// The root of a complete path as calls take it, and what stands behind it. ENOENT for what can name nothing.
+int SplitRoot(std::u16string_view path, std::u16string& root, std::u16string_view& rest) {
+    if (!path.starts_with(u"\\\\")) {
+        root.append(prefix).append(path.substr(0, 3));
+        rest = path.substr(3);
+        return 0;
+    }
+    rest = path.substr(2);
+    std::u16string_view server;
+    std::u16string_view share;
+    if (!TakeName(rest, server) || server == u"." || server == u"?" || !TakeName(rest, share)) {
+        return ENOENT;
+    }
+    root.append(networkPrefix).append(server).append(1, u'\\').append(share).append(1, u'\\');
+    return 0;
+}
+
+// Appends the names of `rest` to `path`, which is a root with a separator at its end; "." and ".." are folded.
+void AppendFolded(std::u16string_view rest, std::u16string& path) {
+    const size_t rootLength = path.size();
+    std::u16string_view name;
+    while (TakeName(rest, name)) {
+        if (name == u"..") {
+            const size_t end = path.size() > rootLength ? path.rfind(u'\\') : rootLength;
+            path.resize(std::max(end, rootLength));
+        } else if (name != u".") {
+            path.append(path.size() > rootLength ? u"\\" : u"").append(name);
+        }
+    }
 }
 
 // Open for nothing but questions.
@@ -66,12 +112,21 @@ int MakeCallPath(std::u16string_view path, CallPath& call) {
     if (path.empty()) {
         return ENOENT;
     }
-    call.text = path;
-    call.endsInSeparator = IsSeparator(path.back());
-    if (path.size() <= longestPlainPath) {
-        return 0;
+    std::u16string whole(path);
+    std::replace(whole.begin(), whole.end(), u'/', u'\\');
+    const bool endsInSeparator = whole.back() == u'\\';
+    int error = Complete(whole);
+    std::u16string_view rest;
+    std::u16string root;
+    if (error == 0) {
+        error = SplitRoot(whole, root, rest);
     }
-    return MakeLong(std::u16string(path), call.text);
+    if (error == 0) {
+        call.text = std::move(root);
+        AppendFolded(rest, call.text);
+        call.endsInSeparator = endsInSeparator;
+    }
+    return error;
 }
 
 int ErrnoOf(DWORD number) {

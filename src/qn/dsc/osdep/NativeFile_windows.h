@@ -19,8 +19,10 @@ struct CallPath {
     bool endsInSeparator = false;
 };
 
-// Up to the first NUL of `path`. A long one is made absolute and gets the prefix that frees it from the limit of 260
-// units. 0, ENOENT for the empty path, or why it can't be made absolute.
+// The absolute form of `path` up to its first NUL, folded, and with the prefix that makes the system take it as it
+// stands: without it the system drops full stops and blanks at the end of names, takes "con" or "aux.xml" for devices
+// and has a limit of 260 units. 0; ENOENT for the empty path and for paths that can name no file, such as "\.\pipe";
+// or why the start of a relative path can't be had.
 int MakeCallPath(std::u16string_view path, CallPath& call);
 
 // The errno number for one of the system's; EIO if there is no better one.
