@@ -88,15 +88,17 @@ bool IsLink(const Found& found) {
     return (found.attributes & FILE_ATTRIBUTE_REPARSE_POINT) != 0;
 }
 
-// Wine can't remove a link.
-void RemoveLink(const std::string& path) {
+// What Wine can't remove: links and pipes.
+void RemoveOutsideWine(const std::string& path) {
     EXPECT_TRUE(StartOutsideWine("/bin/rm", {"-f", PathOutsideWine(path)}));
     EXPECT_TRUE(Becomes(path, false)) << path;
 }
 
 void RemoveFile(const std::string& path) {
     SetFileAttributesW(CallPath(path).c_str(), FILE_ATTRIBUTE_NORMAL);
-    EXPECT_NE(DeleteFileW(CallPath(path).c_str()), 0) << path << ": " << GetLastError();
+    if (DeleteFileW(CallPath(path).c_str()) == 0) {
+        RemoveOutsideWine(path);
+    }
 }
 
 // Without recursion: `folders` are still to be removed, each behind those that hold it.
@@ -114,7 +116,7 @@ void RemoveTree(const std::string& path) {
             if (IsRealFolder(found)) {
                 folders.emplace_back(below, false);
             } else if (IsLink(found)) {
-                RemoveLink(below);
+                RemoveOutsideWine(below);
             } else {
                 RemoveFile(below);
             }
@@ -213,7 +215,7 @@ void TemporaryFolder::Remove(const std::string& below) const {
     if (IsRealFolder(found)) {
         RemoveTree(path);
     } else if (IsLink(found)) {
-        RemoveLink(path);
+        RemoveOutsideWine(path);
     } else {
         RemoveFile(path);
     }
