@@ -11,6 +11,15 @@ else()
   target_compile_options(zkfpga_options INTERFACE -Wshadow)
 endif()
 
+if(WIN32)
+  # Text is char16_t on Windows too: the system's headers leave WCHAR to who has defined it (and their few inline
+  # functions for wchar_t must then be left out).
+  target_compile_definitions(zkfpga_options INTERFACE
+    WCHAR=char16_t __WCHAR_DEFINED __STRALIGN_H_ WIN32_LEAN_AND_MEAN NOMINMAX)
+  # The system's IUnknown, base of every interface, has no destructor of its own.
+  target_compile_options(zkfpga_options INTERFACE -Wno-non-virtual-dtor)
+endif()
+
 if(ZKFPGA_SANITIZE)
   target_compile_options(zkfpga_options INTERFACE
     -fsanitize=address,undefined -fno-sanitize-recover=all -fno-omit-frame-pointer)

@@ -15,7 +15,7 @@ write_basic_package_version_file(${CMAKE_BINARY_DIR}/zkfpgaConfigVersion.cmake C
 install(FILES ${CMAKE_BINARY_DIR}/zkfpgaConfig.cmake ${CMAKE_BINARY_DIR}/zkfpgaConfigVersion.cmake
   DESTINATION ${cmake_package_dir})
 
-install(FILES docs/host-guide.md TYPE DOC)
+install(FILES docs/host-guide.md docs/platforms.md TYPE DOC)
 install(DIRECTORY examples/host/ DESTINATION ${CMAKE_INSTALL_DOCDIR}/examples)
 
 # The folder of zkfpga.pc may lie at any depth: lib, lib64, lib/x86_64-linux-gnu.

@@ -1,6 +1,5 @@
 #include "cachebuilder/DeviceMenus.h"
 
-#include <csignal>
 #include <memory>
 
 #include <gtest/gtest.h>
@@ -10,6 +9,7 @@
 #include "qn/dsc/osdep/OSException.h"
 #include "restree/ResTreeNode.h"
 #include "support/ExactText.h"
+#include "support/ProcessEnd.h"
 
 namespace zkhw {
 namespace {
@@ -299,13 +299,13 @@ using DeviceMenusDeathTest = DeviceMenus;
 TEST_F(DeviceMenusDeathTest, EntryOfTheRootThatIsNoNodeIsATrap) {
     Load(deviceSpecs);
     root->SetProperty(u"XMLParseErrors", u"Error on line 1");
-    EXPECT_EXIT(Install(), testing::KilledBySignal(SIGTRAP), "");
+    EXPECT_EXIT(Install(), qn::dsc::osdep::EndsByTrap, "");
 }
 
 TEST_F(DeviceMenusDeathTest, LinkOfTheRootIsATrap) {
     Load(deviceSpecs);
     root->AddLinkEntry(u"L", u"FpgaDeviceSpecs");
-    EXPECT_EXIT(Install(), testing::KilledBySignal(SIGTRAP), "");
+    EXPECT_EXIT(Install(), qn::dsc::osdep::EndsByTrap, "");
 }
 
 TEST_F(DeviceMenusDeathTest, TargetsBeforeTheTrapAreServedAndThoseBehindItAreNot) {
@@ -313,7 +313,7 @@ TEST_F(DeviceMenusDeathTest, TargetsBeforeTheTrapAreServedAndThoseBehindItAreNot
     AddTarget("A", "virtex5");
     AddTarget("Z", "virtex5");
     root->SetProperty(u"XMLParseErrors", u"Error on line 1");
-    EXPECT_EXIT(Install(), testing::KilledBySignal(SIGTRAP), "");
+    EXPECT_EXIT(Install(), qn::dsc::osdep::EndsByTrap, "");
     EXPECT_EQ(In("A"), Names{"menu.txt"});
     EXPECT_EQ(In("Z"), Names{});
 }
@@ -326,7 +326,7 @@ TEST_F(DeviceMenusDeathTest, MissingSpecificationsComeBeforeTheTrap) {
 TEST_F(DeviceMenusDeathTest, CompilationSettingsThatAreNoNodeAreATrap) {
     Load(deviceSpecs);
     Load("<Target name=\"A\"><FPGACompilation>text</FPGACompilation></Target>");
-    EXPECT_EXIT(Install(), testing::KilledBySignal(SIGTRAP), "");
+    EXPECT_EXIT(Install(), qn::dsc::osdep::EndsByTrap, "");
 }
 
 TEST_F(DeviceMenus, RelativeFolderOfATargetThrows) {

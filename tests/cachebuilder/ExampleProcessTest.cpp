@@ -8,6 +8,7 @@
 
 #include <gtest/gtest.h>
 
+#include "support/ProcessEnd.h"
 #include "support/RunProgram.h"
 #include "support/TemporaryFolder.h"
 
@@ -113,7 +114,7 @@ TEST(ExampleProcess, ArgumentMayBeGivenInAnyForm) {
 TEST(ExampleProcess, FolderThatIsNotThereFailsAndLeavesNothing) {
     const ExampleCopy copy;
     const std::vector<std::string> before = copy.Tree();
-    EXPECT_EQ(copy.Run({copy.Root() + "/missing"}, "/").end, "exit 5");
+    EXPECT_EQ(copy.Run({copy.Root() + "/missing"}, "/").end, qn::dsc::osdep::EndWithResult(0x80004005));
     EXPECT_EQ(copy.Tree(), before);
 }
 

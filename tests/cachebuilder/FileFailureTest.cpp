@@ -4,13 +4,13 @@
 #include <gtest/gtest.h>
 
 #include <cerrno>
-#include <csignal>
 #include <new>
 #include <string>
 
 #include "cachebuilder/SmallInstallation.h"
 #include "qn/dsc/exception/Exception.h"
 #include "qn/dsc/osdep/OSException.h"
+#include "support/ProcessEnd.h"
 
 namespace zkhw {
 namespace {
@@ -189,7 +189,7 @@ TEST(ToolFileFailures, AnUnreadableResourceFileLeavesTheTraceThatEndsTheDevicePa
     // The file ends early, so it isn't well formed, and the report about it on the root is no node.
     SmallInstallation installation;
     installation.files.Fail(FileCall::ReadBytes, 1, EIO);
-    EXPECT_EXIT(OutcomeOf(installation), testing::KilledBySignal(SIGTRAP), "");
+    EXPECT_EXIT(OutcomeOf(installation), qn::dsc::osdep::EndsByTrap, "");
 }
 
 TEST(ToolFileFailures, NoSingleFailureEndsInAnythingElse) {

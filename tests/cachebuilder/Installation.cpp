@@ -6,6 +6,7 @@
 #include <gtest/gtest.h>
 
 #include "qn/dsc/osdep/path.h"
+#include "support/ProcessEnd.h"
 
 namespace zkhw {
 
@@ -93,7 +94,7 @@ std::string Installation::Run(const std::vector<std::string>& arguments, const s
     const ProgramResult result = RunProgram(root.Native(toolFile), arguments, workingFolder);
     EXPECT_EQ(result.output, "");
     // The run-time says something itself when an exception ends the process.
-    if (result.end != "SIGABRT") {
+    if (result.end != qn::dsc::osdep::endByAbort) {
         EXPECT_EQ(result.errors, "");
     }
     return result.end;

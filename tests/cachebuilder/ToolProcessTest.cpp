@@ -10,6 +10,7 @@
 
 #include "cachebuilder/Installation.h"
 #include "support/ExactText.h"
+#include "support/ProcessEnd.h"
 
 namespace zkhw {
 namespace {
@@ -74,19 +75,19 @@ TEST_F(Tool, TakesARelativeArgumentInTheSystemsForm) {
 
 TEST_F(Tool, LetterCaseOfTheArgumentDoesNotMatter) {
     installation.Write("x_resource.xml", "<FPGAHostSet><HostA>1</HostA></FPGAHostSet>");
-    EXPECT_EQ(installation.Run({"targets/qn/fpga"}, installation.Root().Native()), "exit 5");
+    EXPECT_EQ(installation.Run({"targets/qn/fpga"}, installation.Root().Native()), qn::dsc::osdep::EndWithResult(0x80004005));
     EXPECT_EQ(installation.Cache(), CacheOf("\n   <FPGAHostSet>\n      <HostA>1</HostA>\n   </FPGAHostSet>"));
 }
 
 TEST_F(Tool, TakesTheWorkingFolderAsADot) {
     installation.Write("hosts_resource.xml", "<FPGAHostSet><HostA>1</HostA></FPGAHostSet>");
-    EXPECT_EQ(installation.Run({"."}, Working()), "exit 5");
+    EXPECT_EQ(installation.Run({"."}, Working()), qn::dsc::osdep::EndWithResult(0x80004005));
     EXPECT_EQ(installation.Cache(), CacheOf("\n   <FPGAHostSet>\n      <HostA>1</HostA>\n   </FPGAHostSet>"));
 }
 
 TEST_F(Tool, EmptyArgumentIsTheWorkingFolder) {
     installation.Write("hosts_resource.xml", "<FPGAHostSet><HostA>1</HostA></FPGAHostSet>");
-    EXPECT_EQ(installation.Run({""}, Working()), "exit 5");
+    EXPECT_EQ(installation.Run({""}, Working()), qn::dsc::osdep::EndWithResult(0x80004005));
     EXPECT_EQ(installation.Cache(), CacheOf("\n   <FPGAHostSet>\n      <HostA>1</HostA>\n   </FPGAHostSet>"));
 }
 
@@ -102,14 +103,14 @@ TEST_F(Tool, FurtherArgumentsAreIgnored) {
 
 TEST_F(Tool, OptionsAreFolders) {
     WriteSoundInstallation();
-    EXPECT_EQ(installation.Run({"--help"}, Working()), "exit 5");
+    EXPECT_EQ(installation.Run({"--help"}, Working()), qn::dsc::osdep::EndWithResult(0x80004005));
     EXPECT_FALSE(installation.HasCache());
 }
 
 TEST_F(Tool, MissingFolderIsAFailureThatLeavesNothing) {
     WriteSoundInstallation();
     const Names before = installation.Root().Tree();
-    EXPECT_EQ(installation.Run({Working() + "/missing"}), "exit 5");
+    EXPECT_EQ(installation.Run({Working() + "/missing"}), qn::dsc::osdep::EndWithResult(0x80004005));
     // But for the tool itself, which was put there for the run.
     Names after = installation.Root().Tree();
     std::erase(after, Installation::Below("tool/zkfpga_make_resource_cache"));
@@ -118,20 +119,20 @@ TEST_F(Tool, MissingFolderIsAFailureThatLeavesNothing) {
 
 TEST_F(Tool, FileAsArgumentIsAFailure) {
     WriteSoundInstallation();
-    EXPECT_EQ(installation.Run({Working() + "/specs_resource.xml"}), "exit 5");
+    EXPECT_EQ(installation.Run({Working() + "/specs_resource.xml"}), qn::dsc::osdep::EndWithResult(0x80004005));
     EXPECT_FALSE(installation.HasCache());
     EXPECT_FALSE(installation.Has("a/menu.txt"));
 }
 
 TEST_F(Tool, OtherDriveIsAFailure) {
     WriteSoundInstallation();
-    EXPECT_EQ(installation.Run({"D:\\" + WorkingInSystemForm().substr(3)}), "exit 5");
-    EXPECT_EQ(installation.Run({"\\\\server\\share"}), "exit 5");
+    EXPECT_EQ(installation.Run({"D:\\" + WorkingInSystemForm().substr(3)}), qn::dsc::osdep::EndWithResult(0x80004005));
+    EXPECT_EQ(installation.Run({"\\\\server\\share"}), qn::dsc::osdep::EndWithResult(0x80004005));
     EXPECT_FALSE(installation.HasCache());
 }
 
 TEST_F(Tool, FolderWithoutResourceFilesGivesAnEmptyCacheAndAFailure) {
-    EXPECT_EQ(installation.Run(), "exit 5");
+    EXPECT_EQ(installation.Run(), qn::dsc::osdep::EndWithResult(0x80004005));
     EXPECT_EQ(installation.Cache(), CacheOf(""));
 }
 
@@ -156,7 +157,7 @@ TEST_F(Tool, WritesTheCacheByteForByte) {
     installation.Write("b_resource.xml", "<SomeNode><B>b</B></SomeNode>");
     installation.Write("BoardOne/BoardOne_resource.xml", "<Target name=\"BoardOne\"><Speed>40</Speed></Target>");
     // There are no device specifications.
-    EXPECT_EQ(installation.Run(), "exit 5");
+    EXPECT_EQ(installation.Run(), qn::dsc::osdep::EndWithResult(0x80004005));
     EXPECT_EQ(
         installation.Cache(),
         "<?xml version=\"1.0\"?>\n"
@@ -187,7 +188,7 @@ TEST_F(Tool, WritesTheCacheByteForByte) {
 TEST_F(Tool, UnorderedTargetOpensWithoutItsOrder) {
     installation.Write("BoardOne_resource.xml",
                        "<Target name=\"BoardOne\" ordered=\"false\"><Speed>40</Speed></Target>");
-    EXPECT_EQ(installation.Run(), "exit 5");
+    EXPECT_EQ(installation.Run(), qn::dsc::osdep::EndWithResult(0x80004005));
     EXPECT_NE(installation.Cache().find("\n   <Target name=\"BoardOne\">\n      <DeviceCategory></DeviceCategory>\n"),
               std::string::npos);
 }
@@ -196,7 +197,7 @@ TEST_F(Tool, BrokenResourceFileLeavesTheCacheAndEndsInATrap) {
     WriteSoundInstallation();
     installation.Write("broken_resource.xml", "<Target name=\"B\"><K>v</K>");
     installation.Write("y/y_resource.xml", TargetOfFamily("Y", "virtex5"));
-    EXPECT_EQ(installation.Run(), "SIGTRAP");
+    EXPECT_EQ(installation.Run(), qn::dsc::osdep::endByTrap);
     ASSERT_TRUE(installation.HasCache());
     EXPECT_NE(installation.Cache().find("<Target name=\"A\""), std::string::npos);
     EXPECT_EQ(installation.Cache().find("XMLParseErrors"), std::string::npos);
@@ -208,13 +209,13 @@ TEST_F(Tool, BrokenResourceFileLeavesTheCacheAndEndsInATrap) {
 TEST_F(Tool, EmptyResourceFileIsABrokenOne) {
     WriteSoundInstallation();
     installation.Write("empty_resource.xml", "");
-    EXPECT_EQ(installation.Run(), "SIGTRAP");
+    EXPECT_EQ(installation.Run(), qn::dsc::osdep::endByTrap);
     EXPECT_EQ(installation.Cache(), SoundCache());
 }
 
 TEST_F(Tool, BrokenResourceFileWithoutSpecificationsIsAPlainFailure) {
     installation.Write("broken_resource.xml", "<Target");
-    EXPECT_EQ(installation.Run(), "exit 5");
+    EXPECT_EQ(installation.Run(), qn::dsc::osdep::EndWithResult(0x80004005));
     EXPECT_EQ(installation.Cache(), CacheOf(""));
 }
 
@@ -229,7 +230,7 @@ TEST_F(Tool, ResourceFileThatCannotBeOpenedIsPassedOver) {
 TEST_F(Tool, CompilationSettingsThatAreATextEndInATrap) {
     WriteSoundInstallation();
     installation.Write("b/b_resource.xml", "<Target name=\"B\"><FPGACompilation>x</FPGACompilation></Target>");
-    EXPECT_EQ(installation.Run(), "SIGTRAP");
+    EXPECT_EQ(installation.Run(), qn::dsc::osdep::endByTrap);
     EXPECT_TRUE(installation.HasCache());
     EXPECT_TRUE(installation.Has("a/menu.txt"));
 }
@@ -237,14 +238,14 @@ TEST_F(Tool, CompilationSettingsThatAreATextEndInATrap) {
 TEST_F(Tool, CacheThatCannotBeOpenedIsAFailureBeforeTheMenus) {
     WriteSoundInstallation();
     installation.Root().MakeFolder(Installation::Below("resource_cache.xml"));
-    EXPECT_EQ(installation.Run(), "exit 5");
+    EXPECT_EQ(installation.Run(), qn::dsc::osdep::EndWithResult(0x80004005));
     EXPECT_FALSE(installation.Has("a/menu.txt"));
 }
 
 TEST_F(Tool, FullDiskIsAFailureBeforeTheMenus) {
     WriteSoundInstallation();
     installation.Root().MakeLink("/dev/full", Installation::Below("resource_cache.xml"));
-    EXPECT_EQ(installation.Run(), "exit 5");
+    EXPECT_EQ(installation.Run(), qn::dsc::osdep::EndWithResult(0x80004005));
     EXPECT_FALSE(installation.Has("a/menu.txt"));
 }
 
@@ -254,7 +255,7 @@ TEST_F(Tool, MissingFamilyIsAFailureBehindTheCache) {
                        "<Virtex6><XIPINMenusPath>menus/v6</XIPINMenusPath></Virtex6></FpgaDeviceSpecs>");
     installation.Root().WriteFile("menus/v5/menu.txt", "v5");
     installation.Write("a/a_resource.xml", TargetOfFamily("A", "virtex5"));
-    EXPECT_EQ(installation.Run(), "exit 5");
+    EXPECT_EQ(installation.Run(), qn::dsc::osdep::EndWithResult(0x80004005));
     EXPECT_EQ(installation.Cache(), SoundCache());
     EXPECT_FALSE(installation.Has("a/menu.txt"));
 }
@@ -263,7 +264,7 @@ TEST_F(Tool, FailedCopyEndsTheProcessAndKeepsWhatWasCopied) {
     WriteSoundInstallation();
     installation.Write("b/b_resource.xml", TargetOfFamily("B", "virtex5"));
     installation.Root().MakeFolder(Installation::Below("b/menu.txt"));
-    EXPECT_EQ(installation.Run(), "SIGABRT");
+    EXPECT_EQ(installation.Run(), qn::dsc::osdep::endByAbort);
     EXPECT_TRUE(installation.HasCache());
     EXPECT_EQ(installation.Read("a/menu.txt"), "v5");
 }
@@ -273,7 +274,7 @@ TEST_F(Tool, MenuPathThatCannotBeFoldedEndsTheProcess) {
     installation.Write("specs_resource.xml",
                        "<FpgaDeviceSpecs><Virtex5><XIPINMenusPath>menus/.../v5</XIPINMenusPath></Virtex5>"
                        "<Virtex6><K>v</K></Virtex6><spartan6><K>v</K></spartan6></FpgaDeviceSpecs>");
-    EXPECT_EQ(installation.Run(), "SIGABRT");
+    EXPECT_EQ(installation.Run(), qn::dsc::osdep::endByAbort);
     EXPECT_EQ(installation.Cache(), SoundCache());
 }
 
@@ -304,14 +305,14 @@ TEST_F(Tool, PathsAreWholeWhereTheHostStandsBesideTheTool) {
 TEST_F(Tool, IncludesStartAtTheFolderOfTheHost) {
     installation.Root().WriteFile("shared/part.xml", "<DeviceIDs><A>1</A></DeviceIDs>");
     installation.Write("a_resource.xml", "<Target name=\"A\"><:Include>shared/part.xml</:Include></Target>");
-    EXPECT_EQ(installation.Run(), "exit 5");
+    EXPECT_EQ(installation.Run(), qn::dsc::osdep::EndWithResult(0x80004005));
     EXPECT_NE(installation.Cache().find("\n      <DeviceIDs>\n         <A>1</A>\n      </DeviceIDs>\n"),
               std::string::npos);
 }
 
 TEST_F(Tool, NamesBeyondAsciiComeThrough) {
     installation.Write("\xC3\xA9/\xE2\x82\xAC_resource.xml", "<Target name=\"\xC3\xA9\"/>");
-    EXPECT_EQ(installation.Run(), "exit 5");
+    EXPECT_EQ(installation.Run(), qn::dsc::osdep::EndWithResult(0x80004005));
     EXPECT_EQ(installation.Cache(),
               CacheOf(PlainTargetInCache("\xC3\xA9", "Targets\\QN\\FPGA\\\xC3\xA9\\\xE2\x82\xAC_resource.xml")));
 }
@@ -326,7 +327,7 @@ TEST_F(Tool, DocumentOf100000LevelsIsReadAndLeftBehind) {
         text += "</N>";
     }
     installation.Write("deep_resource.xml", text + "</Target>");
-    EXPECT_EQ(installation.Run(), "exit 5");
+    EXPECT_EQ(installation.Run(), qn::dsc::osdep::EndWithResult(0x80004005));
     EXPECT_EQ(installation.Cache(), CacheOf(PlainTargetInCache("Deep", "Targets\\QN\\FPGA\\deep_resource.xml")));
 }
 

@@ -1,3 +1,5 @@
 // A run-time module for tests that has none of the host's functions.
-extern "C" __attribute__((visibility("default"))) int poorRuntimeMark;
+#include "qn/dsc/osdep/Export.h"
+
+extern "C" ZKFPGA_EXPORT int poorRuntimeMark;
 int poorRuntimeMark = 1;

@@ -6,9 +6,10 @@
 #include <cstring>
 #include <utility>
 
+#include "qn/dsc/osdep/Export.h"
 #include "zkfpga/host_runtime.h"
 
-#define EXPORTED extern "C" __attribute__((visibility("default")))
+#define EXPORTED extern "C" ZKFPGA_EXPORT
 
 EXPORTED StandInRuntime standInRuntime;
 StandInRuntime standInRuntime;

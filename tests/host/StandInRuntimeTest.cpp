@@ -75,7 +75,7 @@ TEST_F(StandInRuntimeDeathTest, PathThatHasGoneEndsTheProcess) {
 }
 
 TEST_F(StandInRuntimeDeathTest, FunctionThatNobodyMayCallEndsTheProcess) {
-    EXPECT_DEATH(reinterpret_cast<void (*)()>(dlsym(module, "HostCopyFile"))(),
+    EXPECT_DEATH(reinterpret_cast<void (*)()>(qn::dsc::osdep::FindInModule(module, "HostCopyFile"))(),
                  "stand-in run-time: HostCopyFile: called");
 }
 

@@ -4,7 +4,6 @@
 #include <iterator>
 #include <thread>
 
-#include <pthread.h>
 
 #include "host/HostTest.h"
 #include "hostbridge/HostFunctionTable.h"
@@ -27,7 +26,8 @@ static_assert(std::is_same_v<decltype(zkhw::HostResizeArray), decltype(::HostRes
 static_assert(std::is_same_v<decltype(zkhw::HostGetLanguageName), decltype(::HostGetLanguageName)>);
 // A GUID under another name, by value.
 static_assert(std::is_same_v<decltype(::QueryInterfaceForZKRefNum), HRESULT(uint32_t, GUID, void**)>);
-static_assert(std::is_same_v<decltype(zkhw::QueryInterfaceForZKRefNum), HRESULT(uint32_t, Guid, void**)>);
+static_assert(std::is_same_v<decltype(zkhw::QueryInterfaceForZKRefNum), int32_t(uint32_t, Guid, void**)>);
+static_assert(sizeof(HRESULT) == sizeof(int32_t) && HRESULT(-1) < 0);
 static_assert(sizeof(Guid) == sizeof(GUID));
 static_assert(std::is_same_v<decltype(zkhw::HostEmptyPath), decltype(::HostEmptyPath)>);
 static_assert(std::is_same_v<decltype(zkhw::HostPathToString), decltype(::HostPathToString)>);
@@ -185,16 +185,13 @@ TEST(HostFunctionsOfTwoModules, EachThreadCallsTheModuleInItsSlot) {
     EXPECT_IN_CHILD([] {
         void* first = LoadModule(STAND_IN_RUNTIME);
         void* second = LoadModule(UNNAMED_RUNTIME);
-        pthread_key_t key = 0;
-        if (pthread_key_create(&key, nullptr) != 0) {
-            return false;
-        }
+        const uint32_t key = qn::dsc::osdep::MakeThreadSlot();
         SetZKRTTLSIndex(key);
         // One thread at a time: a row is written without a lock.
         const auto callOnThread = [&](void* module) {
             bool bound = false;
             std::thread([&] {
-                pthread_setspecific(key, module);
+                qn::dsc::osdep::SetThreadSlot(key, module);
                 zkhw::HostDestroyPath(zkhw::HostEmptyPath(nullptr));
                 bound = RecordOf(HostFunction::HostEmptyPath).module == module;
             }).join();

@@ -1,5 +1,3 @@
-#include <pthread.h>
-
 #include "host/LoadedRuntime.h"
 #include "hostbridge/RuntimeModule.h"
 #include "support/RunProgram.h"
@@ -29,8 +27,7 @@ TEST(RuntimeExports, NamedModuleCanBeTakenBack) {
 TEST(RuntimeExports, ThreadWithAnEmptySlotFallsThroughToTheNamedModule) {
     EXPECT_IN_CHILD([] {
         void* module = LoadModule(UNNAMED_RUNTIME);
-        pthread_key_t key = 0;
-        pthread_key_create(&key, nullptr);
+        const uint32_t key = qn::dsc::osdep::MakeThreadSlot();
         SetZKRTModule(module);
         SetZKRTTLSIndex(key);
         return runtimeTlsIndex == key && FindRuntimeModule() == module;
@@ -40,9 +37,8 @@ TEST(RuntimeExports, ThreadWithAnEmptySlotFallsThroughToTheNamedModule) {
 TEST(RuntimeExports, SlotIsLookedAtUntilItIsTakenBack) {
     EXPECT_IN_CHILD([] {
         void* module = LoadModule(UNNAMED_RUNTIME);
-        pthread_key_t key = 0;
-        pthread_key_create(&key, nullptr);
-        pthread_setspecific(key, module);
+        const uint32_t key = qn::dsc::osdep::MakeThreadSlot();
+        qn::dsc::osdep::SetThreadSlot(key, module);
         SetZKRTTLSIndex(key);
         const bool found = FindRuntimeModule() == module;
         SetZKRTTLSIndex(0xFFFFFFFF);

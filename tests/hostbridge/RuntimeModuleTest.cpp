@@ -2,26 +2,25 @@
 
 #include <thread>
 
-#include <pthread.h>
-
 #include "host/LoadedRuntime.h"
 #include "support/RunProgram.h"
 
 namespace zkhw {
 namespace {
 
+using qn::dsc::osdep::MakeThreadSlot;
 using qn::dsc::osdep::RunProgram;
+using qn::dsc::osdep::SetThreadSlot;
+using qn::dsc::osdep::UnloadModule;
 
 int first = 1;
 int second = 2;
 
 // A slot of the system, in which the calling thread holds `value`.
 uint32_t MakeSlot(void* value) {
-    pthread_key_t key = 0;
-    if (pthread_key_create(&key, nullptr) != 0 || pthread_setspecific(key, value) != 0) {
-        std::abort();
-    }
-    return key;
+    const uint32_t slot = MakeThreadSlot();
+    SetThreadSlot(slot, value);
+    return slot;
 }
 
 TEST(RuntimeModule, ThereIsNoneInAPlainProcess) {
@@ -96,7 +95,7 @@ TEST(RuntimeModule, OneThatComesAfterLooksInVainIsFound) {
 
 TEST(RuntimeModule, OneThatHasGoneAndComeAgainIsFound) {
     EXPECT_IN_CHILD([] {
-        dlclose(LoadModule(STAND_IN_RUNTIME));
+        UnloadModule(LoadModule(STAND_IN_RUNTIME));
         const bool wasFound = FindRuntimeModule() != nullptr;
         void* module = LoadModule(STAND_IN_RUNTIME);
         return !wasFound && FindRuntimeModule() == module;
@@ -107,7 +106,7 @@ TEST(RuntimeModule, LookingKeepsNoModuleLoaded) {
     EXPECT_IN_CHILD([] {
         void* module = LoadModule(STAND_IN_RUNTIME);
         const bool found = FindRuntimeModule() == module && FindRuntimeModule() == module;
-        dlclose(module);
+        UnloadModule(module);
         return found && FindRuntimeModule() == nullptr;
     });
 }
@@ -119,33 +118,33 @@ TEST(RuntimeModule, EachIsFoundOnceThoseBeforeItHaveGone) {
         runtimeModule = &first;
         runtimeTlsIndex = MakeSlot(&second);
         bool found = FindRuntimeModule() == &second;
-        pthread_setspecific(runtimeTlsIndex, nullptr);
+        SetThreadSlot(runtimeTlsIndex, nullptr);
         found = found && FindRuntimeModule() == &first;
         runtimeModule = nullptr;
         found = found && FindRuntimeModule() == zkrt;
-        dlclose(zkrt);
+        UnloadModule(zkrt);
         found = found && FindRuntimeModule() == zkffrt;
-        dlclose(zkffrt);
+        UnloadModule(zkffrt);
         return found && FindRuntimeModule() == nullptr;
     });
 }
 
 TEST(RuntimeModule, MainModuleThatExportsAVersionIsTheRuntime) {
-    EXPECT_EQ(RunProgram(MAIN_MODULE_PROBES "/main_module_gZKRTVersion", {}, "/").end, "exit 0");
+    EXPECT_EQ(RunProgram(MAIN_MODULE_PROBES "/main_module_gZKRTVersion" PROGRAM_SUFFIX, {}, "/").end, "exit 0");
 }
 
 TEST(RuntimeModule, MainModuleThatMakesHandlesIsTheRuntime) {
-    EXPECT_EQ(RunProgram(MAIN_MODULE_PROBES "/main_module_HostNewHandle", {}, "/").end, "exit 0");
+    EXPECT_EQ(RunProgram(MAIN_MODULE_PROBES "/main_module_HostNewHandle" PROGRAM_SUFFIX, {}, "/").end, "exit 0");
 }
 
 TEST(RuntimeModule, MainModuleThatIsTheRuntimeComesBeforeLoadedOnes) {
-    EXPECT_EQ(RunProgram(MAIN_MODULE_PROBES "/main_module_gZKRTVersion", {STAND_IN_RUNTIME}, "/").end, "exit 0");
-    EXPECT_EQ(RunProgram(MAIN_MODULE_PROBES "/main_module_HostNewHandle", {STAND_IN_RUNTIME}, "/").end, "exit 0");
-    EXPECT_EQ(RunProgram(MAIN_MODULE_PROBES "/main_module_OtherName", {STAND_IN_RUNTIME}, "/").end, "exit 3");
+    EXPECT_EQ(RunProgram(MAIN_MODULE_PROBES "/main_module_gZKRTVersion" PROGRAM_SUFFIX, {STAND_IN_RUNTIME}, "/").end, "exit 0");
+    EXPECT_EQ(RunProgram(MAIN_MODULE_PROBES "/main_module_HostNewHandle" PROGRAM_SUFFIX, {STAND_IN_RUNTIME}, "/").end, "exit 0");
+    EXPECT_EQ(RunProgram(MAIN_MODULE_PROBES "/main_module_OtherName" PROGRAM_SUFFIX, {STAND_IN_RUNTIME}, "/").end, "exit 7");
 }
 
 TEST(RuntimeModule, MainModuleThatExportsSomethingElseIsNot) {
-    EXPECT_EQ(RunProgram(MAIN_MODULE_PROBES "/main_module_OtherName", {}, "/").end, "exit 3");
+    EXPECT_EQ(RunProgram(MAIN_MODULE_PROBES "/main_module_OtherName" PROGRAM_SUFFIX, {}, "/").end, "exit 7");
 }
 
 }  // namespace

@@ -51,6 +51,7 @@ TEST(InstalledFiles, AreTheToolTheLibraryItsHeadersItsPackagesAndTheGuide) {
         "share/doc/zkfpga/examples/reserve/CMakeLists.txt",
         "share/doc/zkfpga/examples/reserve/reserve.cpp",
         "share/doc/zkfpga/host-guide.md",
+        "share/doc/zkfpga/platforms.md",
         "share/man/man1/zkfpga_make_resource_cache.1",
     };
     std::sort(expected.begin(), expected.end());

@@ -219,7 +219,7 @@ TEST_F(AdapterObserverSetTest, TheIdOfAllOnesIsANumberLikeAnyOtherInAdvise) {
 
 TEST_F(AdapterObserverSetTest, UnadviseWithAllOnesEndsAllIdsOfTheObserverAtTheNodeAlone) {
     const View view = tree.At(u"a");
-    for (const ULONG id : {0U, 7U, 8U, all - 1, all}) {
+    for (const ULONG id : std::initializer_list<ULONG>{0, 7, 8, all - 1, all}) {
         view->Advise(&observer, all, id);
     }
     view->Advise(&other, all, 7);

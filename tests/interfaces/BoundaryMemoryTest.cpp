@@ -1,12 +1,12 @@
 #include <gtest/gtest.h>
 
-#include <csignal>
 #include <cstdint>
 #include <cstring>
 
 #include "interfaces/BoundaryText.h"
 #include "interfaces/support/HostMemory.h"
 #include "support/AllocationFaultScope.h"
+#include "support/ProcessEnd.h"
 #include "zkfpga/memory.h"
 
 namespace zkhw {
@@ -85,8 +85,8 @@ TEST(BoundaryString, FreeingWhatIsNoStringTraps) {
     auto* const block = static_cast<char*>(CoTaskMemAlloc(64));
     std::memset(block, 0, 64);
     auto* const string = reinterpret_cast<BSTR>(block + 16);
-    EXPECT_EXIT(SysFreeString(string), ::testing::KilledBySignal(SIGTRAP), "");
-    EXPECT_EXIT(SysStringLen(string), ::testing::KilledBySignal(SIGTRAP), "");
+    EXPECT_EXIT(SysFreeString(string), qn::dsc::osdep::EndsByTrap, "");
+    EXPECT_EXIT(SysStringLen(string), qn::dsc::osdep::EndsByTrap, "");
     CoTaskMemFree(block);
 }
 

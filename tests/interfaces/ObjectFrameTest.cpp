@@ -5,6 +5,7 @@
 
 #include "interfaces/CQNComObject.h"
 #include "interfaces/support/NodeViewTest.h"
+#include "support/ProcessEnd.h"
 
 namespace zkhw {
 namespace {
@@ -150,7 +151,7 @@ TYPED_TEST(ObjectFrame, OnCreateGivesZeroAndDoesNothing) {
 
 TYPED_TEST(ObjectFrame, EveryBrokenContractTraps) {
     ::testing::FLAGS_gtest_death_test_style = "fast";
-    const auto trapped = ::testing::KilledBySignal(SIGTRAP);
+    const auto trapped = qn::dsc::osdep::EndsByTrap;
     auto* object = TestFixture::Make();
     object->AddRef();
     void* result = nullptr;

@@ -1,6 +1,5 @@
 // The owner as a host sees it, and the host's object that it stands for.
 
-#include <csignal>
 #include <memory>
 
 #include <gtest/gtest.h>
@@ -8,6 +7,7 @@
 #include "interfaces/support/HostProject.h"
 #include "interfaces/support/OwnedTree.h"
 #include "restree/AdapterFactory.h"
+#include "support/ProcessEnd.h"
 #include "zkfpga/tree_owner.h"
 
 namespace zkhw {
@@ -72,7 +72,7 @@ TEST_F(ResTreeOwnerAdapterTest, GetRootNodeOfNullIsAnError) {
 TEST_F(ResTreeOwnerAdapterTest, GetRootNodeWithoutAnObjectTraps) {
     const OwnerPointer made = MakeOwnerObject(nullptr);
     IzkhwResourceTreeNode* root = nullptr;
-    EXPECT_EXIT(made->GetRootNode(&root), testing::KilledBySignal(SIGTRAP), "");
+    EXPECT_EXIT(made->GetRootNode(&root), qn::dsc::osdep::EndsByTrap, "");
 }
 
 TEST_F(ResTreeOwnerAdapterTest, TheObjectKnowsItsOwnIdAndIUnknown) {

@@ -1,6 +1,5 @@
 // How an owner hands out the interfaces of its tree.
 
-#include <csignal>
 #include <memory>
 #include <string>
 
@@ -9,6 +8,7 @@
 #include "interfaces/support/HostObserver.h"
 #include "interfaces/support/HostProject.h"
 #include "interfaces/support/OwnedTree.h"
+#include "support/ProcessEnd.h"
 #include "zkfpga/tree_owner.h"
 
 namespace zkhw {
@@ -204,7 +204,7 @@ TEST_F(TreeQueryTest, TheTreeObjectGoesBeforeTheOwnersObject) {
 
 TEST_F(TreeQueryTest, ANullResultTraps) {
     EXPECT_EXIT(owner->QueryTreeInterface(IID_IzkhwResourceTreeNode, nullptr, nullptr, nullptr),
-                testing::KilledBySignal(SIGTRAP), "");
+                qn::dsc::osdep::EndsByTrap, "");
 }
 
 }  // namespace

@@ -1,7 +1,9 @@
 // A host's accessor module: counts what it is asked, and answers with a number that tells so.
 #include <cstdint>
 
-#define EXPORTED extern "C" __attribute__((visibility("default")))
+#include "qn/dsc/osdep/Export.h"
+
+#define EXPORTED extern "C" ZKFPGA_EXPORT
 
 EXPORTED void* lastNode;
 void* lastNode = nullptr;

@@ -1,10 +1,10 @@
 // What concerns the first use of the library in a process: each test does it in a child, and the parent never does.
 
-#include <csignal>
 #include <new>
 
 #include "library/PlainHostTest.h"
 #include "support/AllocationFaultScope.h"
+#include "support/ProcessEnd.h"
 #include "zkfpga/host_interfaces.h"
 #include "zkfpga/tree_owner.h"
 
@@ -138,7 +138,7 @@ TEST_F(FirstUseWithoutMemory, QueryForAnInterfaceTraps) {
         const AllocationFaultScope fault(1, true);
         QueryResourceTreeInterface(&IID_IzkEIOGResourceTree, nullptr, nullptr, &result);
     };
-    EXPECT_EXIT(query(), testing::KilledBySignal(SIGTRAP), "^$");
+    EXPECT_EXIT(query(), qn::dsc::osdep::EndsByTrap, "^$");
 }
 
 // The first query with the `nth` allocation failing, and then a second one with memory.

@@ -4,6 +4,7 @@
 
 #include "host/LoadedRuntime.h"
 #include "library/HostInstallation.h"
+#include "support/ProcessEnd.h"
 
 namespace {
 
@@ -32,7 +33,7 @@ class HostFailure : public testing::Test {
     }
 
     static void ExpectTrap(const ProgramResult& result, const std::string& answers = "") {
-        EXPECT_EQ(result.end, "SIGTRAP");
+        EXPECT_EQ(result.end, qn::dsc::osdep::endByTrap);
         EXPECT_EQ(result.output, "ready\n" + answers);
         EXPECT_EQ(result.errors, "");
     }

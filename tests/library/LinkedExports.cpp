@@ -1,7 +1,8 @@
 #include "library/Exports.h"
+#include "qn/dsc/osdep/Export.h"
 
 // The program's own run-time functions make it the host's run-time module.
-extern "C" __attribute__((visibility("default"))) int gZKRTVersion;
+extern "C" ZKFPGA_EXPORT int gZKRTVersion;
 int gZKRTVersion = 1;
 
 Exports GetExports(const char*) {

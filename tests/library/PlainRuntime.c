@@ -4,9 +4,10 @@
 #include <stdlib.h>
 #include <string.h>
 
+#include "qn/dsc/osdep/Export.h"
 #include "zkfpga/host_runtime.h"
 
-#define EXPORTED __attribute__((visibility("default")))
+#define EXPORTED ZKFPGA_EXPORT
 
 EXPORTED extern char specialFolder[4096];
 EXPORTED extern int liveHandles;

@@ -1,8 +1,8 @@
 // The exported queries on a tree that was read from resource files.
 
-#include <csignal>
 
 #include "library/ExportsTest.h"
+#include "support/ProcessEnd.h"
 
 namespace {
 
@@ -177,8 +177,8 @@ TEST_F(TreeExports, ErrorWhileADumpIsStoredLeavesTheFunction) {
 }
 
 TEST_F(TreeExports, DumpOfNoNodeTraps) {
-    EXPECT_EXIT(FPGAResTree_Dump("a", "b", "", nullptr), testing::KilledBySignal(SIGTRAP), "^$");
-    EXPECT_EXIT(FPGAResTree_Dump("", "", "", nullptr), testing::KilledBySignal(SIGTRAP), "^$");
+    EXPECT_EXIT(FPGAResTree_Dump("a", "b", "", nullptr), qn::dsc::osdep::EndsByTrap, "^$");
+    EXPECT_EXIT(FPGAResTree_Dump("", "", "", nullptr), qn::dsc::osdep::EndsByTrap, "^$");
 }
 
 TEST_F(TreeExports, IdsOfOneObjectGiveOnePointer) {

@@ -8,8 +8,8 @@
 namespace qn::dsc::osdep {
 
 struct ProgramResult {
-    // What the program's end looks like from outside: "exit 0" to "exit 255", or the signal: "SIGTRAP", "SIGABRT" or
-    // its number. "not started" if the program can't be run.
+    // What the program's end looks like from outside (ProcessEnd.h): EndWithResult, endByTrap, endByAbort, or "signal"
+    // and its number. "not started" if the program can't be run.
     std::string end;
     std::string output;
     std::string errors;

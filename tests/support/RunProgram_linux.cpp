@@ -9,6 +9,8 @@
 #include <sys/wait.h>
 #include <unistd.h>
 
+#include "support/ProcessEnd.h"
+
 namespace qn::dsc::osdep {
 
 namespace {
@@ -54,13 +56,13 @@ constexpr int notStarted = 127;
 
 std::string DescribeEnd(int status) {
     if (WIFEXITED(status)) {
-        return WEXITSTATUS(status) == notStarted ? "not started" : "exit " + std::to_string(WEXITSTATUS(status));
+        return WEXITSTATUS(status) == notStarted ? "not started" : EndWithResult(static_cast<uint32_t>(WEXITSTATUS(status)));
     }
     switch (WTERMSIG(status)) {
         case SIGTRAP:
-            return "SIGTRAP";
+            return endByTrap;
         case SIGABRT:
-            return "SIGABRT";
+            return endByAbort;
         default:
             return "signal " + std::to_string(WTERMSIG(status));
     }

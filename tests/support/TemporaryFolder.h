@@ -33,7 +33,7 @@ class TemporaryFolder {
     // With the folders above that are missing.
     void WriteFile(const std::string& below, const std::string& bytes) const;
     std::string ReadFile(const std::string& below) const;
-    // `target` is the text of the link, whether anything is there or not.
+    // Links and pipes need Linux, be it below Wine. `target` is the text of the link, whether anything is there or not.
     void MakeLink(const std::string& target, const std::string& below) const;
     void MakePipe(const std::string& below) const;
     void Remove(const std::string& below) const;
@@ -41,7 +41,7 @@ class TemporaryFolder {
     void SetFileTime(const std::string& below, int64_t seconds, int64_t nanoseconds) const;
     // Without following a link.
     bool Exists(const std::string& below) const;
-    // The permission bits.
+    // The permission bits. On Linux only.
     uint32_t Permissions(const std::string& below) const;
 
     // Everything in it, each path once, in byte order; folders with a slash at the end, links not entered.
@@ -61,8 +61,8 @@ class WorkingFolderScope {
     WorkingFolderScope& operator=(const WorkingFolderScope&) = delete;
 
   private:
-    // A descriptor: the folder's path may be too long to go back to.
-    int before;
+    // A path; on Linux that of a descriptor, since the folder's own may be too long to go back to.
+    std::string before;
 };
 
 }  // namespace qn::dsc::osdep

@@ -151,13 +151,13 @@ std::vector<std::string> TemporaryFolder::Tree() const {
 }
 
 WorkingFolderScope::WorkingFolderScope(const std::string& native)
-    : before(open(".", O_RDONLY | O_DIRECTORY | O_CLOEXEC)) {
+    : before("/proc/self/fd/" + std::to_string(open(".", O_RDONLY | O_DIRECTORY | O_CLOEXEC))) {
     EXPECT_EQ(chdir(native.c_str()), 0) << native << ": " << std::strerror(errno);
 }
 
 WorkingFolderScope::~WorkingFolderScope() {
-    EXPECT_EQ(fchdir(before), 0) << std::strerror(errno);
-    close(before);
+    EXPECT_EQ(chdir(before.c_str()), 0) << std::strerror(errno);
+    close(std::stoi(before.substr(before.rfind('/') + 1)));
 }
 
 }  // namespace qn::dsc::osdep

@@ -31,12 +31,15 @@ int CompareFromStart(std::u16string_view a, std::u16string_view b);
 //    other units in both texts as the same mark does, the text whose mark has fewer units before it is the greater;
 //    with equally many, "'" is before "-". The text whose marks end first is the lesser.
 //
+// This is the order on Linux, and that of CompareStringW with NORM_IGNORECASE as far as it has been compared (see
+// docs/platforms.md). On Windows that call decides everything.
+//
 // Where a character outside ASCII must be compared and there is no usable collation, the texts count as equal.
 // Linear in the texts up to the first difference; texts of ASCII alone never touch the collation library. Texts outside
 // ASCII of more than 256 units are copied: std::bad_alloc if there is no memory for that.
 inline int Compare(std::u16string_view a, std::u16string_view b) {
     // The first unit decides more often than not.
-    if (!a.empty() && !b.empty() && (a[0] | b[0]) < 0x80) {
+    if (hasAsciiOrder && !a.empty() && !b.empty() && (a[0] | b[0]) < 0x80) {
         const uint8_t weightOfA = asciiWeights[a[0]];
         const uint8_t weightOfB = asciiWeights[b[0]];
         if (weightOfA != weightOfB && weightOfA != 0 && weightOfB != 0 && CountsOrEnds(a, 1) && CountsOrEnds(b, 1)) {

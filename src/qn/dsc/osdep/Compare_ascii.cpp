@@ -168,7 +168,7 @@ int CompareMarks(std::u16string_view a, std::u16string_view b) {
 }
 
 int CompareFromStart(std::u16string_view a, std::u16string_view b) {
-    const int decided = CompareAscii(a, b);
+    const int decided = hasAsciiOrder ? CompareAscii(a, b) : undecidedByAscii;
     return decided == undecidedByAscii ? CompareCollated(a, b) : decided;
 }
 

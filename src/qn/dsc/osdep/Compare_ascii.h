@@ -9,6 +9,13 @@
 
 namespace qn::dsc::osdep {
 
+// Whether ASCII has the one order that is written out here, so that it need not be asked of the platform.
+#if defined(_WIN32)
+inline constexpr bool hasAsciiOrder = false;
+#else
+inline constexpr bool hasAsciiOrder = true;
+#endif
+
 // What CompareAscii gives for texts that it cannot tell apart without the user's collation.
 inline constexpr int undecidedByAscii = 2;
 

@@ -9,17 +9,6 @@
 
 namespace qn::dsc::osdep {
 
-namespace {
-
-bool NeedsGreaterClass(size_t oldSize, size_t newSize) {
-    if (newSize > maximumClassedSize) {
-        return true;
-    }
-    return oldSize <= maximumClassedSize && SizeClassOf(newSize) > SizeClassOf(oldSize);
-}
-
-}  // namespace
-
 void* MallocAllocator::Allocate(size_t size) {
     if (ShouldFailAllocation()) {
         return nullptr;

@@ -14,11 +14,12 @@ using CodePointer = void (*)();
 ModuleHandle GetMainModule();
 
 // An already loaded module, wherever it was loaded from; null if it isn't. `name` is a file name as on Windows: "x.dll"
-// is libx.so on Linux, and "x" with any other ending is x.so.
+// is libx.so on Linux, and "x" with any other ending is x.so there.
 ModuleHandle FindLoadedModule(const char* name);
 
 // How many modules have been loaded into the process so far, those that have gone included. While the number stays, no
-// module has come: one that was looked for in vain isn't there still.
+// module has come: one that was looked for in vain isn't there still. On Windows, which doesn't count, the number is
+// another one at each call.
 uint64_t CountLoadedModules();
 
 // The address of an export of `module`; null if it has none of that name.

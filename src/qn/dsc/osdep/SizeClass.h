@@ -66,6 +66,15 @@ constexpr uint32_t SizeClassOf(size_t size) {
     return detail::lastStepOf16 + 1 + 4 * doubling + quarter;
 }
 
+// Whether a block that was made for `oldSize` bytes is of another class than one for `newSize`, which is more. Blocks
+// above the greatest class always are.
+constexpr bool NeedsGreaterClass(size_t oldSize, size_t newSize) {
+    if (newSize > maximumClassedSize) {
+        return true;
+    }
+    return oldSize <= maximumClassedSize && SizeClassOf(newSize) > SizeClassOf(oldSize);
+}
+
 static_assert(SizeClassOf(512) == 39 && SizeClassOf(513) == 40 && SizeClassOf(640) == 40 && SizeClassOf(641) == 41);
 static_assert(SizeClassOf(maximumClassedSize) == sizeClassCount - 1);
 static_assert(SizeOfClass(40) == 640 && SizeOfClass(43) == 1024 && SizeOfClass(63) == maximumClassedSize);

@@ -1,4 +1,5 @@
-// The contract of task memory, for the allocator that was chosen and for both that can be.
+// The contract of task memory, for the allocator that was chosen and for all that can be (TASK_ALLOCATORS is the
+// platform's list of them).
 
 #include "qn/dsc/osdep/TaskMemory.h"
 
@@ -11,10 +12,9 @@
 #include <thread>
 #include <vector>
 
-#include "qn/dsc/osdep/MallocAllocator.h"
-#include "qn/dsc/osdep/PoolAllocator.h"
 #include "qn/dsc/osdep/SizeClass.h"
 #include "support/AllocationFaultScope.h"
+#include TASK_ALLOCATORS
 
 namespace qn::dsc::osdep {
 namespace {
@@ -28,8 +28,7 @@ class ChosenAllocator {
 
 template <class Allocator>
 class TaskMemory : public testing::Test {};
-using Allocators = testing::Types<ChosenAllocator, PoolAllocator, MallocAllocator>;
-TYPED_TEST_SUITE(TaskMemory, Allocators);
+TYPED_TEST_SUITE(TaskMemory, TaskAllocators<ChosenAllocator>);
 
 constexpr size_t sampleSizes[] = {0,   1,   2,    15,   16,   17,    24,    100,   511,   512,    513,
                                   640, 641, 1024, 4096, 9000, 32767, 32768, 32769, 65536, 1000000};

@@ -1,12 +1,11 @@
 #include "qn/dsc/osdep/FatalError.h"
 
-#include <cstdio>
 #include <cstdlib>
 
 namespace qn::dsc::osdep {
 
 void FatalError(const char* message) {
-    std::fprintf(stderr, "Fatal Error: %s\n", message);
+    ShowFatalMessage(message);
     std::_Exit(1);
 }
 

@@ -1,0 +1,17 @@
+# A release, packed from what is installed: cpack in the build folder gives a .deb for Linux, a .zip for Windows.
+set(CPACK_PACKAGE_NAME zkfpga)
+set(CPACK_PACKAGE_VENDOR "The zkfpga developers")
+set(CPACK_PACKAGE_CONTACT "The zkfpga developers <zkfpga@localhost>")
+set(CPACK_PACKAGE_DESCRIPTION_SUMMARY "${PROJECT_DESCRIPTION}")
+set(CPACK_STRIP_FILES ON)
+if(WIN32)
+  set(CPACK_GENERATOR ZIP)
+  set(CPACK_SYSTEM_NAME windows-x86_64)
+else()
+  set(CPACK_GENERATOR DEB)
+  set(CPACK_DEBIAN_FILE_NAME DEB-DEFAULT)
+  set(CPACK_DEBIAN_PACKAGE_SECTION utils)
+  # The libraries that the programs need, by what they are linked to.
+  set(CPACK_DEBIAN_PACKAGE_SHLIBDEPS ON)
+endif()
+include(CPack)

@@ -1,0 +1,92 @@
+# Tests that hold on Linux alone, each group with the reason. On Windows every other test of the same sources runs.
+set(linux_only
+  # Folders and files that Windows doesn't have, or that Wine doesn't show: pipes, links that lead nowhere or in a
+  # circle, permission bits, devices such as /dev/full, names that no text in UTF-16 can bear or that hold a backslash
+  # or a wildcard, two names that differ in letter case only, folders that are removed while a process is in them.
+  BinaryFile.AFullDeviceRefusesTheWrite
+  BinaryFile.APipeThatNobodyReadsIsNotWaitedForByAWriter
+  BinaryFile.CreateMakesAFileForItsOwnerAlone
+  BinaryFile.OnlyRegularFilesAreOpenedForReading
+  CopyDirectoryTree.ADanglingLinkStopsTheCopy
+  CopyDirectoryTree.APipeStopsTheCopyAtOnce
+  CopyDirectoryTree.EveryNativeNameIsCopied
+  CopyDirectoryTree.NamesThatDifferInCaseBecomeOne
+  CopyFileTo.OnlyRegularFilesAreCopied
+  CopyFileTo.TheCopyBelongsToItsOwnerAlone
+  FileFinder.ABackslashInANameIsAUnitOfItsOwn
+  FileFinder.AWildcardInAFolderIsAnOrdinarySign
+  FileFinder.FindsLinksWhereverTheyLead
+  FileFinder.ListsAFolderOfManyNamesInOrder
+  FileFinder.NamesThatDifferInCaseAreOrderedByTheirUnits
+  FileFinder.NativeNamesSurviveTheRoundTrip
+  GetCurrentDirectoryPath.OfARemovedFolderIsEmpty
+  Include.OfWhatIsNoFileIsReported
+  IsDirectory.AnythingElseIsNot
+  IsExistingFile.WhatIsNoFolderIsAFile
+  LoadResourceFile.NamesMayHoldAnyBytes
+  LoadResourceFile.ThatCannotBeOpenedLeavesTheTreeAlone
+  TextStream.AFullDiskIsNoticedAtOneByte
+  TextStream.APipeThatNobodyReadsIsNotWaitedForByAWriter
+  TextStream.NarrowPathsLeadToEveryNativeName
+  TextStream.OnlyRegularFilesAreOpenedForReading
+  TextStream.OpeningForWritingKeepsTheFilesOwnPermissions
+
+  # Paths: on Linux there is one drive, native paths are taken as arguments, and the working folder may be longer than
+  # the 261 bytes that Windows is asked for.
+  GetCurrentDirectoryPath.IsInTheSystemsForm
+  GetCurrentDirectoryPath.MayBeLongerThan260Units
+  GetCurrentDirectoryPath.OfTheRootIsTheDrive
+  PathFromArgument.*
+
+  # A call inside a module reaches the module's own function on Windows, whatever the host exports.
+  RuntimeExports.EachSetterCallsItsHookWithWhatWasSet
+
+  # Wine looks for every name of a path from its root, so 2,000 levels take minutes.
+  CopyDirectoryTree.CopiesTwoThousandNestedFoldersOnASmallStack
+
+  # The order and the equality of texts that are not of printable ASCII alone: the system's there, with the
+  # differences that docs/platforms.md lists. Letters in full width are the commonest of them.
+  Compare.FullWidthFormsEqualTheirAscii
+  Compare.LetterCaseOutsideAsciiDoesNotCount
+  Compare.OrdersAsciiBlankPunctuationDigitsLetters
+  Compare.OrdersAsciiTheSameWithACharacterOutsideAsciiBehind
+  Compare.OtherControlCharactersDoNotCount
+  Compare.ScriptsFollowLatin
+  ElementNodes.WordsThatAreTrue
+  EntryList.FullWidthKeyIsTheSameKey
+  EntryList.OrderedListDoesWhatAVectorDoes
+  EntryList.SortedListDoesWhatAMapDoes
+  FileFinder.OrdersOtherAlphabetsByTheirUpperCaseToo
+  LocalizeText.ChoosesATextAndKeepsTheList
+  Paths.NamesAreBlindToCase
+  ResTreeNode.FullWidthKeyIsTakenByItsPlainSpelling
+  XmlValue.WordIsBlindToCaseAndWidth
+
+  # Bytes that are no UTF-8, and units that are no text, in the default code page: Windows puts its default character
+  # in their place, Linux keeps them. For ASCII, Windows has letters without accents in the place of those with.
+  AnsiToWide.DefaultCodePageBringsEverySequenceOfThreeBytesBack
+  AnsiToWide.DefaultCodePageKeepsBytesThatAreNoUtf8
+  ParseErrors.HalvesOfPairsAreNotWellFormed
+  ParseErrorsOfFiles.BytesThatAreNotUtf8StandAsThemselvesInTheContext
+  ParseErrorsOfFiles.ContextMayBeginInsideACharacter
+  ParseErrorsOfFiles.ContextOfUtf16IsItsBytesUpToTheFirstNul
+  ParseErrorsOfFiles.PartialCharacterAtTheEnd
+  WideToAnsi.DefaultCodePageGivesBytesBack
+  WideToAnsi.DefaultCodePageHasAQuestionMarkForOtherLoneSurrogates
+  WideToAnsi.UsAsciiHasAQuestionMarkForEachOtherUnit
+
+  # Text mode: Linux has no translation. TextStream_windowsTest.cpp tests that of Windows.
+  TextStream.AFailedReadIsShort
+  TextStream.AFileOfOneBlockEndsWithAnEmptyOne
+  TextStream.AReadThatTheSystemCutsShortGoesOn
+  TextStream.NothingIsTranslatedOnReading
+  TextStream.ReadsBlocksAndIsShortOnlyAtTheEnd
+  TextStream.WritesAllOfTheText
+
+  # The system's own texts for its errors, which Wine words otherwise, and its own record of the last one, which any
+  # call may change.
+  SystemError.MessageEndsInStopAndLineBreak
+  WinError.CopyKeepsEverything
+  WinError.HasTheMessageWithoutStopAndLineBreak
+  WinError.HasTheSystemsTexts
+  WinError.TakesTheNumberOfItsOwnThread)
