@@ -93,12 +93,12 @@ TEST_F(Tool, EmptyArgumentIsTheWorkingFolder) {
 
 TEST_F(Tool, ArgumentMayEndInASeparator) {
     WriteSoundInstallation();
-    ExpectSoundRun({Working() + "/"}, "/");
+    ExpectSoundRun({WorkingInSystemForm() + "\\"}, "/");
 }
 
 TEST_F(Tool, FurtherArgumentsAreIgnored) {
     WriteSoundInstallation();
-    ExpectSoundRun({Working(), "--help", "/missing"}, "/");
+    ExpectSoundRun({WorkingInSystemForm(), "--help", "/missing"}, "/");
 }
 
 TEST_F(Tool, OptionsAreFolders) {

@@ -193,6 +193,17 @@ std::string TemporaryFolder::ReadFile(const std::string& below) const {
     return bytes;
 }
 
+std::string TemporaryFolder::ReadText(const std::string& below) const {
+    const std::string bytes = ReadFile(below);
+    std::string text;
+    for (size_t i = 0; i < bytes.size(); ++i) {
+        if (bytes[i] != '\r' || i + 1 == bytes.size() || bytes[i + 1] != '\n') {
+            text += bytes[i];
+        }
+    }
+    return text;
+}
+
 void TemporaryFolder::MakeLink(const std::string& target, const std::string& below) const {
     const bool isAbsolute = target.size() >= 2 && target[1] == ':';
     const std::string end = isAbsolute ? PathOutsideWine(target) : target;
