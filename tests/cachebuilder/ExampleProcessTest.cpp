@@ -29,15 +29,19 @@ std::string ReviewedCache() {
     return bytes.str();
 }
 
+std::filesystem::path PathOf(const std::string& utf8) {
+    return std::u8string(utf8.begin(), utf8.end());
+}
+
 // A copy of the example, with the tool in its usual place: a folder of its own in the working directory.
 class ExampleCopy {
   public:
     explicit ExampleCopy(const std::string& below = "installation") : below(below) {
         folder.MakeFolder(below);
-        std::filesystem::copy(ZKFPGA_SOURCE_DIR "/examples/installation", Root(),
+        std::filesystem::copy(ZKFPGA_SOURCE_DIR "/examples/installation", PathOf(Root()),
                               std::filesystem::copy_options::recursive);
-        std::filesystem::create_directories(ToolFolder());
-        std::filesystem::copy_file(ZKFPGA_TOOL, ToolFolder() + "/zkfpga_make_resource_cache");
+        std::filesystem::create_directories(PathOf(ToolFolder()));
+        std::filesystem::copy_file(ZKFPGA_TOOL, PathOf(ToolFolder() + "/zkfpga_make_resource_cache"));
     }
 
     std::string Root() const { return folder.Native(below); }
@@ -106,7 +110,7 @@ TEST(ExampleProcess, RunsInDifferentFoldersGiveTheSameCache) {
 
 void ExpectTheCacheForEach(const ExampleCopy& copy, const std::vector<std::string>& arguments) {
     for (const std::string& argument : arguments) {
-        std::filesystem::remove(copy.Root() + "/" + cacheFile);
+        std::filesystem::remove(PathOf(copy.Root() + "/" + cacheFile));
         ExpectSuccess(copy.Run({argument}, copy.Root()));
         EXPECT_EQ(copy.Read(cacheFile), ReviewedCache()) << argument;
     }

@@ -75,7 +75,8 @@ TEST_F(Tool, TakesARelativeArgumentInTheSystemsForm) {
 
 TEST_F(Tool, LetterCaseOfTheArgumentDoesNotMatter) {
     installation.Write("x_resource.xml", "<FPGAHostSet><HostA>1</HostA></FPGAHostSet>");
-    EXPECT_EQ(installation.Run({"targets/qn/fpga"}, installation.Root().Native()), qn::dsc::osdep::EndWithResult(0x80004005));
+    EXPECT_EQ(installation.Run({"targets/qn/fpga"}, installation.Root().Native()),
+              qn::dsc::osdep::EndWithResult(0x80004005));
     EXPECT_EQ(installation.Cache(), CacheOf("\n   <FPGAHostSet>\n      <HostA>1</HostA>\n   </FPGAHostSet>"));
 }
 
