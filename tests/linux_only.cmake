@@ -3,6 +3,7 @@ set(linux_only
   # Folders and files that Windows doesn't have, or that Wine doesn't show: pipes, links that lead nowhere or in a
   # circle, permission bits, devices such as /dev/full, names that no text in UTF-16 can bear or that hold a backslash
   # or a wildcard, two names that differ in letter case only, folders that are removed while a process is in them.
+  BinaryFile.AFileCreatedThroughADanglingLinkIsWhereTheLinkLeads
   BinaryFile.AFullDeviceRefusesTheWrite
   BinaryFile.APipeThatNobodyReadsIsNotWaitedForByAWriter
   BinaryFile.CreateMakesAFileForItsOwnerAlone
@@ -19,20 +20,35 @@ set(linux_only
   FileFinder.ListsAFolderOfManyNamesInOrder
   FileFinder.NamesThatDifferInCaseAreOrderedByTheirUnits
   FileFinder.NativeNamesSurviveTheRoundTrip
+  FindResourceFilesIn.LinkToAFileIsAFile
+  FindResourceFilesIn.LoopOfLinksThatCannotBeIdentifiedEndsAtTheLimitOfTheSystem
+  FindResourceFilesIn.OddNamesAndLinksAreFoundAsTheDefinitionSays
+  FindResourceFilesIn.WalkEndsWherePathsBecomeTooLong
   GetCurrentDirectoryPath.OfARemovedFolderIsEmpty
   Include.OfWhatIsNoFileIsReported
   IsDirectory.AnythingElseIsNot
   IsExistingFile.WhatIsNoFolderIsAFile
   LoadResourceFile.NamesMayHoldAnyBytes
   LoadResourceFile.ThatCannotBeOpenedLeavesTheTreeAlone
+  TargetScan.FileThatCannotBeOpenedLeavesNoTrace
+  Tool.ResourceFileThatCannotBeOpenedIsPassedOver
   TextStream.AFullDiskIsNoticedAtOneByte
   TextStream.APipeThatNobodyReadsIsNotWaitedForByAWriter
   TextStream.NarrowPathsLeadToEveryNativeName
   TextStream.OnlyRegularFilesAreOpenedForReading
   TextStream.OpeningForWritingKeepsTheFilesOwnPermissions
 
-  # Paths: on Linux there is one drive, native paths are taken as arguments, and the working folder may be longer than
-  # the 261 bytes that Windows is asked for.
+  # Paths: on Linux there is one drive, native paths are taken as arguments and from the host, and the working folder
+  # may be longer than the 261 bytes that Windows is asked for.
+  ExampleProcess.ArgumentMayBeANativePath
+  FPGAResTreeOf.HostRuntimeSaysWhereTheTargetsAre
+  HostPathTest.TextIsGivenInTheFormOfTheSystem
+  HostPathTest.TextMayBeAskedForAgain
+  HostSpecialDirectory.EachNumberHasItsCode
+  HostSpecialDirectory.IsAskedForByWayOfAPath
+  HostSpecialDirectory.TextOfTheHostMayBeNative
+  Tool.TakesANativeAbsoluteArgument
+  Tool.TakesANativeRelativeArgument
   GetCurrentDirectoryPath.IsInTheSystemsForm
   GetCurrentDirectoryPath.MayBeLongerThan260Units
   GetCurrentDirectoryPath.OfTheRootIsTheDrive
@@ -41,8 +57,25 @@ set(linux_only
   # A call inside a module reaches the module's own function on Windows, whatever the host exports.
   RuntimeExports.EachSetterCallsItsHookWithWhatWasSet
 
-  # Wine looks for every name of a path from its root, so 2,000 levels take minutes.
+  # Exports as the linker of Linux lists them; Exports.AreTheListAndNothingElse has those of Windows.
+  Tool.ExportsOneFunction
+
+  # The main module answers for the C library, too.
+  HostFunctionTable.RowIsBoundAnewWhenAnotherModuleAnswers
+
+  # The child of a death test begins anew there, with a folder of its own that the parent can't look into.
+  DeviceMenusDeathTest.TargetsBeforeTheTrapAreServedAndThoseBehindItAreNot
+
+  # The memory that crosses the boundary is the system's own there: it can't be made to fail, nor does it trap.
+  BoundaryFailureTest.GetProperty
+  BoundaryString.FreeingWhatIsNoStringTraps
+  BoundaryString.IsNullWithoutMemory
+  BoundaryTaskMemory.AFailedReallocLeavesTheBlock
+
+  # Wine asks its server about each name of a path and each file, one by one: these take minutes.
   CopyDirectoryTree.CopiesTwoThousandNestedFoldersOnASmallStack
+  FindResourceFilesIn.DeepFoldersTakeNoStack
+  Include.NestsTwoHundredAndFiftySixLevelsDeep
 
   # The order and the equality of texts that are not of printable ASCII alone: the system's there, with the
   # differences that docs/platforms.md lists. Letters in full width are the commonest of them.
@@ -66,6 +99,7 @@ set(linux_only
   # in their place, Linux keeps them. For ASCII, Windows has letters without accents in the place of those with.
   AnsiToWide.DefaultCodePageBringsEverySequenceOfThreeBytesBack
   AnsiToWide.DefaultCodePageKeepsBytesThatAreNoUtf8
+  HostStringTest.WidenedByTheDefaultCodePage
   ParseErrors.HalvesOfPairsAreNotWellFormed
   ParseErrorsOfFiles.BytesThatAreNotUtf8StandAsThemselvesInTheContext
   ParseErrorsOfFiles.ContextMayBeginInsideACharacter

@@ -50,7 +50,7 @@ std::string ReadBytes(const char* path) {
 }
 
 String ExampleFolder() {
-    return PathFromArgument(ZKFPGA_SOURCE_DIR "/examples/installation");
+    return PathFromArgument(ZKFPGA_EXAMPLE);
 }
 
 // The tree of the example as the tool builds it, from where it stands in the sources. Nothing is written.
@@ -438,7 +438,7 @@ class ExampleRun : public testing::Test {
 };
 
 TEST_F(ExampleRun, LeavesTheReviewedCache) {
-    EXPECT_EQ(folder.ReadFile("Targets/QN/FPGA/resource_cache.xml"),
+    EXPECT_EQ(folder.ReadText("Targets/QN/FPGA/resource_cache.xml"),
               ReadBytes(ZKFPGA_SOURCE_DIR "/tests/data/example_resource_cache.xml"));
 }
 
@@ -480,10 +480,10 @@ TEST_F(ExampleRun, CopiesTheMenusOfTheFamilyOfTheBoard) {
 
 TEST_F(ExampleRun, ASecondRunChangesNothing) {
     const std::vector<std::string> after = folder.Tree();
-    const std::string cache = folder.ReadFile("Targets/QN/FPGA/resource_cache.xml");
+    const std::string cache = folder.ReadText("Targets/QN/FPGA/resource_cache.xml");
     RunTool();
     EXPECT_EQ(folder.Tree(), after);
-    EXPECT_EQ(folder.ReadFile("Targets/QN/FPGA/resource_cache.xml"), cache);
+    EXPECT_EQ(folder.ReadText("Targets/QN/FPGA/resource_cache.xml"), cache);
 }
 
 TEST_F(ExampleRun, AHostGetsTheSameLinesByWayOfTheCache) {

@@ -1,5 +1,6 @@
 // The tool as a user runs it on copies of the example installation.
 
+#include <algorithm>
 #include <filesystem>
 #include <fstream>
 #include <sstream>
@@ -28,25 +29,35 @@ std::string ReviewedCache() {
     return bytes.str();
 }
 
+std::filesystem::path PathOf(const std::string& utf8) {
+    return std::u8string(utf8.begin(), utf8.end());
+}
+
 // A copy of the example, with the tool in its usual place: a folder of its own in the working directory.
 class ExampleCopy {
   public:
     explicit ExampleCopy(const std::string& below = "installation") : below(below) {
         folder.MakeFolder(below);
-        std::filesystem::copy(ZKFPGA_SOURCE_DIR "/examples/installation", Root(),
+        std::filesystem::copy(ZKFPGA_SOURCE_DIR "/examples/installation", PathOf(Root()),
                               std::filesystem::copy_options::recursive);
-        std::filesystem::create_directories(ToolFolder());
-        std::filesystem::copy_file(ZKFPGA_TOOL, ToolFolder() + "/zkfpga_make_resource_cache");
+        std::filesystem::create_directories(PathOf(ToolFolder()));
+        std::filesystem::copy_file(ZKFPGA_TOOL, PathOf(ToolFolder() + "/zkfpga_make_resource_cache"));
     }
 
     std::string Root() const { return folder.Native(below); }
+    // The path of what is below the root, in the system's form.
+    std::string SystemPath(const std::string& path) const {
+        std::string system = "\\" + below + "\\" + path;
+        std::replace(system.begin(), system.end(), '/', '\\');
+        return qn::dsc::NarrowString(folder.System()).CStr() + system;
+    }
     std::string ToolFolder() const { return Root() + "/" + working + "/Utilities"; }
 
     ProgramResult Run(const std::vector<std::string>& arguments, const std::string& workingFolder) const {
         return RunProgram(ToolFolder() + "/zkfpga_make_resource_cache", arguments, workingFolder);
     }
 
-    std::string Read(const std::string& path) const { return folder.ReadFile(below + "/" + path); }
+    std::string Read(const std::string& path) const { return folder.ReadText(below + "/" + path); }
     std::vector<std::string> Tree() const { return folder.Tree(); }
 
   private:
@@ -97,18 +108,22 @@ TEST(ExampleProcess, RunsInDifferentFoldersGiveTheSameCache) {
     EXPECT_EQ(other.Read(cacheFile), one.Read(cacheFile));
 }
 
-TEST(ExampleProcess, ArgumentMayBeGivenInAnyForm) {
-    const ExampleCopy copy;
-    std::string system = "C:" + copy.Root() + "/" + working;
-    for (char& unit : system) {
-        unit = unit == '/' ? '\\' : unit;
-    }
-    for (const std::string& argument :
-         {copy.Root() + "/" + working, working, std::string("Targets\\QN\\FPGA"), system}) {
-        std::filesystem::remove(copy.Root() + "/" + cacheFile);
+void ExpectTheCacheForEach(const ExampleCopy& copy, const std::vector<std::string>& arguments) {
+    for (const std::string& argument : arguments) {
+        std::filesystem::remove(PathOf(copy.Root() + "/" + cacheFile));
         ExpectSuccess(copy.Run({argument}, copy.Root()));
         EXPECT_EQ(copy.Read(cacheFile), ReviewedCache()) << argument;
     }
+}
+
+TEST(ExampleProcess, ArgumentMayBeAbsoluteOrRelativeInTheSystemsForm) {
+    const ExampleCopy copy;
+    ExpectTheCacheForEach(copy, {"Targets\\QN\\FPGA", copy.SystemPath(working), copy.SystemPath(working) + "\\"});
+}
+
+TEST(ExampleProcess, ArgumentMayBeANativePath) {
+    const ExampleCopy copy;
+    ExpectTheCacheForEach(copy, {copy.Root() + "/" + working, working});
 }
 
 TEST(ExampleProcess, FolderThatIsNotThereFailsAndLeavesNothing) {

@@ -42,7 +42,7 @@ class Installation {
     void Write(const std::string& path, const std::string& text) const { root.WriteFile(Below(path), text); }
     std::string Read(const std::string& path) const { return root.ReadFile(Below(path)); }
     bool Has(const std::string& path) const { return root.Exists(Below(path)); }
-    std::string Cache() const { return Read("resource_cache.xml"); }
+    std::string Cache() const { return root.ReadText(Below("resource_cache.xml")); }
     bool HasCache() const { return Has("resource_cache.xml"); }
 
     // The device specifications, and a file "menu.txt" in each menu folder.

@@ -26,7 +26,7 @@ class ResourceCacheWriter : public testing::Test {
     // What is written for the tree as it stands.
     std::string Written() {
         EXPECT_EQ(Write(), 0);
-        return folder.ReadFile("resource_cache.xml");
+        return folder.ReadText("resource_cache.xml");
     }
 
     TemporaryFolder folder;
@@ -233,7 +233,7 @@ TEST_F(ResourceCacheWriter, FileIsWrittenWithOneCall) {
     EXPECT_EQ(files.Count(FileCall::WriteBytes), 1u);
     EXPECT_EQ(files.Count(FileCall::OpenText), 1u);
     EXPECT_EQ(files.OpenFiles(), 0);
-    EXPECT_GT(folder.ReadFile("resource_cache.xml").size(), 100000u);
+    EXPECT_GT(folder.ReadText("resource_cache.xml").size(), 100000u);
 }
 
 TEST_F(ResourceCacheWriter, FileThatCannotBeOpenedIsAFailureAndStays) {
@@ -244,7 +244,7 @@ TEST_F(ResourceCacheWriter, FileThatCannotBeOpenedIsAFailureAndStays) {
         files.Fail(FileCall::OpenText, 1, EACCES);
         EXPECT_EQ(Write(), failure);
     }
-    EXPECT_EQ(folder.ReadFile("resource_cache.xml"), "old");
+    EXPECT_EQ(folder.ReadText("resource_cache.xml"), "old");
 }
 
 TEST_F(ResourceCacheWriter, FolderInThePlaceOfTheFileIsAFailure) {
@@ -266,7 +266,7 @@ TEST_F(ResourceCacheWriter, FullDiskIsAFailureAndLeavesWhatWasWritten) {
         files.Fail(FileCall::WriteBytes, 2, ENOSPC);
         EXPECT_EQ(Write(), failure);
     }
-    EXPECT_EQ(folder.ReadFile("resource_cache.xml"), "<?xml vers");
+    EXPECT_EQ(folder.ReadText("resource_cache.xml"), "<?xml vers");
     EXPECT_EQ(files.OpenFiles(), 0);
 }
 
@@ -282,7 +282,7 @@ TEST_F(ResourceCacheWriter, FailureOfTheCloseIsNotLookedAt) {
         files.Fail(FileCall::CloseFile, 1, EIO);
         EXPECT_EQ(Write(), 0);
     }
-    EXPECT_EQ(folder.ReadFile("resource_cache.xml"), emptyCache);
+    EXPECT_EQ(folder.ReadText("resource_cache.xml"), emptyCache);
 }
 
 TEST_F(ResourceCacheWriter, NoMemoryForTheTextPassesAndLeavesTheOldFile) {
@@ -292,7 +292,7 @@ TEST_F(ResourceCacheWriter, NoMemoryForTheTextPassesAndLeavesTheOldFile) {
         const support::AllocationFaultScope fault(1, true);
         EXPECT_THROW(tree.WriteResourceCache(*root, path), std::bad_alloc);
     }
-    EXPECT_EQ(folder.ReadFile("resource_cache.xml"), "old");
+    EXPECT_EQ(folder.ReadText("resource_cache.xml"), "old");
 }
 
 }  // namespace

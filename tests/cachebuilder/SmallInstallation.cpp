@@ -48,7 +48,7 @@ uint32_t SmallInstallation::Run(const char* argument) {
 
 std::string SmallInstallation::Cache() const {
     const std::string path = "Targets/QN/FPGA/resource_cache.xml";
-    return folder.Exists(path) ? folder.ReadFile(path) : "none";
+    return folder.Exists(path) ? folder.ReadText(path) : "none";
 }
 
 void SmallInstallation::RemoveOutput() const {

@@ -75,7 +75,8 @@ TEST_F(Tool, TakesARelativeArgumentInTheSystemsForm) {
 
 TEST_F(Tool, LetterCaseOfTheArgumentDoesNotMatter) {
     installation.Write("x_resource.xml", "<FPGAHostSet><HostA>1</HostA></FPGAHostSet>");
-    EXPECT_EQ(installation.Run({"targets/qn/fpga"}, installation.Root().Native()), qn::dsc::osdep::EndWithResult(0x80004005));
+    EXPECT_EQ(installation.Run({"targets/qn/fpga"}, installation.Root().Native()),
+              qn::dsc::osdep::EndWithResult(0x80004005));
     EXPECT_EQ(installation.Cache(), CacheOf("\n   <FPGAHostSet>\n      <HostA>1</HostA>\n   </FPGAHostSet>"));
 }
 
@@ -93,12 +94,12 @@ TEST_F(Tool, EmptyArgumentIsTheWorkingFolder) {
 
 TEST_F(Tool, ArgumentMayEndInASeparator) {
     WriteSoundInstallation();
-    ExpectSoundRun({Working() + "/"}, "/");
+    ExpectSoundRun({WorkingInSystemForm() + "\\"}, "/");
 }
 
 TEST_F(Tool, FurtherArgumentsAreIgnored) {
     WriteSoundInstallation();
-    ExpectSoundRun({Working(), "--help", "/missing"}, "/");
+    ExpectSoundRun({WorkingInSystemForm(), "--help", "/missing"}, "/");
 }
 
 TEST_F(Tool, OptionsAreFolders) {

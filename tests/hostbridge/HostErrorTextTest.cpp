@@ -47,7 +47,8 @@ TEST_F(HostErrorText, ResultOfTheDisposalIsNotLookedAt) {
     EXPECT_STREQ(GetHostErrorText(7).CStr(), "File not found.");
     // What the stand-in kept when it failed.
     ASSERT_EQ(host.LiveHandleCount(), 1u);
-    reinterpret_cast<int32_t (*)(char**)>(qn::dsc::osdep::FindInModule(module, "HostDisposeHandle"))(host.blockSizes.begin()->first);
+    reinterpret_cast<int32_t (*)(char**)>(qn::dsc::osdep::FindInModule(module, "HostDisposeHandle"))(
+        host.blockSizes.begin()->first);
 }
 
 TEST_F(HostErrorText, WithoutMemoryTheStringIsDisposedOfAllTheSame) {

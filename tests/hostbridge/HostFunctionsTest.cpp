@@ -4,7 +4,6 @@
 #include <iterator>
 #include <thread>
 
-
 #include "host/HostTest.h"
 #include "hostbridge/HostFunctionTable.h"
 #include "zkfpga/exports.h"

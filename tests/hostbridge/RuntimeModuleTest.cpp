@@ -138,9 +138,12 @@ TEST(RuntimeModule, MainModuleThatMakesHandlesIsTheRuntime) {
 }
 
 TEST(RuntimeModule, MainModuleThatIsTheRuntimeComesBeforeLoadedOnes) {
-    EXPECT_EQ(RunProgram(MAIN_MODULE_PROBES "/main_module_gZKRTVersion" PROGRAM_SUFFIX, {STAND_IN_RUNTIME}, "/").end, "exit 0");
-    EXPECT_EQ(RunProgram(MAIN_MODULE_PROBES "/main_module_HostNewHandle" PROGRAM_SUFFIX, {STAND_IN_RUNTIME}, "/").end, "exit 0");
-    EXPECT_EQ(RunProgram(MAIN_MODULE_PROBES "/main_module_OtherName" PROGRAM_SUFFIX, {STAND_IN_RUNTIME}, "/").end, "exit 7");
+    EXPECT_EQ(RunProgram(MAIN_MODULE_PROBES "/main_module_gZKRTVersion" PROGRAM_SUFFIX, {STAND_IN_RUNTIME}, "/").end,
+              "exit 0");
+    EXPECT_EQ(RunProgram(MAIN_MODULE_PROBES "/main_module_HostNewHandle" PROGRAM_SUFFIX, {STAND_IN_RUNTIME}, "/").end,
+              "exit 0");
+    EXPECT_EQ(RunProgram(MAIN_MODULE_PROBES "/main_module_OtherName" PROGRAM_SUFFIX, {STAND_IN_RUNTIME}, "/").end,
+              "exit 7");
 }
 
 TEST(RuntimeModule, MainModuleThatExportsSomethingElseIsNot) {

@@ -55,9 +55,13 @@ HostInstallation::HostInstallation() {
 }
 
 std::string HostInstallation::SystemPath(const std::string& below) const {
-    std::string path = root.Native(Below(below));
+    std::string path = "\\" + Below(below);
     std::replace(path.begin(), path.end(), '/', '\\');
-    return "C:" + path;
+    return qn::dsc::NarrowString(root.System()).CStr() + path;
+}
+
+std::string HostInstallation::Special(const std::string& folder) const {
+    return std::string("special|") + qn::dsc::NarrowString(root.System()).CStr() + "\\" + folder;
 }
 
 void HostInstallation::SetFileTimes() const {

@@ -18,9 +18,11 @@ class HostInstallation {
     // slashes.
     static std::string Below(const std::string& below) { return "Targets/QN/FPGA/" + below; }
     std::string SystemPath(const std::string& below) const;
+    // The command by which a host tells that its folder of targets is `folder`, a path below the root.
+    std::string Special(const std::string& folder = "Targets") const;
 
     void Write(const std::string& below, const std::string& text) const { root.WriteFile(Below(below), text); }
-    std::string Cache() const { return root.ReadFile(Below("resource_cache.xml")); }
+    std::string Cache() const { return root.ReadText(Below("resource_cache.xml")); }
     bool HasCache() const { return root.Exists(Below("resource_cache.xml")); }
     // Every resource file gets the time 1000; the cache too, if there is one: it is fresh.
     void SetFileTimes() const;

@@ -32,8 +32,7 @@ class HostCache : public testing::Test {
     }
 
     void ExpectAnswers(const std::vector<std::string>& commands, const std::string& answers) {
-        std::vector<std::string> all{std::string("runtime|") + STAND_IN_RUNTIME,
-                                     "special|" + installation.Root().Native("Targets")};
+        std::vector<std::string> all{std::string("runtime|") + STAND_IN_RUNTIME, installation.Special()};
         all.insert(all.end(), commands.begin(), commands.end());
         const ProgramResult result = installation.Run(all);
         EXPECT_EQ(result.end, "exit 0");

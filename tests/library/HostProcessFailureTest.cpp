@@ -13,8 +13,7 @@ using qn::dsc::osdep::ProgramResult;
 class HostFailure : public testing::Test {
   protected:
     ProgramResult Run(const std::vector<std::string>& commands) {
-        std::vector<std::string> all{std::string("runtime|") + STAND_IN_RUNTIME,
-                                     "special|" + installation.Root().Native("Targets")};
+        std::vector<std::string> all{std::string("runtime|") + STAND_IN_RUNTIME, installation.Special()};
         all.insert(all.end(), commands.begin(), commands.end());
         return installation.Run(all);
     }

@@ -15,9 +15,7 @@ const std::string runtime = std::string("runtime|") + STAND_IN_RUNTIME;
 
 class HostProcess : public testing::Test {
   protected:
-    std::string Special(const std::string& folder = "Targets") const {
-        return "special|" + installation.Root().Native(folder);
-    }
+    std::string Special(const std::string& folder = "Targets") const { return installation.Special(folder); }
 
     // Runs a host that must come to its natural end and have nothing to say but `answers`.
     void ExpectAnswers(const std::vector<std::string>& commands, const std::string& answers) {

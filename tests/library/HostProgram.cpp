@@ -24,11 +24,9 @@
 #include <string>
 #include <vector>
 
-#include <dlfcn.h>
-#include <unistd.h>
-
 #include "host/StandInRuntime.h"
 #include "library/Exports.h"
+#include "support/Modules.h"
 #include "zkfpga/host_runtime.h"
 #include "zkfpga/ids.h"
 
@@ -50,13 +48,13 @@ Runtime runtime;
 
 template <typename Target>
 void Find(void* module, const char* name, Target*& target) {
-    void* const address = dlsym(module, name);
+    void* const address = qn::dsc::osdep::FindInModule(module, name);
     std::memcpy(&target, &address, sizeof target);
 }
 
 // Gives the module. One that has none of the functions is loaded all the same.
 void* UseRuntime(const char* file) {
-    void* const module = dlopen(file, RTLD_NOW | RTLD_LOCAL);
+    void* const module = qn::dsc::osdep::LoadModuleFile(file);
     if (module == nullptr) {
         std::printf("no run-time %s\n", file);
         std::exit(3);
@@ -270,7 +268,7 @@ const std::map<std::string, std::function<void(const Arguments&)>> commands = {
     {"calls", Calls},
     {"live", [](const Arguments&) { std::printf("live %zu\n", runtime.standIn->LiveHandleCount()); }},
     {"write", Write},
-    {"remove", [](const Arguments& a) { std::printf("%s", unlink(a[1].c_str()) == 0 ? "" : "not removed\n"); }},
+    {"remove", [](const Arguments& a) { std::printf("%s", std::remove(a[1].c_str()) == 0 ? "" : "not removed\n"); }},
 };
 
 Arguments Split(const std::string& text) {

@@ -2,15 +2,14 @@
 #include <cstdlib>
 #include <cstring>
 
-#include <dlfcn.h>
-
 #include "library/Exports.h"
+#include "support/Modules.h"
 
 namespace {
 
 template <typename Function>
 void Find(void* module, const char* name, Function*& function) {
-    void* const address = dlsym(module, name);
+    void* const address = qn::dsc::osdep::FindInModule(module, name);
     if (address == nullptr) {
         std::printf("no export %s\n", name);
         std::exit(3);
@@ -21,7 +20,7 @@ void Find(void* module, const char* name, Function*& function) {
 }  // namespace
 
 Exports GetExports(const char* library) {
-    void* const module = dlopen(library, RTLD_NOW | RTLD_LOCAL);
+    void* const module = qn::dsc::osdep::LoadModuleFile(library);
     if (module == nullptr) {
         std::printf("no library %s\n", library);
         std::exit(3);

@@ -54,7 +54,7 @@ Outcome GetNode(HRESULT given, HostNode& node) {
 }
 
 void* LastNodeOf(void* module) {
-    return *static_cast<void**>(dlsym(module, "lastNode"));
+    return *static_cast<void**>(qn::dsc::osdep::FindInModule(module, "lastNode"));
 }
 
 const char* const call = "QueryInterfaceForZKRefNum 77";
@@ -125,7 +125,7 @@ TEST(NodeAccessor, ModuleThatIsUnloadedIsNotThere) {
         void* const module = LoadModule(ACCESSOR_PLUG_IN);
         HostNode node;
         const bool wasThere = GetNode(S_OK, node).result == 0;
-        dlclose(module);
+        qn::dsc::osdep::UnloadModule(module);
         return wasThere && GetNode(S_OK, node) == Outcome{1, untouched, 2, 0, call};
     });
 }

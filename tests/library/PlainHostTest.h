@@ -11,7 +11,7 @@ class PlainHostTest : public testing::Test {
         folder.WriteFile("Targets/QN/FPGA/a_resource.xml",
                          "<Board name=\"a\"><b>plain</b><Sub name=\"s\"><d>deep</d></Sub></Board>");
         folder.WriteFile("Targets/QN/FPGA/c_resource.xml", "<Board name=\"c\"><DisplayName>C</DisplayName></Board>");
-        folder.Native("Targets").copy(static_cast<char*>(dlsym(module, "specialFolder")), 4095);
+        folder.Native("Targets").copy(static_cast<char*>(qn::dsc::osdep::FindInModule(module, "specialFolder")), 4095);
         zkhw::runtimeModule = module;
     }
     ~PlainHostTest() override {
@@ -19,7 +19,7 @@ class PlainHostTest : public testing::Test {
         zkhw::runtimeModule = nullptr;
     }
 
-    int LiveHandles() const { return *static_cast<int*>(dlsym(module, "liveHandles")); }
+    int LiveHandles() const { return *static_cast<int*>(qn::dsc::osdep::FindInModule(module, "liveHandles")); }
 
     void* const module = LoadModule(PLAIN_RUNTIME);
     const qn::dsc::osdep::TemporaryFolder folder;

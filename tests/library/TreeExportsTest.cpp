@@ -1,6 +1,5 @@
 // The exported queries on a tree that was read from resource files.
 
-
 #include "library/ExportsTest.h"
 #include "support/ProcessEnd.h"
 

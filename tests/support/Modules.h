@@ -6,7 +6,7 @@
 
 namespace qn::dsc::osdep {
 
-// Loads the module in `file`, a native path, for the rest of the process. Null if it can't be loaded.
+// Loads the module in `file`, a native path. Null if it can't be loaded. A null `file` stands for the main module.
 void* LoadModuleFile(const char* file);
 
 // One use of the module less: it goes with the last.

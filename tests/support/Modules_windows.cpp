@@ -7,7 +7,7 @@
 namespace qn::dsc::osdep {
 
 void* LoadModuleFile(const char* file) {
-    return LoadLibraryA(file);
+    return file == nullptr ? GetModuleHandleA(nullptr) : LoadLibraryA(file);
 }
 
 void UnloadModule(void* module) {

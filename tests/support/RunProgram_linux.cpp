@@ -56,7 +56,8 @@ constexpr int notStarted = 127;
 
 std::string DescribeEnd(int status) {
     if (WIFEXITED(status)) {
-        return WEXITSTATUS(status) == notStarted ? "not started" : EndWithResult(static_cast<uint32_t>(WEXITSTATUS(status)));
+        return WEXITSTATUS(status) == notStarted ? "not started"
+                                                 : EndWithResult(static_cast<uint32_t>(WEXITSTATUS(status)));
     }
     switch (WTERMSIG(status)) {
         case SIGTRAP:

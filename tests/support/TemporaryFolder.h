@@ -33,6 +33,8 @@ class TemporaryFolder {
     // With the folders above that are missing.
     void WriteFile(const std::string& below, const std::string& bytes) const;
     std::string ReadFile(const std::string& below) const;
+    // The same with the platform's line ends as line feeds: what was written as text.
+    std::string ReadText(const std::string& below) const;
     // Links and pipes need Linux, be it below Wine. `target` is the text of the link, whether anything is there or not.
     void MakeLink(const std::string& target, const std::string& below) const;
     void MakePipe(const std::string& below) const;

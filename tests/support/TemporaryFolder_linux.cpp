@@ -112,6 +112,10 @@ std::string TemporaryFolder::ReadFile(const std::string& below) const {
     return {std::istreambuf_iterator<char>(file), std::istreambuf_iterator<char>()};
 }
 
+std::string TemporaryFolder::ReadText(const std::string& below) const {
+    return ReadFile(below);
+}
+
 void TemporaryFolder::MakeLink(const std::string& target, const std::string& below) const {
     EXPECT_EQ(symlink(target.c_str(), Native(below).c_str()), 0) << below << ": " << std::strerror(errno);
 }

@@ -88,9 +88,9 @@ bool IsLink(const Found& found) {
     return (found.attributes & FILE_ATTRIBUTE_REPARSE_POINT) != 0;
 }
 
-// What Wine can't remove: links and pipes.
+// What Wine can't remove: links and pipes, and folders that hold such.
 void RemoveOutsideWine(const std::string& path) {
-    EXPECT_TRUE(StartOutsideWine("/bin/rm", {"-f", PathOutsideWine(path)}));
+    EXPECT_TRUE(StartOutsideWine("/bin/rm", {"-rf", PathOutsideWine(path)}));
     EXPECT_TRUE(Becomes(path, false)) << path;
 }
 
@@ -107,7 +107,10 @@ void RemoveTree(const std::string& path) {
     while (!folders.empty()) {
         const std::string folder = folders.back().first;
         if (std::exchange(folders.back().second, true)) {
-            EXPECT_NE(RemoveDirectoryW(CallPath(folder).c_str()), 0) << folder << ": " << GetLastError();
+            // What is left in it then are links that Wine doesn't show.
+            if (RemoveDirectoryW(CallPath(folder).c_str()) == 0) {
+                RemoveOutsideWine(folder);
+            }
             folders.pop_back();
             continue;
         }
@@ -191,6 +194,17 @@ std::string TemporaryFolder::ReadFile(const std::string& below) const {
         bytes.append(buffer, got);
     }
     return bytes;
+}
+
+std::string TemporaryFolder::ReadText(const std::string& below) const {
+    const std::string bytes = ReadFile(below);
+    std::string text;
+    for (size_t i = 0; i < bytes.size(); ++i) {
+        if (bytes[i] != '\r' || i + 1 == bytes.size() || bytes[i + 1] != '\n') {
+            text += bytes[i];
+        }
+    }
+    return text;
 }
 
 void TemporaryFolder::MakeLink(const std::string& target, const std::string& below) const {

@@ -1,5 +1,5 @@
-// All of the order is the system's, ASCII included: its order of punctuation is not the same in every version of it, and
-// an order that is partly ours and partly the system's would be none.
+// All of the order is the system's, ASCII included: its order of punctuation is not the same in every version of it,
+// and an order that is partly ours and partly the system's would be none.
 
 #include <windows.h>
 

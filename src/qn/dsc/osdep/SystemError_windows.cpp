@@ -73,12 +73,10 @@ uint32_t SystemErrorOf(int posixError) {
 }
 
 bool GetSystemMessage(uint32_t number, NarrowString& text) {
-    constexpr DWORD flags =
-        FORMAT_MESSAGE_ALLOCATE_BUFFER | FORMAT_MESSAGE_IGNORE_INSERTS | FORMAT_MESSAGE_FROM_SYSTEM;
+    constexpr DWORD flags = FORMAT_MESSAGE_ALLOCATE_BUFFER | FORMAT_MESSAGE_IGNORE_INSERTS | FORMAT_MESSAGE_FROM_SYSTEM;
     static_assert(flags == 0x1300);
     char* buffer = nullptr;
-    const DWORD length =
-        FormatMessageA(flags, nullptr, number, 0, reinterpret_cast<char*>(&buffer), 0, nullptr);
+    const DWORD length = FormatMessageA(flags, nullptr, number, 0, reinterpret_cast<char*>(&buffer), 0, nullptr);
     const std::unique_ptr<char, LocalFreer> message(buffer);
     if (length == 0) {
         return false;

@@ -68,7 +68,9 @@ TEST(TextStreamOfWindows, AReturnElsewhereStays) {
 
 TEST(TextStreamOfWindows, TheByte1AEndsTheText) {
     const TemporaryFolder folder;
-    folder.WriteFile("file", std::string("a\0b\nc\x1A" "d\ne", 9));
+    folder.WriteFile("file", std::string("a\0b\nc\x1A"
+                                         "d\ne",
+                                         9));
     EXPECT_EQ(ReadAll(folder, 4096), std::string("a\0b\nc", 5));
     EXPECT_EQ(ReadAll(folder, 1), std::string("a\0b\nc", 5));
 }
