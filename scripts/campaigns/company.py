@@ -4,7 +4,7 @@ import signal
 import subprocess
 
 from campaigns.places import AddTargets, Faults, Whole
-from campaigns.trial import BELOW, CACHE, Differences, Installation, NoCoreFiles
+from campaigns.trial import BELOW, CACHE, Differences, Installation, NoCoreFiles, Run
 
 
 def CheckManyTools(isShort):
@@ -25,7 +25,8 @@ def CheckManyTools(isShort):
 
 
 def CheckSettings(_):
-    """Languages, time zones and masks of permission bits: the same bytes, and bits as the mask leaves them."""
+    """Languages, time zones, closed standard files, and masks of permission bits: the same bytes, and bits as the mask
+    leaves them."""
     languages = ["C", "POSIX", "C.UTF-8", "en_US.UTF-8", "de_DE.UTF-8", "tr_TR.UTF-8", "ja_JP.UTF-8", "ja_JP.SJIS",
                  "lt_LT", "xx_YY", ""]
     zones = ["UTC", "Asia/Kathmandu", "America/St_Johns", "Pacific/Kiritimati", "nonsense", ""]
@@ -40,6 +41,10 @@ def CheckSettings(_):
         for setting in settings:
             installation.Reset()
             yield Faults(installation, installation.Run(env=setting), "exit 0", expected, f"{setting}: ")
+        for closed in ("<&-", ">&-", "2>&-", "<&- >&- 2>&-"):
+            installation.Reset()
+            end = Run(["sh", "-c", f'"$0" {closed}', installation.tool])
+            yield Faults(installation, end, "exit 0", expected, f"{closed}: ")
         for mask in (0o000, 0o002, 0o022, 0o027, 0o077):
             installation.Reset()
             end = installation.Run(umask=mask)

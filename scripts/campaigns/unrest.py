@@ -2,12 +2,19 @@
 
 import contextlib
 import itertools
+import os
+import pathlib
 import random
 import shutil
+import signal
+import subprocess
 import threading
+import time
 
-from campaigns.places import CLOSING, Faults, Whole
-from campaigns.trial import BELOW, CACHE, HOSTS, ONE, PARTS, PINS, SPECS, TWO, Contents, ExpectedCache, Installation
+from campaigns.calls import CallsOf
+from campaigns.places import CLOSING, Faults, OutputOf, Whole
+from campaigns.trial import (BELOW, CACHE, COPIES, HOSTS, ONE, PARTS, PINS, SPECS, TWO, Contents, Differences,
+                             EndOf, ExpectedCache, Installation, NoCoreFiles)
 
 DECLARATION = b'<?xml version="1.0"?>'
 
@@ -106,3 +113,65 @@ def CheckChanging(isShort):
                     faults.append("a copy with something else")
                 yield faults
         yield Faults(installation, installation.Run(), "exit 0", Whole(), "in the end: ")
+
+
+# --- One file goes at one moment ---
+
+def StopAfter(installation, call):
+    """Starts the tool and gives its process when it stands still behind a call; None if it ends before."""
+    trace = installation.root / "browse"  # Not among the output.
+    trace.unlink(missing_ok=True)
+    strace = subprocess.Popen(["strace", "-o", trace, "-e", f"trace={call.name}", "-e",
+                               f"inject={call.name}:signal=STOP:when={call.number}", installation.tool],
+                              stdin=subprocess.DEVNULL, stderr=subprocess.DEVNULL, preexec_fn=NoCoreFiles)
+    while strace.poll() is None:
+        if trace.exists() and "stopped by SIGSTOP" in trace.read_text():
+            return strace, int(pathlib.Path(f"/proc/{strace.pid}/task/{strace.pid}/children").read_text())
+        time.sleep(0.001)
+    return strace, None
+
+
+def AfterLoss(victim, calls, at, prior):
+    """The ends that a run may have in which a file is gone behind a call, each with its output."""
+    def Indices(name, subject):
+        return [i for i, call in enumerate(calls) if (call.name, call.subject) == (name, subject)]
+    whole = {CACHE: ExpectedCache(), **{copy: Contents(copy) for copy in COPIES}}
+    # What is open is read to its end.
+    if at >= Indices("openat", victim)[0]:
+        return [("exit 0", whole)]
+    if victim in COPIES.values():
+        copy = next(copy for copy, source in COPIES.items() if source == victim)
+        output = {**whole, copy: prior[copy]}
+        first, last = Indices("getdents64", victim.rpartition("/")[0])
+        # What isn't listed isn't missed. A signal may cut the first part of a listing short.
+        return [("exit 0", output)] * (at < last) + [("SIGABRT", output)] * (at >= first)
+    missing = {**whole, CACHE: ExpectedCache([victim])}
+    if victim == SPECS:
+        return [("exit 5", {**missing, **{copy: prior[copy] for copy in COPIES}})]
+    owner = {ONE: "/one/", TWO: "/two/"}.get(victim)
+    return [("exit 0", {**missing, **{copy: prior[copy] for copy in COPIES if owner and owner in copy}})]
+
+
+def CheckLosses(isShort):
+    """A resource file, an included file or a menu file is moved away behind each call of a run in turn."""
+    with Installation() as installation:
+        calls = CallsOf(installation.Run, installation.root, installation.root / "browse")
+        memory = ("mmap", "munmap", "brk", "madvise")
+        chosen = [i for i, call in enumerate(calls[:-1]) if call.phase != "start" and call.name not in memory]
+        for victim in (HOSTS, SPECS, ONE, PINS, TWO, "Menus/S6/c.menu"):
+            for at in chosen[::23 if isShort else 1]:
+                installation.Reset()
+                strace, tool = StopAfter(installation, calls[at])
+                away = AwayOf(installation, victim)
+                (installation.root / victim).rename(away)
+                if tool is not None:
+                    os.kill(tool, signal.SIGCONT)
+                end = EndOf(strace.wait(60))
+                output = OutputOf(installation)
+                faults = min((([] if end == expectedEnd else [f"{end}, not {expectedEnd}"]) +
+                              Differences(expected, output)
+                              for expectedEnd, expected in AfterLoss(victim, calls, at, installation.Prior())), key=len)
+                faults += [] if tool is not None else ["was never reached"]
+                away.rename(installation.root / victim)
+                where = f"{victim} behind {calls[at].phase} {calls[at].kind} {calls[at].subject} #{calls[at].nth}: "
+                yield [where + fault for fault in faults]
