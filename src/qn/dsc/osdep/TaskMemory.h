@@ -2,8 +2,8 @@
 
 // Task memory: the one allocator of all String buffers and of the nodes of the tree. Blocks are aligned to 8 bytes,
 // those of a size that is a multiple of 16 to 16 bytes. Any thread may allocate, and a block may be freed on any
-// thread. Nothing here throws. The build chooses what stands behind it: on Windows the system's own (CoTaskMemAlloc); on
-// Linux size classes (PoolAllocator.h) or, where a sanitizer is to see every block, malloc (MallocAllocator.h).
+// thread. Nothing here throws. The build chooses what stands behind it: on Windows the system's own (CoTaskMemAlloc);
+// on Linux size classes (PoolAllocator.h) or, where a sanitizer is to see every block, malloc (MallocAllocator.h).
 
 #include <cstddef>
 
