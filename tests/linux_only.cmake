@@ -46,6 +46,7 @@ set(linux_only
   HostPathTest.TextMayBeAskedForAgain
   HostSpecialDirectory.EachNumberHasItsCode
   HostSpecialDirectory.IsAskedForByWayOfAPath
+  HostProcess.RuntimeMayNameAnotherFolderByANativePath
   HostSpecialDirectory.TextOfTheHostMayBeNative
   Tool.TakesANativeAbsoluteArgument
   Tool.TakesANativeRelativeArgument
@@ -105,6 +106,13 @@ set(linux_only
   ParseErrorsOfFiles.ContextMayBeginInsideACharacter
   ParseErrorsOfFiles.ContextOfUtf16IsItsBytesUpToTheFirstNul
   ParseErrorsOfFiles.PartialCharacterAtTheEnd
+  TextExports.NarrowTextBecomesUnitsOfTwoBytes
+  TextExports.NarrowTextBecomesUtf8OfAtMostThreeBytesEach
+  TextExports.UnitsOfTwoBytesBecomeNarrowText
+  TextExports.Utf8BecomesNarrowText
+  TreeExports.BytesThatAreNoUtf8SurviveInBothDirections
+  TreeExports.LoneSurrogateBecomesAQuestionMark
+  TreeQuery.PathAndOptionsReachTheTreeInOneForm
   WideToAnsi.DefaultCodePageGivesBytesBack
   WideToAnsi.DefaultCodePageHasAQuestionMarkForOtherLoneSurrogates
   WideToAnsi.UsAsciiHasAQuestionMarkForEachOtherUnit

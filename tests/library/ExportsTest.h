@@ -102,7 +102,7 @@ class ExportsTest : public HostTest {
                          "<Texts><Umlaut>\xC3\x84\xE2\x82\xAC</Umlaut><Empty></Empty>"
                          "<Label localize=\"true\">eng=Clock,jpn=Tokei</Label></Texts>");
         folder.WriteFile("Targets/QN/FPGA/none_resource.xml", "<None><Only name=\"x\"/></None>");
-        host.specialDirectories[28] = folder.Native("Targets");
+        host.specialDirectories[28] = qn::dsc::NarrowString(folder.System(u"Targets")).CStr();
         IzkhwResourceTreeNode* const root = RootNode();
         if (root == nullptr) {
             return false;

@@ -89,6 +89,11 @@ ProgramResult HostInstallation::Run(const std::vector<std::string>& commands, co
 }
 
 ProgramResult HostInstallation::RunLinked(const std::vector<std::string>& commands) const {
+    // Windows looks for the library beside the program; on Linux the program knows where it is.
+    const std::filesystem::path library = LIBRARY_BESIDE_HOST;
+    if (!library.empty()) {
+        std::filesystem::copy_file(library, root.Native(library.filename().string()));
+    }
     std::vector<std::string> arguments{"-", "own-runtime"};
     arguments.insert(arguments.end(), commands.begin(), commands.end());
     return RunAsHost(LINKED_HOST, arguments, "/");

@@ -11,7 +11,8 @@ class PlainHostTest : public testing::Test {
         folder.WriteFile("Targets/QN/FPGA/a_resource.xml",
                          "<Board name=\"a\"><b>plain</b><Sub name=\"s\"><d>deep</d></Sub></Board>");
         folder.WriteFile("Targets/QN/FPGA/c_resource.xml", "<Board name=\"c\"><DisplayName>C</DisplayName></Board>");
-        folder.Native("Targets").copy(static_cast<char*>(qn::dsc::osdep::FindInModule(module, "specialFolder")), 4095);
+        const qn::dsc::NarrowString targets(folder.System(u"Targets"));
+        targets.View().copy(static_cast<char*>(qn::dsc::osdep::FindInModule(module, "specialFolder")), 4095);
         zkhw::runtimeModule = module;
     }
     ~PlainHostTest() override {

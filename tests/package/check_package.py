@@ -26,12 +26,13 @@ def run(command, **more):
 
 
 def install_deb(package, place):
-    """Below `place`, with a record of its own. What the package depends on isn't there, and isn't looked for."""
+    """Below `place`, with a record of its own. What the package depends on isn't there, and isn't looked for; nor is it
+    configured (the linker's cache), for which there would have to be a shell."""
     admin = os.path.join(place, 'var', 'lib', 'dpkg')
     for folder in ('info', 'updates', 'triggers'):
         os.makedirs(os.path.join(admin, folder))
     open(os.path.join(admin, 'status'), 'w').close()
-    run(['dpkg', '--root=' + place, '--force-not-root,depends,bad-path', '--install', package])
+    run(['dpkg', '--root=' + place, '--force-not-root,depends,bad-path', '--unpack', package])
     if 'libexpat1' not in run(['dpkg-deb', '--field', package, 'Depends']):
         sys.exit('the package does not name what it depends on')
     run(['dpkg', '--root=' + place, '--verify', 'zkfpga'])
