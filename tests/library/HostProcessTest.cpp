@@ -158,8 +158,9 @@ TEST_F(HostProcess, SpecialDirectoryIsAskedForAtTheFirstQueryAndNeverAgain) {
 
 TEST_F(HostProcess, RuntimeMayNameAnotherFolderByANativePath) {
     installation.Root().WriteFile("Elsewhere/QN/FPGA/x_resource.xml", "<Target name=\"X\"><K>v</K></Target>");
-    ExpectAnswers({runtime, "special|" + installation.Root().Native("Elsewhere"), "property|X|K|", "found|Board|Speed|"},
-                  "property 00000000 1 \"v\"\nfound 00000000 0\n");
+    ExpectAnswers(
+        {runtime, "special|" + installation.Root().Native("Elsewhere"), "property|X|K|", "found|Board|Speed|"},
+        "property 00000000 1 \"v\"\nfound 00000000 0\n");
     EXPECT_TRUE(installation.Root().Exists("Elsewhere/QN/FPGA/resource_cache.xml"));
     EXPECT_FALSE(installation.HasCache());
 }
