@@ -64,8 +64,8 @@ struct HashedKey {
         : text(text), hash(HashKey(this->text)) {}
 
     // A literal, whose hash costs nothing.
-    template <size_t size>
-    consteval HashedKey(const char16_t (&literal)[size]) : text(literal, size - 1), hash(HashKey(text)) {}
+    template <size_t Size>
+    consteval HashedKey(const char16_t (&literal)[Size]) : text(literal, Size - 1), hash(HashKey(text)) {}
 
     constexpr HashedKey(std::u16string_view text, uint8_t hash) : text(text), hash(hash) {}
 
