@@ -92,10 +92,16 @@ set(linux_only
   Compare.ScriptsFollowLatin
   ElementNodes.WordsThatAreTrue
   EntryList.FullWidthKeyIsTheSameKey
+  EntryList.LongOrderedListFindsAsciiKeysByWideOnesAndTheOtherWayRound
   EntryList.OrderedListDoesWhatAVectorDoes
+  EntryList.PlainAndOtherKeysMixInASortedList
   EntryList.SortedListDoesWhatAMapDoes
   FileFinder.OrdersOtherAlphabetsByTheirUpperCaseToo
   LocalizeText.ChoosesATextAndKeepsTheList
+  MakeRelativeNodePath.ComponentsOutsideAsciiCompareByTheLanguage
+  OpenElementParameters.NamesOutsideAsciiAreComparedByTheLanguage
+  OpenElementParameters.UnitsThatDoNotCountMakeNoDifference
+  Paths.FirstNameMayBeginWithAnyUnit
   Paths.NamesAreBlindToCase
   ResTreeNode.FullWidthKeyIsTakenByItsPlainSpelling
   XmlValue.WordIsBlindToCaseAndWidth
