@@ -90,7 +90,9 @@ set(linux_only
   Compare.OrdersAsciiTheSameWithACharacterOutsideAsciiBehind
   Compare.OtherControlCharactersDoNotCount
   Compare.ScriptsFollowLatin
+  ElementNodes.UnitsThatDoNotCountLeaveAWordTrue
   ElementNodes.WordsThatAreTrue
+  ElementValues.WordForSpaceIsComparedByTheLanguage
   EntryList.FullWidthKeyIsTheSameKey
   EntryList.LongOrderedListFindsAsciiKeysByWideOnesAndTheOtherWayRound
   EntryList.OrderedListDoesWhatAVectorDoes
