@@ -5,8 +5,7 @@
 //
 // A short list is one array, searched from the front by the hashes of its keys. A sorted one of plain keys
 // (HashedKey.h) takes new entries at its end and is put into order when its order is first asked for: most nodes of a
-// tree are read, filled and looked into, and never walked. Searching for the place of each entry took a tenth of the
-// time of a run.
+// tree are read, filled and looked into, and never walked.
 //
 // A long list stands in pieces; if it is ordered, an index of its keys is built at the first
 // search and kept from then on, so that no search is linear in a long list.
