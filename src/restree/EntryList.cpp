@@ -221,7 +221,7 @@ void EntryList::GrowArray(uint32_t size) {
 
 void EntryList::InsertInArray(uint32_t slot, NodeEntry* entry) {
     if (count == capacity) {
-        // Two entries fill the smallest block of the node memory; most nodes have fewer than eight.
+        // Most nodes have fewer than eight entries.
         GrowArray(capacity + (capacity < 8 ? 2U : capacity < 16 ? 4U : 8U));
     }
     std::copy_backward(items + slot, items + count, items + count + 1);

@@ -24,13 +24,59 @@ constexpr int32_t RoomOf(uint32_t sizeClass) {
 
 }  // namespace
 
+// The lists of free blocks of one class that the threads have handed over.
+class PoolAllocator::FreeLists {
+  public:
+    void Put(FreeBlock* list, uint32_t sizeClass) {
+        if (HasRoomForTwo(sizeClass)) {
+            static_cast<FirstBlock*>(list)->nextList = first;
+        } else {
+            LastOf(list)->next = first;
+        }
+        first = list;
+    }
+
+    // Null if there is none.
+    FreeBlock* Take(uint32_t sizeClass) {
+        FreeBlock* list = first;
+        if (list != nullptr && HasRoomForTwo(sizeClass)) {
+            first = static_cast<FirstBlock*>(list)->nextList;
+        } else if (list != nullptr) {
+            // No more than a thread may keep, or the next Put would have all of them to walk over.
+            FreeBlock* last = LastOf(list, RoomOf(sizeClass) / 2);
+            first = last->next;
+            last->next = nullptr;
+        }
+        return list;
+    }
+
+  private:
+    struct FirstBlock : FreeBlock {
+        // The first block of the next list.
+        FreeBlock* nextList;
+    };
+
+    // The smallest blocks hold one pointer: their lists are joined into one.
+    static constexpr bool HasRoomForTwo(uint32_t sizeClass) { return SizeOfClass(sizeClass) >= sizeof(FirstBlock); }
+
+    // The last block of the list, or the one of that number if it is longer.
+    static FreeBlock* LastOf(FreeBlock* list, int32_t count = INT32_MAX) {
+        while (list->next != nullptr && --count > 0) {
+            list = list->next;
+        }
+        return list;
+    }
+
+    FreeBlock* first = nullptr;
+};
+
 // What the threads share. All of it is used under the mutex.
 struct PoolAllocator::Store {
     static_assert(sizeof(Region) % 16 == 0 && sizeClassCount <= 256);
     static_assert(sizeof(FreeBlock) <= SizeOfClass(1));
 
     std::mutex mutex;
-    std::array<FreeBlock*, sizeClassCount> lists = {};
+    std::array<FreeLists, sizeClassCount> lists = {};
     // The caches of threads that have ended; they still hold the rests of their spans.
     ThreadCache* idleCaches = nullptr;
     // Serves threads that are past the end of their thread-local objects.
@@ -83,11 +129,10 @@ struct PoolAllocator::Store {
 
     // Gives `cache`, which has no block of the class, some.
     bool Refill(ClassCache& cache, uint32_t sizeClass) {
-        FreeBlock* list = lists[sizeClass];
+        FreeBlock* list = lists[sizeClass].Take(sizeClass);
         if (list == nullptr) {
             return CutSpan(cache, sizeClass);
         }
-        lists[sizeClass] = list->nextList;
         cache.freeBlocks = list;
         // Not as if the list were full: the next block freed must not send it straight back.
         cache.room = RoomOf(sizeClass) / 2;
@@ -105,8 +150,7 @@ struct PoolAllocator::Store {
     // Takes over the free blocks of `cache`.
     void TakeList(ClassCache& cache, uint32_t sizeClass) {
         if (cache.freeBlocks != nullptr) {
-            cache.freeBlocks->nextList = lists[sizeClass];
-            lists[sizeClass] = cache.freeBlocks;
+            lists[sizeClass].Put(cache.freeBlocks, sizeClass);
             cache.freeBlocks = nullptr;
         }
         cache.room = RoomOf(sizeClass);

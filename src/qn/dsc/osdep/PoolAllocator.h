@@ -7,9 +7,9 @@
 // are of one class, which a table at the head of the region tells from the block's address. Each thread has, for each
 // class, a list of free blocks and a span from which new blocks are cut in ascending order, so that what is allocated
 // together lies together and untouched pages stay unused. A freed block goes to the list of the thread that frees it.
-// A list that grows long is handed over, whole, to a common store, from which any thread takes before it cuts a new
-// span; at its end a thread hands over all its lists. Spans never change their class, and nothing is given back to the
-// system. Blocks above the greatest class come from malloc.
+// A list that grows long is handed over, whole, to a common store (FreeLists), from which any thread takes before it
+// cuts a new span; at its end a thread hands over all its lists. Spans never change their class, and nothing is given
+// back to the system. Blocks above the greatest class come from malloc.
 
 // The operations stand in the header so that TaskMemory_pool.cpp takes them in without a further call.
 
@@ -46,8 +46,6 @@ class PoolAllocator {
 
     struct FreeBlock {
         FreeBlock* next;
-        // Of the first block of a list in the common store: the first block of the next list there.
-        FreeBlock* nextList;
     };
 
     // What a thread has of one class.
@@ -68,6 +66,7 @@ class PoolAllocator {
         ThreadCache* nextIdle = nullptr;
     };
 
+    class FreeLists;
     struct Store;
     struct ThreadEnd;
 

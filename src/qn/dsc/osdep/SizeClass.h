@@ -1,6 +1,6 @@
 #pragma once
 
-// The size classes of task memory: steps of 8 bytes from 16 to 128, where nearly all blocks of a tree lie, of 16 bytes
+// The size classes of task memory: steps of 8 bytes up to 128, where nearly all blocks of a tree lie, of 16 bytes
 // up to 512, then four steps for each doubling up to 32 KB. Blocks of a class that is a multiple of 16 are aligned to
 // 16 bytes, the others to 8.
 
@@ -18,19 +18,19 @@ constexpr size_t maximumClassedSize = 32768;
 constexpr size_t maximumFineSize = 512;
 
 // Classes 1 to sizeClassCount - 1 are blocks; 0 means "no class".
-constexpr uint32_t sizeClassCount = 64;
+constexpr uint32_t sizeClassCount = 65;
 
 namespace detail {
 
-constexpr uint32_t lastStepOf8 = 15;   // The class of 128 bytes.
-constexpr uint32_t lastStepOf16 = 39;  // The class of 512 bytes.
+constexpr uint32_t lastStepOf8 = 16;   // The class of 128 bytes.
+constexpr uint32_t lastStepOf16 = 40;  // The class of 512 bytes.
 
 }  // namespace detail
 
 // The bytes in a block of the class, 1 to sizeClassCount - 1.
 constexpr size_t SizeOfClass(uint32_t sizeClass) {
     if (sizeClass <= detail::lastStepOf8) {
-        return size_t{8} * (sizeClass + 1);
+        return size_t{8} * sizeClass;
     }
     if (sizeClass <= detail::lastStepOf16) {
         return 128 + size_t{16} * (sizeClass - detail::lastStepOf8);
@@ -75,8 +75,8 @@ constexpr bool NeedsGreaterClass(size_t oldSize, size_t newSize) {
     return oldSize <= maximumClassedSize && SizeClassOf(newSize) > SizeClassOf(oldSize);
 }
 
-static_assert(SizeClassOf(512) == 39 && SizeClassOf(513) == 40 && SizeClassOf(640) == 40 && SizeClassOf(641) == 41);
+static_assert(SizeClassOf(512) == 40 && SizeClassOf(513) == 41 && SizeClassOf(640) == 41 && SizeClassOf(641) == 42);
 static_assert(SizeClassOf(maximumClassedSize) == sizeClassCount - 1);
-static_assert(SizeOfClass(40) == 640 && SizeOfClass(43) == 1024 && SizeOfClass(63) == maximumClassedSize);
+static_assert(SizeOfClass(41) == 640 && SizeOfClass(44) == 1024 && SizeOfClass(64) == maximumClassedSize);
 
 }  // namespace qn::dsc::osdep

@@ -33,11 +33,13 @@ TEST(PoolAllocator, ReallocationWithinTheClassKeepsThePlace) {
     struct {
         size_t from;
         size_t to;
-    } const rows[] = {{1, 16}, {16, 1}, {17, 24}, {25, 32}, {500, 512}, {513, 640}, {700, 768}, {28673, 32768}};
+    } const rows[] = {{1, 8},   {8, 1},     {9, 16},    {16, 9},    {17, 24},
+                      {25, 32}, {500, 512}, {513, 640}, {700, 768}, {28673, 32768}};
     for (const auto& row : rows) {
         void* block = PoolAllocator::Allocate(row.from);
-        EXPECT_EQ(PoolAllocator::Reallocate(block, row.to), block) << row.from << " to " << row.to;
-        PoolAllocator::Free(block);
+        void* same = PoolAllocator::Reallocate(block, row.to);
+        EXPECT_EQ(same, block) << row.from << " to " << row.to;
+        PoolAllocator::Free(same);
     }
 }
 
@@ -113,8 +115,8 @@ TEST(PoolAllocator, BlocksFreedByAThreadThatEndedAreTakenAgain) {
     FreeAll(next);
 }
 
-TEST(PoolAllocator, AThreadThatOnlyAllocatesLivesOnWhatAnotherFrees) {
-    constexpr size_t size = 480;
+// One thread allocates `count` blocks in each of 40 rounds, another frees them: how many there are in all.
+size_t BlocksThatPassBetweenThreads(size_t size, size_t count) {
     std::set<void*> known;
     std::vector<void*> handed;
     std::atomic<int> turn = 0;
@@ -128,15 +130,24 @@ TEST(PoolAllocator, AThreadThatOnlyAllocatesLivesOnWhatAnotherFrees) {
         }
     });
     for (int round = 0; round < rounds; ++round) {
-        handed = AllocateMany(5000, size);
+        handed = AllocateMany(count, size);
         known.insert(handed.begin(), handed.end());
         turn = 2 * round + 1;
         turn.notify_one();
         turn.wait(2 * round + 1);
     }
     freeing.join();
+    return known.size();
+}
+
+TEST(PoolAllocator, AThreadThatOnlyAllocatesLivesOnWhatAnotherFrees) {
     // One round's blocks, a list that is still with the other thread, and the rests of spans; not 200,000.
-    EXPECT_LE(known.size(), 6000U);
+    EXPECT_LE(BlocksThatPassBetweenThreads(480, 5000), 6000U);
+}
+
+TEST(PoolAllocator, AThreadLivesOnTheSmallestBlocksThatAnotherFrees) {
+    // Lists of 8,192 blocks, joined into one and taken in halves; not 1,600,000 blocks.
+    EXPECT_LE(BlocksThatPassBetweenThreads(8, 40000), 60000U);
 }
 
 class AllocatesWhenItDies {

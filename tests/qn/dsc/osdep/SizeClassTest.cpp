@@ -17,22 +17,22 @@ TEST(SizeClass, HoldsNothingInTheFirstClass) {
     EXPECT_EQ(SizeClassOf(0), 1U);
 }
 
-TEST(SizeClass, StepsBy8BytesFrom16To128) {
-    for (uint32_t sizeClass = 1; sizeClass <= 15; ++sizeClass) {
-        EXPECT_EQ(SizeOfClass(sizeClass), 8U + 8U * sizeClass);
+TEST(SizeClass, StepsBy8BytesUpTo128) {
+    for (uint32_t sizeClass = 1; sizeClass <= 16; ++sizeClass) {
+        EXPECT_EQ(SizeOfClass(sizeClass), 8U * sizeClass);
     }
 }
 
 TEST(SizeClass, StepsBy16BytesFrom128To512) {
     for (uint32_t step = 0; step <= 24; ++step) {
-        EXPECT_EQ(SizeOfClass(15 + step), 128U + 16U * step);
+        EXPECT_EQ(SizeOfClass(16 + step), 128U + 16U * step);
     }
 }
 
 TEST(SizeClass, DoublesInFourStepsAbove512) {
     constexpr size_t expected[] = {640, 768, 896, 1024, 1280, 1536, 1792, 2048, 2560};
     for (uint32_t step = 0; step < 9; ++step) {
-        EXPECT_EQ(SizeOfClass(40 + step), expected[step]);
+        EXPECT_EQ(SizeOfClass(41 + step), expected[step]);
     }
     EXPECT_EQ(SizeOfClass(sizeClassCount - 1), 32768U);
 }
