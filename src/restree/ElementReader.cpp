@@ -195,8 +195,7 @@ ResTreeNode& ElementReader::MakeChild(String&& entryName, String&& elementName, 
     }
     if (prototype != nullptr) {
         // Ahead of the element's own children, so that these override it.
-        child->MergeFrom(*prototype, frame.mergeExisting);
-        child->ApplyParameters(CollectParameters(stack));
+        child->MergeExpanded(*prototype, frame.mergeExisting, CollectParameters(stack));
     }
     return *child;
 }

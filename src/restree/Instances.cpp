@@ -1,5 +1,7 @@
 #include "restree/Instances.h"
 
+#include "restree/Parameters.h"
+
 namespace zkhw {
 
 void ReplicateInstances(ParseFrame& frame) {
@@ -12,12 +14,10 @@ void ReplicateInstances(ParseFrame& frame) {
     }
     for (size_t i = 1; i < frame.instances.size(); ++i) {
         const InstanceRecord& record = frame.instances[i];
-        ResTreeNode* copy = nullptr;
-        const NodeEntry* placed =
-            node.CloneSubtreeBehind(last, record.name.View(), *pattern, frame.mergeExisting, copy);
-        if (copy != nullptr) {
-            last = placed;
-            copy->ApplyInstance(record.name.View(), record.variable, record.index);
+        const InstanceParameters parameters(record.name.View(), record.variable, record.index);
+        if (const NodeEntry* copy =
+                node.CloneExpandedBehind(last, record.name.View(), *pattern, frame.mergeExisting, parameters)) {
+            last = copy;
         }
     }
     // The pattern stays unexpanded until all copies have been made from it.

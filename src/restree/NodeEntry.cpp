@@ -31,6 +31,10 @@ NodeEntry* NodeEntry::MakeText(String&& key, uint8_t keyHash, EntryKind kind, St
     return new (Allocate(sizeof(TextShape))) TextShape(std::move(key), keyHash, kind, std::move(text));
 }
 
+NodeEntry* NodeEntry::CopyText(const NodeEntry& source, String&& text) {
+    return MakeText(String(source.key), source.keyHash, source.kind, std::move(text));
+}
+
 NodeEntry* NodeEntry::MakeChild(String&& key, ResTreeNode* child) {
     const uint8_t keyHash = HashKey(key.View());
     return MakeChild(std::move(key), keyHash, child);

@@ -30,6 +30,10 @@ class NodeEntry {
     static NodeEntry* MakeText(String&& key, EntryKind kind, String&& text);
     static NodeEntry* MakeText(String&& key, uint8_t keyHash, EntryKind kind, String&& text);
 
+    // An entry of the key and the kind of `source`, a text or link entry, with another text. Throws bad_alloc; then
+    // `text` is as it was.
+    static NodeEntry* CopyText(const NodeEntry& source, String&& text);
+
     // A child entry that takes `child`. Throws bad_alloc; then `key` is as it was and `child` still the caller's.
     static NodeEntry* MakeChild(String&& key, ResTreeNode* child);
     static NodeEntry* MakeChild(String&& key, uint8_t keyHash, ResTreeNode* child);

@@ -152,12 +152,16 @@ bool ResTreeNode::SetEntryText(NodeEntry* entry, String&& value) {
     if (text == nullptr) {
         return false;
     }
-    if (!MayBeHeard() && (parent == nullptr || !parent->MayBeHeard())) {
-        text->Swap(value);
-        return true;
-    }
-    const bool isDisplayName = Compare(entry->Key().View(), displayNameKey) == 0;
     text->Swap(value);
+    RaiseTextChange(*entry);
+    return true;
+}
+
+void ResTreeNode::RaiseTextChange(const NodeEntry& entry) {
+    if (!MayBeHeard() && (parent == nullptr || !parent->MayBeHeard())) {
+        return;
+    }
+    const bool isDisplayName = Compare(entry.Key().View(), displayNameKey) == 0;
     const ReleaseScope scope;
     Raise(PropertyChanged);
     if (isDisplayName) {
@@ -166,7 +170,6 @@ bool ResTreeNode::SetEntryText(NodeEntry* entry, String&& value) {
             parent->Raise(ChildNameChanged);
         }
     }
-    return true;
 }
 
 EntryPosition ResTreeNode::PositionBefore(const String* before) {
@@ -185,6 +188,7 @@ ResTreeNode::Added ResTreeNode::Store(EntryPosition position, NodeEntry* entry, 
         NodeEntry::Release(entry);
         throw;
     }
+    NoteKey(*entry);
     Raise(change);
     return {entry, true};
 }
@@ -274,6 +278,7 @@ EntryIterator ResTreeNode::InsertEntry(EntryIterator position, std::u16string_vi
         NodeEntry::Release(entry);
         throw;
     }
+    NoteKey(*entry);
     return {entries, entries.Locate(entry)};
 }
 
@@ -287,7 +292,11 @@ EntryIterator ResTreeNode::InsertEntry(EntryIterator position, std::u16string_vi
         NodeEntry::Release(entry);
         throw;
     }
-    child.release()->parent = this;
+    child->parent = this;
+    NoteKey(*entry);
+    if (child.release()->mayBeDeferred) {
+        NoteDeferredContents();
+    }
     return {entries, entries.Locate(entry)};
 }
 
@@ -299,6 +308,7 @@ bool ResTreeNode::RenameEntry(std::u16string_view oldKey, std::u16string_view ne
     String key(newKey);
     if (IsOrdered()) {
         entries.AssignKey(entry, std::move(key));
+        NoteKey(*entry);
         return true;
     }
     std::vector<NodeEntry*>& lost = GetAttachments().lostEntries;
@@ -312,6 +322,7 @@ bool ResTreeNode::RenameEntry(std::u16string_view oldKey, std::u16string_view ne
     }
     entries.Insert(place.position, entry);
     lost.pop_back();
+    NoteKey(*entry);
     return true;
 }
 

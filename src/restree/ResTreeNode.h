@@ -168,16 +168,20 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     // ancestors: what is being filled is not copied into itself.
     void MergeFrom(ResTreeNode& source, bool overwrite);
 
+    // MergeFrom, and then ApplyParameters. In one walk where that makes no difference, which is nearly always: it saves
+    // a second walk, and a copy of each text that holds "#{".
+    void MergeExpanded(ResTreeNode& source, bool overwrite, const Parameters& parameters);
+
     // Makes `source` or its contents the child `key` at `position`, and gives that child. An entry of that name goes,
     // except that with `overwrite` a child of the same type and order stays and receives the merge. Null and the end
     // if an observer has removed the child meanwhile.
     EntryIterator CloneSubtreeInto(EntryIterator position, std::u16string_view key, ResTreeNode& source, bool overwrite,
                                    ResTreeNode*& child);
 
-    // The same behind the entry `behind`, or at the end if that has left the node; gives the entry of the copy. Null,
-    // and `child` too, if an observer has removed it meanwhile.
-    NodeEntry* CloneSubtreeBehind(const NodeEntry* behind, std::u16string_view key, ResTreeNode& source, bool overwrite,
-                                  ResTreeNode*& child);
+    // The same behind the entry `behind`, or at the end if that has left the node, and then ApplyParameters of the
+    // copy. Gives the entry of the copy; null if an observer has removed it before its texts were expanded.
+    NodeEntry* CloneExpandedBehind(const NodeEntry* behind, std::u16string_view key, ResTreeNode& source,
+                                   bool overwrite, const Parameters& parameters);
 
     // A detached copy with its own type table, if this node has one. The caller owns it.
     std::unique_ptr<ResTreeNode> Clone();
@@ -344,11 +348,13 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     friend class ElementReader;
     friend class ReleaseScope;
     friend class ReservationWalk;
+    static constexpr HashedKey deferredPathKey{u":DeferredLoadPath"};
     struct Attachments;
     struct MergeWalk;
 
     Attachments& GetAttachments();
     Added Store(EntryPosition position, NodeEntry* entry, uint32_t change);
+    void RaiseTextChange(const NodeEntry& entry);
     EntryPosition PositionBefore(const String* before);
     EntryPosition PlaceInFront(std::u16string_view key) const;
     Added AddText(String&& key, String&& text, EntryKind kind, uint32_t change, const String* before);
@@ -362,8 +368,7 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     ResTreeNode* PrepareClone(EntryPosition position, HashedKey key, ResTreeNode& source, bool overwrite,
                               NodeEntry*& entry);
 
-    NodeEntry* CloneAt(EntryPosition position, std::u16string_view key, ResTreeNode& source, bool overwrite,
-                       ResTreeNode*& child);
+    bool MayExpandWhileMerging(const ResTreeNode& source) const;
 
     void FinishRemoval(NodeEntry* entry);
     std::vector<NodeEntry*> ChildEntriesInRemovalOrder() const;
@@ -400,6 +405,15 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     int32_t LoadIncludedFile(const NarrowString& path, bool asChild, ResTreeNode** node, const LoadChain& includer);
     int32_t LoadFile(const NarrowString& path, bool asChild, ResTreeNode** node, const LoadChain& chain);
     void TakeOrder(bool ordered);
+    // Have to hear of each entry that comes in, and of each new key. A node above one with deferred contents knows of
+    // them, so that who copies need not look for them.
+    void NoteKey(const NodeEntry& entry) {
+        if (entry.KeyHash() == deferredPathKey.hash || entry.KeyHash() == 0) {
+            NoteUnusualKey(entry);
+        }
+    }
+    void NoteUnusualKey(const NodeEntry& entry);
+    void NoteDeferredContents();
     bool HasDeferredContents() const;
     bool TakeDeferredPaths(std::vector<String>& paths);
 
@@ -410,8 +424,9 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     std::unique_ptr<Attachments> attachments;  // What few nodes have: a type table, observers.
     uint32_t suspendCount = 0;                 // Nonzero while delivery is held back.
     uint16_t pendingChanges = 0;               // ChangeFlags raised and not yet delivered.
-    bool isDefunct = false;                    // Torn down; only the memory is left (ReleaseScope).
-    bool isKept = false;                       // Has left its tree, whole or torn down, and is kept by a ReleaseScope.
+    bool isDefunct : 1 = false;                // Torn down; only the memory is left (ReleaseScope).
+    bool isKept : 1 = false;                   // Has left its tree, whole or torn down, and is kept by a ReleaseScope.
+    bool mayBeDeferred : 1 = false;            // Here or below there is, or has been, an entry ":DeferredLoadPath".
 };
 
 }  // namespace zkhw

@@ -7,6 +7,7 @@
 #include "restree/EntryWalk.h"
 #include "restree/LevelStack.h"
 #include "restree/NodePath.h"
+#include "restree/Parameters.h"
 #include "restree/ReleaseScope.h"
 #include "restree/ResTreeNode.h"
 #include "restree/TextList.h"
@@ -31,7 +32,9 @@ struct ResTreeNode::MergeWalk {
 
     static constexpr uint32_t unknownOrder = 0xFFFFFFFF;
 
-    MergeWalk(ResTreeNode& target, ResTreeNode& source, bool overwrite) : top(&target), overwrite(overwrite) {
+    // With `parameters` every text is expanded as it comes in; only if MayExpandWhileMerging.
+    MergeWalk(ResTreeNode& target, ResTreeNode& source, bool overwrite, const Parameters* parameters)
+        : top(&target), overwrite(overwrite), parameters(parameters) {
         Enter(target, source);
     }
 
@@ -47,11 +50,13 @@ struct ResTreeNode::MergeWalk {
         }
     }
     void MergeText(Level& level, const NodeEntry& entry);
+    void StoreText(Level& level, const NodeEntry& entry, String&& text);
     void MergeLink(Level& level, const NodeEntry& entry);
 
     const ReleaseScope scope;
     ResTreeNode* top;
     bool overwrite;
+    const Parameters* parameters;
     LevelStack<Level> levels;
 };
 
@@ -76,14 +81,24 @@ void ResTreeNode::MergeWalk::Run() {
 }
 
 void ResTreeNode::MergeWalk::MergeText(Level& level, const NodeEntry& entry) {
+    const String& text = *entry.Text();
+    if (parameters == nullptr || !HasVariables(text)) {
+        StoreText(level, entry, String(text));
+        return;
+    }
+    StoreText(level, entry, ExpandVariables(text, *parameters));
+    if (level.target == top) {
+        // Nobody hears of nodes that are just being made, but the node that holds the new one may gather its changes.
+        top->RaiseTextChange(entry);
+    }
+}
+
+void ResTreeNode::MergeWalk::StoreText(Level& level, const NodeEntry& entry, String&& text) {
     ResTreeNode& target = *level.target;
-    String text(*entry.Text());
     if (level.copiedInOrder == target.entries.Size()) {
         // The search would end at the end.
         ++level.copiedInOrder;
-        target.Store(EntryList::End(),
-                     NodeEntry::MakeText(String(entry.Key()), entry.KeyHash(), entry.Kind(), std::move(text)),
-                     PropertyAdded);
+        target.Store(EntryList::End(), NodeEntry::CopyText(entry, std::move(text)), PropertyAdded);
         return;
     }
     const Added added = target.AddTextEntry(String(entry.Key()), std::move(text), entry.Kind());
@@ -110,10 +125,26 @@ void ResTreeNode::MergeWalk::MergeLink(Level& level, const NodeEntry& entry) {
 }
 
 void ResTreeNode::MergeFrom(ResTreeNode& source, bool overwrite) {
-    MergeWalk(*this, source, overwrite).Run();
+    MergeWalk(*this, source, overwrite, nullptr).Run();
 }
 
-// All of CloneSubtreeInto but the merge. Gives the child that is to receive it, or null if another kind of entry holds
+// Whether texts may be expanded on their way from `source` into this node: it has just been made, no observer can look
+// at it in between, and no load comes between the copy and the expansion.
+bool ResTreeNode::MayExpandWhileMerging(const ResTreeNode& source) const {
+    const bool isObserved = MayBeHeard() || (parent != nullptr && parent->attachments);
+    return entries.IsEmpty() && !isObserved && !source.mayBeDeferred;
+}
+
+void ResTreeNode::MergeExpanded(ResTreeNode& source, bool overwrite, const Parameters& parameters) {
+    if (MayExpandWhileMerging(source)) {
+        MergeWalk(*this, source, overwrite, &parameters).Run();
+    } else {
+        MergeFrom(source, overwrite);
+        ApplyParameters(parameters);
+    }
+}
+
+// All of a clone but the merge. Gives the child that is to receive it, or null if another kind of entry holds
 // the place or an observer has removed the child already.
 ResTreeNode* ResTreeNode::PrepareClone(EntryPosition position, HashedKey key, ResTreeNode& source, bool overwrite,
                                        NodeEntry*& entry) {
@@ -145,35 +176,44 @@ ResTreeNode* ResTreeNode::PrepareClone(EntryPosition position, HashedKey key, Re
     return StillHolds(entry) ? child : nullptr;
 }
 
-NodeEntry* ResTreeNode::CloneAt(EntryPosition position, std::u16string_view key, ResTreeNode& source, bool overwrite,
-                                ResTreeNode*& child) {
+EntryIterator ResTreeNode::CloneSubtreeInto(EntryIterator position, std::u16string_view key, ResTreeNode& source,
+                                            bool overwrite, ResTreeNode*& child) {
     const ReleaseScope scope;
     NodeEntry* entry = nullptr;
-    child = PrepareClone(position, key, source, overwrite, entry);
+    child = PrepareClone(position.Position(), key, source, overwrite, entry);
     if (child != nullptr) {
         child->MergeFrom(source, overwrite);
     }
     if (!StillHolds(entry)) {
         child = nullptr;
-        return nullptr;
+        return {entries, EntryList::End()};
     }
-    return entry;
+    return {entries, entries.Locate(entry)};
 }
 
-EntryIterator ResTreeNode::CloneSubtreeInto(EntryIterator position, std::u16string_view key, ResTreeNode& source,
-                                            bool overwrite, ResTreeNode*& child) {
-    NodeEntry* entry = CloneAt(position.Position(), key, source, overwrite, child);
-    return {entries, entry == nullptr ? EntryList::End() : entries.Locate(entry)};
-}
-
-NodeEntry* ResTreeNode::CloneSubtreeBehind(const NodeEntry* behind, std::u16string_view key, ResTreeNode& source,
-                                           bool overwrite, ResTreeNode*& child) {
+NodeEntry* ResTreeNode::CloneExpandedBehind(const NodeEntry* behind, std::u16string_view key, ResTreeNode& source,
+                                            bool overwrite, const Parameters& parameters) {
+    const ReleaseScope scope;
     EntryPosition position = EntryList::End();
     // An unordered node has no use for a position, and need not be put into its order for one.
     if (IsOrdered() && StillHolds(behind)) {
         position = entries.Next(entries.Locate(behind));
     }
-    return CloneAt(position, key, source, overwrite, child);
+    NodeEntry* entry = nullptr;
+    ResTreeNode* child = PrepareClone(position, key, source, overwrite, entry);
+    if (child == nullptr) {
+        return nullptr;
+    }
+    if (child->MayExpandWhileMerging(source)) {
+        MergeWalk(*child, source, overwrite, &parameters).Run();
+        return entry;
+    }
+    child->MergeFrom(source, overwrite);
+    if (!StillHolds(entry)) {
+        return nullptr;
+    }
+    child->ApplyParameters(parameters);
+    return entry;
 }
 
 std::unique_ptr<ResTreeNode> ResTreeNode::Clone() {

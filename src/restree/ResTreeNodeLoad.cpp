@@ -26,7 +26,6 @@ constexpr int32_t success = 0;
 constexpr int32_t generalFailure = static_cast<int32_t>(0x80004005);
 
 constexpr std::u16string_view parseErrorsKey = u"XMLParseErrors";
-constexpr HashedKey deferredPathKey(u":DeferredLoadPath");
 
 // Holds back a node's notices for the length of a load, so that they are delivered in one go.
 template <typename Load>
@@ -215,13 +214,25 @@ void ResTreeNode::TakeOrder(bool ordered) {
     }
 }
 
-// Takes the entry of the deferred paths away and gives what it named; false if there is none.
-bool ResTreeNode::HasDeferredContents() const {
-    return !entries.IsEmpty() && FindRaw(deferredPathKey) != nullptr;
+void ResTreeNode::NoteUnusualKey(const NodeEntry& entry) {
+    if (qn::dsc::osdep::Compare(entry.Key().View(), deferredPathKey.text) == 0) {
+        NoteDeferredContents();
+    }
 }
 
+void ResTreeNode::NoteDeferredContents() {
+    for (ResTreeNode* node = this; node != nullptr && !node->mayBeDeferred; node = node->parent) {
+        node->mayBeDeferred = true;
+    }
+}
+
+bool ResTreeNode::HasDeferredContents() const {
+    return mayBeDeferred && FindRaw(deferredPathKey) != nullptr;
+}
+
+// Takes the entry of the deferred paths away and gives what it named; false if there is none.
 bool ResTreeNode::TakeDeferredPaths(std::vector<String>& paths) {
-    NodeEntry* entry = FindRaw(deferredPathKey);
+    NodeEntry* entry = mayBeDeferred ? FindRaw(deferredPathKey) : nullptr;
     if (entry == nullptr || !entry->IsText()) {
         return false;
     }
@@ -238,7 +249,7 @@ bool ResTreeNode::EnsureDeferredLoaded() {
         size_t next = 0;
     };
     std::vector<String> paths;
-    if (entries.IsEmpty() || !TakeDeferredPaths(paths)) {
+    if (!mayBeDeferred || !TakeDeferredPaths(paths)) {
         return true;
     }
     const ReleaseScope scope;

@@ -164,6 +164,50 @@ TEST_F(DeferredLoad, EmptyEntryIsRemoved) {
     EXPECT_EQ(stub.FindRaw(u":DeferredLoadPath"), nullptr);
 }
 
+TEST_F(DeferredLoad, EntryIsKnownInAnyLetterCase) {
+    Write("board.xml", "<B><V>1</V></B>");
+    ResTreeNode& stub = Stub();
+    stub.SetProperty(u":DEFERREDloadpath", u"board.xml");
+    EXPECT_EQ(TextAt(stub, u"V"), "1");
+}
+
+TEST_F(DeferredLoad, EntryMayGetItsKeyByARename) {
+    Write("board.xml", "<B><V>1</V></B>");
+    ResTreeNode& stub = Stub();
+    stub.SetProperty(u"later", u"board.xml");
+    EXPECT_EQ(stub.GetProperty(u"V"), nullptr);
+    EXPECT_TRUE(stub.RenameEntry(u"later", u":DeferredLoadPath"));
+    EXPECT_EQ(TextAt(stub, u"V"), "1");
+}
+
+TEST_F(DeferredLoad, EntryOfAnOrderedNodeMayGetItsKeyByARename) {
+    Write("board.xml", "<B><V>1</V></B>");
+    Load(*root, "<R><L name='l' ordered='true'><later>board.xml</later></L></R>");
+    ResTreeNode& list = At(*root, u"l");
+    EXPECT_EQ(list.GetProperty(u"V"), nullptr);
+    EXPECT_TRUE(list.RenameEntry(u"later", u":DeferredLoadPath"));
+    EXPECT_EQ(TextAt(list, u"V"), "1");
+}
+
+TEST_F(DeferredLoad, EntryMayBeInserted) {
+    Write("board.xml", "<B><V>1</V></B>");
+    ResTreeNode& stub = Stub();
+    stub.InsertEntry(stub.End(), u":DeferredLoadPath", TextEntry, u"board.xml");
+    EXPECT_EQ(TextAt(stub, u"V"), "1");
+}
+
+TEST_F(DeferredLoad, EntryMayComeInBelowAnInsertedNode) {
+    Write("board.xml", "<B><V>#{K}</V></B>");
+    auto made = std::make_unique<ResTreeNode>(u"made", u"M", false, static_cast<const TypeTable*>(nullptr));
+    ResTreeNode* inner = nullptr;
+    made->AddChildEntry(u"inner", u"I", false, inner);
+    Defer(*inner, u"board.xml");
+    Above().InsertEntry(Above().End(), u"made", std::move(made));
+    // The copy loads by itself, and what it loads is expanded.
+    Load(*root, "<R><Q name='q' prototype='a/made' K='k'/></R>");
+    EXPECT_EQ(DumpTree(At(*root, u"q")), "q:Q\n  inner:I\n    V=k\n");
+}
+
 TEST_F(DeferredLoad, FileThatDefersToItselfEnds) {
     // The lookup of the prototype misses while the file is being read, and asks for it once more.
     Write("self.xml",

@@ -24,6 +24,36 @@ R:R
 )");
 }
 
+// What a node that holds its notices back has gathered when a document has been read into it.
+uint32_t ChangesOfReading(const char* document) {
+    auto root = MakeUnnamedRoot();
+    Load(*root, "<R><A name='a'/></R>");
+    ResTreeNode& node = At(*root, u"a");
+    node.BeginChanges();
+    EXPECT_EQ(node.LoadResourceText(String(document), false, nullptr), 0);
+    const uint32_t changes = node.BeginChanges();
+    node.EndChanges(0, true);
+    node.EndChanges(0, true);
+    return changes;
+}
+
+TEST(Names, ExpandedDisplayNameCountsAsAChangeOfTheChildsName) {
+    EXPECT_EQ(ChangesOfReading("<A><X names='P,Q'><DisplayName>#{name}</DisplayName></X></A>"),
+              ChildAdded | ChildNameChanged);
+}
+
+TEST(Names, ExpandedDisplayNameOfACopyOfAPrototypeCountsAsAChangeOfTheChildsName) {
+    EXPECT_EQ(
+        ChangesOfReading("<A><X name='p'><DISPLAYNAME>#{i}</DISPLAYNAME></X><Y name='q' prototype='p' i='1'/></A>"),
+        ChildAdded | ChildNameChanged);
+}
+
+TEST(Names, OtherExpandedTextsAreNoChangeOfTheNodeAbove) {
+    EXPECT_EQ(ChangesOfReading("<A><X names='P,Q'><Label>#{name}</Label>"
+                               "<Y><DisplayName>#{name}</DisplayName></Y></X></A>"),
+              uint32_t{ChildAdded});
+}
+
 TEST(Names, OtherParametersAreFilledInWhileTheElementIsRead) {
     ASSERT_TREE("<R><Pin names='A' Kind='x'><Label>#{name}</Label><Mode>#{Kind}</Mode></Pin></R>", R"(
 R:R

@@ -405,6 +405,23 @@ R:R
 )");
 }
 
+TEST_F(PrototypeOfAStub, IsExpandedBesideWhatIsLoaded) {
+    // Values that were put in are not expanded again: not in what was copied, nor in what the copy loaded.
+    Write("board.xml", "<Board><V>#{K}#{L}</V></Board>");
+    auto root = MakeUnnamedRoot();
+    Load(*root, "<R><P name='p'><A>#{K}</A><S name='s'><U>#{K}</U></S><Z>#{K}</Z></P></R>");
+    At(*root, u"p/s").SetProperty(u":DeferredLoadPath", u"board.xml");
+    Load(*root, "<R><Q name='q' prototype='p' K='#{L}' L='l'/></R>");
+    EXPECT_EQ("\n" + DumpTree(At(*root, u"q")), R"(
+q:Q
+  A=#{L}
+  s:S
+    U=#{L}
+    V=#{L}l
+  Z=#{L}
+)");
+}
+
 TEST_F(PrototypeOfAStub, InsideItIsLoadedToBeFound) {
     Write("board.xml", "<Board><P><V>1</V></P></Board>");
     auto root = MakeUnnamedRoot();
