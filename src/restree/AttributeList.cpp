@@ -65,7 +65,7 @@ size_t FindKnownName(std::string_view name, bool isPlain) {
 void AttributeList::Clear() {
     text.clear();
     items.clear();
-    known.fill(absent);
+    present = 0;
 }
 
 void AttributeList::Assign(const char* const* attributes) {
@@ -91,8 +91,9 @@ void AttributeList::Assign(const char* const* attributes) {
 // The first of equal names stays.
 void AttributeList::Note(const Item& item) {
     const size_t name = FindKnownName(NameOf(item), item.hasPlainName);
-    if (name < knownCount) {
-        known[name] = std::min(known[name], static_cast<uint32_t>(items.size() - 1));
+    if (name < knownCount && ((present >> name) & 1U) == 0) {
+        present |= 1U << name;
+        known[name] = static_cast<uint32_t>(items.size() - 1);
     }
 }
 

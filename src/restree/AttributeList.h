@@ -33,7 +33,7 @@ class AttributeList {
 
     bool IsEmpty() const { return items.empty(); }
 
-    bool Has(AttributeName name) const { return known[static_cast<size_t>(name)] != absent; }
+    bool Has(AttributeName name) const { return ((present >> static_cast<uint32_t>(name)) & 1U) != 0; }
 
     // The value of an attribute that is there.
     String Value(AttributeName name) const;
@@ -66,7 +66,6 @@ class AttributeList {
         uint32_t end;
         bool hasPlainName;
     };
-    static constexpr uint32_t absent = 0xFFFFFFFF;
     static constexpr size_t knownCount = 10;
 
     std::string_view NameOf(const Item& item) const { return {text.data() + item.name, item.value - item.name - 1}; }
@@ -78,9 +77,9 @@ class AttributeList {
     void Note(const Item& item);
 
     std::string text;
-    std::vector<Item> items;  // In document order; equal names stand here all the same.
-    std::array<uint32_t, knownCount> known = {absent, absent, absent, absent, absent,
-                                              absent, absent, absent, absent, absent};  // Where each stands in `items`.
+    std::vector<Item> items;                      // In document order; equal names stand here all the same.
+    uint32_t present = 0;                         // A bit for each AttributeName that is there.
+    std::array<uint32_t, knownCount> known = {};  // Where each that is there stands in `items`.
 };
 
 }  // namespace zkhw

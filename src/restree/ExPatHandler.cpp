@@ -79,6 +79,11 @@ ExPatHandler::~ExPatHandler() {
     }
 }
 
+void ExPatHandler::SwitchText(bool isWanted) {
+    isTextWanted = isWanted;
+    XML_SetCharacterDataHandler(parser, isWanted ? Callbacks::CharacterData : nullptr);
+}
+
 bool ExPatHandler::Parse(const char* bytes, size_t count, bool isFinal) {
     if (!hasBegun && count != 0) {
         hasBegun = true;

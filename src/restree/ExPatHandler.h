@@ -23,7 +23,7 @@ class ExPatHandler {
 
     // `attributes`: name and value by turns, all NUL-terminated, then null.
     virtual void StartElement(std::string_view name, const char* const* attributes) = 0;
-    virtual void EndElement(std::string_view name) = 0;
+    virtual void EndElement(const char* name) = 0;
     // One piece of text; libexpat cuts a text at line ends, references and the ends of what it was given.
     virtual void CharacterData(std::string_view text) = 0;
     virtual void ProcessingInstruction(std::string_view target, std::string_view data) = 0;
@@ -47,11 +47,22 @@ class ExPatHandler {
     ExPatHandler();
     ~ExPatHandler();  // Not virtual: a handler lives as what it is.
 
+    // Whether CharacterData is called from now on; it is at first. Most pieces of text are the white space between
+    // elements, and not to hear of it saves more than this call costs.
+    void WantText(bool isWanted) {
+        if (isWanted != isTextWanted) {
+            SwitchText(isWanted);
+        }
+    }
+
   private:
     struct Callbacks;
 
+    void SwitchText(bool isWanted);
+
     XML_ParserStruct* parser;
     bool hasBegun = false;
+    bool isTextWanted = true;
     bool mayHoldNul = false;     // Bytes of value 0 may stand ahead of where the parser is.
     std::exception_ptr failure;  // Kept while libexpat, which knows no exceptions, is on the stack.
 };

@@ -1,5 +1,6 @@
 #include "restree/NodePath.h"
 
+#include <algorithm>
 #include <string_view>
 #include <vector>
 
@@ -49,8 +50,23 @@ void AppendComponents(TextBuilder& result, PieceReader& reader, bool isFirst) {
     }
 }
 
+// The length of the components that both paths begin with, unit by unit alike and without escapes, with the separator
+// behind them. Something is left of both.
+size_t SharedLength(std::u16string_view a, std::u16string_view b) {
+    const size_t length = std::min(a.size(), b.size());
+    size_t shared = 0;
+    for (size_t at = 0; at + 1 < length && a[at] == b[at] && a[at] != u'\\'; ++at) {
+        shared = a[at] == u'/' ? at + 1 : shared;
+    }
+    return shared;
+}
+
 // Appends what MakeRelativeNodePath gives.
 void AppendRelativePath(TextBuilder& result, std::u16string_view target, std::u16string_view base) {
+    // Nearly all that there is to compare.
+    const size_t shared = SharedLength(target, base);
+    target.remove_prefix(shared);
+    base.remove_prefix(shared);
     PieceReader targetReader(target, separator, false);
     PieceReader baseReader(base, separator, false);
     bool hasTarget = targetReader.Next();

@@ -83,25 +83,29 @@ void ParseStack::StartElement(std::string_view name, const char* const* attribut
     }
     if (!top->pendingName.IsEmpty()) {
         ElementReader(*this).FlushPendingElement(ElementMode::Container, name, attributes);
-        return;
+    } else {
+        top->pendingName.Assign(name);
+        top->pendingAttributes.Assign(attributes);
+        top->text.clear();
+        top->ForgetInstances();
     }
-    top->pendingName.Assign(name);
-    top->pendingAttributes.Assign(attributes);
-    top->text.clear();
-    top->ForgetInstances();
+    WantText(IsTextAwaited());
 }
 
 void ParseStack::CharacterData(std::string_view text) {
-    // Text that no element is waiting for is the white space between elements.
-    if (top && !top->pendingName.IsEmpty() && IsWidenable(text)) {
+    if (IsTextAwaited() && IsWidenable(text)) {
         top->text.append(text);
     }
 }
 
-void ParseStack::EndElement(std::string_view name) {
-    if (!top) {
-        return;
+void ParseStack::EndElement(const char* name) {
+    if (top) {
+        FinishElement(name);
+        WantText(IsTextAwaited());
     }
+}
+
+void ParseStack::FinishElement(const char* name) {
     ParseFrame* frame = top.get();
     const bool wasPending = !frame->pendingName.IsEmpty();
     if (wasPending) {

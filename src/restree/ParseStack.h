@@ -40,7 +40,7 @@ class ParseStack final : public ExPatHandler {
     void NoteNode(ResTreeNode& node);
 
     void StartElement(std::string_view name, const char* const* attributes) override;
-    void EndElement(std::string_view name) override;
+    void EndElement(const char* name) override;
     void CharacterData(std::string_view text) override;
     void ProcessingInstruction(std::string_view, std::string_view) override {}
     void Comment(std::string_view) override {}
@@ -48,6 +48,9 @@ class ParseStack final : public ExPatHandler {
     void EndCdataSection() override {}
 
   private:
+    // Text that no element is waiting for is the white space between elements.
+    bool IsTextAwaited() const { return top && !top->pendingName.IsEmpty(); }
+    void FinishElement(const char* name);
     void PopFrame();
     std::unique_ptr<ParseFrame> TakeSpare();
 

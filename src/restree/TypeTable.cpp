@@ -22,35 +22,39 @@ bool TypeRecord::IsA(std::u16string_view typeName) const {
            std::any_of(bases.begin(), bases.end(), [&](const TypeRecord* base) { return base->IsA(typeName); });
 }
 
-bool TypeTable::NameOrder::operator()(qn::dsc::TextArgument left, qn::dsc::TextArgument right) const {
-    return Compare(left.View(), right.View()) < 0;
+TypeRecord* TypeTable::FindIn(const Records& records, HashedKey type) {
+    for (const std::unique_ptr<TypeRecord>& record : records) {
+        // Keys that aren't plain have the hash 0 and may equal one of any hash.
+        const bool mayBeEqual = record->nameHash == type.hash || record->nameHash == 0 || type.hash == 0;
+        if (mayBeEqual && Compare(record->name.View(), type.text) == 0) {
+            return record.get();
+        }
+    }
+    return nullptr;
 }
 
 void TypeTable::AddTypeRelation(std::u16string_view type, std::u16string_view base) {
     StopSharing();
-    auto found = records->find(type);
-    if (found == records->end()) {
-        found = records->emplace(String(type), std::make_unique<TypeRecord>(type)).first;
+    TypeRecord* found = FindIn(*records, type);
+    if (found == nullptr) {
+        records->push_back(std::make_unique<TypeRecord>(type));
+        found = records->back().get();
     }
     // An empty base is none, also where there is a type without a name.
     if (const TypeRecord* baseRecord = base.empty() ? nullptr : Find(base)) {
-        found->second->bases.push_back(baseRecord);
+        found->bases.push_back(baseRecord);
     }
 }
 
-const TypeRecord* TypeTable::Find(std::u16string_view type) const {
-    if (records == nullptr) {
-        return nullptr;
-    }
-    const auto found = records->find(type);
-    return found == records->end() ? nullptr : found->second.get();
+const TypeRecord* TypeTable::Find(HashedKey type) const {
+    return records == nullptr ? nullptr : FindIn(*records, type);
 }
 
 std::unique_ptr<TypeTable> TypeTable::Copy() const {
     auto copy = std::make_unique<TypeTable>();
     if (records != nullptr && recordsOfCopies == nullptr) {
         TypeTable first;
-        for (const auto& [name, record] : *records) {
+        for (const std::unique_ptr<TypeRecord>& record : *records) {
             first.CopyRecord(*record);
         }
         recordsOfCopies = std::move(first.records);
@@ -79,12 +83,12 @@ void TypeTable::StopSharing() {
     }
     auto own = std::make_shared<Records>();
     if (records != nullptr) {
-        for (const auto& [name, record] : *records) {
-            own->emplace(name, std::make_unique<TypeRecord>(record->name.View()));
+        for (const std::unique_ptr<TypeRecord>& record : *records) {
+            own->push_back(std::make_unique<TypeRecord>(record->name.View()));
         }
-        for (const auto& [name, record] : *records) {
-            for (const TypeRecord* base : record->bases) {
-                own->find(name)->second->bases.push_back(own->find(base->name)->second.get());
+        for (size_t i = 0; i < own->size(); ++i) {
+            for (const TypeRecord* base : (*records)[i]->bases) {
+                (*own)[i]->bases.push_back(FindIn(*own, base->name.View()));
             }
         }
     }

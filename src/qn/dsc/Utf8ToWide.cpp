@@ -27,14 +27,21 @@ __m128i Load16(const char* bytes) {
     return _mm_loadu_si128(reinterpret_cast<const __m128i*>(bytes));
 }
 
-void Widen8(const char* bytes, char16_t* target) {
+// Write 8 or 4 units, one for each byte, and give the bytes.
+__m128i Widen8(const char* bytes, char16_t* target) {
     const __m128i narrow = _mm_loadl_epi64(reinterpret_cast<const __m128i*>(bytes));
     _mm_storeu_si128(reinterpret_cast<__m128i*>(target), _mm_unpacklo_epi8(narrow, _mm_setzero_si128()));
+    return narrow;
 }
 
-void Widen4(const char* bytes, char16_t* target) {
+__m128i Widen4(const char* bytes, char16_t* target) {
     const __m128i narrow = _mm_cvtsi32_si128(Load<int32_t>(bytes));
     _mm_storel_epi64(reinterpret_cast<__m128i*>(target), _mm_unpacklo_epi8(narrow, _mm_setzero_si128()));
+    return narrow;
+}
+
+bool IsAscii(__m128i bytes) {
+    return _mm_movemask_epi8(bytes) == 0;
 }
 
 uint32_t ByteAt(const char* bytes) {
@@ -88,7 +95,7 @@ bool IsAscii(const char* begin, size_t length) {
         for (size_t offset = 0; offset + 16 < length; offset += 16) {
             seen = _mm_or_si128(seen, Load16(begin + offset));
         }
-        return _mm_movemask_epi8(seen) == 0;
+        return IsAscii(seen);
     }
     if (length >= 8) {
         return ((Load<uint64_t>(begin) | Load<uint64_t>(begin + length - 8)) & topBitsOf8) == 0;
@@ -103,22 +110,24 @@ bool IsAscii(const char* begin, size_t length) {
     return seen < 0x80;
 }
 
-void WidenAscii(const char* begin, size_t length, char16_t* target) {
+bool WidenAscii(const char* begin, size_t length, char16_t* target) {
     if (length >= 8) {
+        __m128i seen = Widen8(begin + length - 8, target + length - 8);
         for (size_t offset = 0; offset + 8 < length; offset += 8) {
-            Widen8(begin + offset, target + offset);
+            seen = _mm_or_si128(seen, Widen8(begin + offset, target + offset));
         }
-        Widen8(begin + length - 8, target + length - 8);
-        return;
+        return IsAscii(seen);
     }
     if (length >= 4) {
-        Widen4(begin, target);
-        Widen4(begin + length - 4, target + length - 4);
-        return;
+        const __m128i first = Widen4(begin, target);
+        return IsAscii(_mm_or_si128(first, Widen4(begin + length - 4, target + length - 4)));
     }
+    uint32_t seen = 0;
     for (size_t offset = 0; offset < length; ++offset) {
+        seen |= ByteAt(begin + offset);
         target[offset] = static_cast<char16_t>(ByteAt(begin + offset));
     }
+    return seen < 0x80;
 }
 
 size_t MeasureUtf8(const char* begin, size_t length) {
@@ -182,30 +191,35 @@ char16_t* Utf8ToWide(const char* begin, uint32_t length, uint32_t* resultLength)
 template <>
 bool StringBase<char16_t>::TryFromUtf8(const char* bytes, uint32_t length, String& text) {
     const size_t sourceLength = bytes == nullptr ? 0 : length;
-    const bool isAscii = IsAscii(bytes, sourceLength);
-    if (isAscii && text.begin == nullptr) {
-        // As nearly always: a place without a buffer.
-        text.SetFull(AllocateUnits(sourceLength), sourceLength);
-        WidenAscii(bytes, sourceLength, text.begin);
+    if (text.begin == nullptr) {
+        // As nearly always: a place without a buffer, and ASCII. Other texts have fewer units than bytes.
+        char16_t* block = AllocateUnits(sourceLength);
+        size_t count = sourceLength;
+        if (!WidenAscii(bytes, sourceLength, block)) {
+            count = MeasureUtf8(bytes, sourceLength);
+            if (count == SIZE_MAX) {
+                osdep::TaskMemFree(block);
+                return false;
+            }
+            DecodeUtf8(bytes, sourceLength, block, count);
+            // A smaller block; if there is none to be had, the greater one does as well.
+            void* smaller = osdep::TaskMemRealloc(block, (count + 1) * sizeof(char16_t));
+            block = smaller == nullptr ? block : static_cast<char16_t*>(smaller);
+        }
+        text.SetFull(block, count);
         return true;
     }
-    const size_t count = isAscii ? sourceLength : MeasureUtf8(bytes, sourceLength);
+    const size_t count = MeasureUtf8(bytes, sourceLength);
     if (count == SIZE_MAX) {
         return false;
     }
     if (!text.KeepsBuffer(count)) {
         char16_t* block = AllocateUnits(count);
-        if (text.begin != nullptr) {
-            osdep::TaskMemFree(text.begin);
-        }
+        osdep::TaskMemFree(text.begin);
         text.begin = block;
         text.capacityEnd = block + count;
     }
-    if (isAscii) {
-        WidenAscii(bytes, count, text.begin);
-    } else {
-        DecodeUtf8(bytes, sourceLength, text.begin, count);
-    }
+    DecodeUtf8(bytes, sourceLength, text.begin, count);
     text.end = text.begin + count;
     *text.end = 0;
     return true;

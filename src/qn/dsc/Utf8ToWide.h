@@ -18,8 +18,9 @@ char16_t* Utf8ToWide(const char* begin, uint32_t length, uint32_t* resultLength 
 // Whether all bytes are below 0x80. Eight or sixteen bytes at a step.
 bool IsAscii(const char* begin, size_t length);
 
-// Writes `length` units, one for each byte; the bytes are all below 0x80.
-void WidenAscii(const char* begin, size_t length, char16_t* target);
+// Writes `length` units, one for each byte. False if one of the bytes is not below 0x80; what was written is of no use
+// then.
+bool WidenAscii(const char* begin, size_t length, char16_t* target);
 
 // How many units the bytes stand for; SIZE_MAX if they are not well formed. Linear, without memory.
 size_t MeasureUtf8(const char* begin, size_t length);
