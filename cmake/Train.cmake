@@ -1,0 +1,30 @@
+# Runs TOOL on a copy of EXAMPLE at WORK, and puts the counts that it leaves in COUNTERS beside the OBJECTS of the
+# same sources. STAMP changes with the counts only, so that nothing is compiled anew for the same ones.
+set(utilities ${WORK}/Targets/QN/FPGA/Utilities)
+file(REMOVE_RECURSE ${WORK})
+file(COPY ${EXAMPLE}/ DESTINATION ${WORK})
+file(COPY ${TOOL} DESTINATION ${utilities})
+get_filename_component(name ${TOOL} NAME)
+
+# Counts add up over runs.
+file(GLOB_RECURSE old_counts ${COUNTERS}/*.gcda)
+if(old_counts)
+  file(REMOVE ${old_counts})
+endif()
+execute_process(COMMAND ${utilities}/${name} RESULT_VARIABLE status)
+if(NOT status EQUAL 0)
+  message(FATAL_ERROR "The tool ended with ${status} on ${WORK}.")
+endif()
+
+file(GLOB_RECURSE counts RELATIVE ${COUNTERS} ${COUNTERS}/*.gcda)
+set(digests "")
+foreach(count IN LISTS counts)
+  get_filename_component(folder ${OBJECTS}/${count} DIRECTORY)
+  file(COPY ${COUNTERS}/${count} DESTINATION ${folder})
+  file(SHA256 ${COUNTERS}/${count} digest)
+  string(APPEND digests "${digest} ${count}\n")
+endforeach()
+if(NOT counts)
+  message(FATAL_ERROR "The tool left no counts in ${COUNTERS}.")
+endif()
+file(CONFIGURE OUTPUT ${STAMP} CONTENT "${digests}" @ONLY)
