@@ -9,13 +9,13 @@ namespace {
 
 using qn::dsc::String;
 
-void HasVariables(benchmark::State& state) {
+void FindVariable(benchmark::State& state) {
     const String text(u"help/lines/digital.html");
     for (auto round : state) {
-        benchmark::DoNotOptimize(zkhw::HasVariables(text));
+        benchmark::DoNotOptimize(zkhw::FindVariable(text));
     }
 }
-BENCHMARK(HasVariables);
+BENCHMARK(FindVariable);
 
 void ExpandInstance(benchmark::State& state) {
     const String text(u"#{name} of port 17, line #{i}");

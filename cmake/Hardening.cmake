@@ -11,7 +11,8 @@ if(NOT ZKFPGA_SANITIZE AND NOT WIN32 AND NOT CMAKE_BUILD_TYPE STREQUAL "Debug")
   # the C library that is told to write beyond what the compiler knows to be there.
   target_compile_options(zkfpga_options INTERFACE
     -fstack-protector-strong -U_FORTIFY_SOURCE -D_FORTIFY_SOURCE=2)
-  # The addresses of other libraries' functions are all found at the start and can't be written from then on; no stack
-  # is code.
+  # The addresses of other libraries' functions are all found at the start, so a call needs no stub to find one, and
+  # can't be written from then on; no stack is code.
+  target_compile_options(zkfpga_options INTERFACE -fno-plt)
   target_link_options(zkfpga_options INTERFACE LINKER:-z,relro LINKER:-z,now LINKER:-z,noexecstack)
 endif()

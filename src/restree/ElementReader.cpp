@@ -236,8 +236,8 @@ String ElementReader::ReadValueText(bool isPath) {
 }
 
 void ElementReader::MakeOrdinaryValue(String&& text, bool isReferenceList) {
-    if (HasVariables(text)) {
-        text = ExpandVariables(text, CollectParameters(stack));
+    if (const uint32_t open = FindVariable(text); open != String::npos) {
+        text = ExpandVariables(text, CollectParameters(stack), open);
     }
     if (isReferenceList) {
         // The node's path is only wanted for pieces that begin with a slash.

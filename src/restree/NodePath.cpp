@@ -90,15 +90,17 @@ void AppendRelativePath(TextBuilder& result, std::u16string_view target, std::u1
 // of the result needs them for. `base` may have them, but none of it gets into the result.
 String RebasePlainList(std::u16string_view list, std::u16string_view base) {
     TextBuilder result;
-    PieceReader pieces(list, u",", true);
-    for (bool isFirst = true; pieces.Next(); isFirst = false) {
-        if (!isFirst) {
+    size_t end = 0;
+    for (size_t begin = 0; begin <= list.size() && !list.empty(); begin = end + 1) {
+        end = qn::dsc::FindUnit(list, u',', begin);
+        const std::u16string_view piece = TrimmedPart(list.substr(begin, end - begin));
+        if (begin != 0) {
             result.Append(u',');
         }
-        if (pieces.Raw().starts_with(u'/')) {
-            AppendRelativePath(result, pieces.Raw(), base);
+        if (piece.starts_with(u'/')) {
+            AppendRelativePath(result, piece, base);
         } else {
-            result.Append(pieces.Raw());
+            result.Append(piece);
         }
     }
     return result.Text();

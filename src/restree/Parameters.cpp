@@ -58,18 +58,19 @@ bool InstanceParameters::AppendValue(std::u16string_view name, TextBuilder& text
     return true;
 }
 
-bool HasVariables(const String& text) {
-    return FindOpenMark(text.View(), 0) != text.View().size();
+uint32_t FindVariable(const String& text) {
+    const size_t open = FindOpenMark(text.View(), 0);
+    return open == text.View().size() ? String::npos : static_cast<uint32_t>(open);
 }
 
-String ExpandVariables(const String& text, const Parameters& parameters) {
+String ExpandVariables(const String& text, const Parameters& parameters, uint32_t from) {
     if (parameters.IsEmpty()) {
         return text;
     }
     const std::u16string_view source = text.View();
     TextBuilder result;
     size_t done = 0;
-    size_t open = FindOpenMark(source, 0);
+    size_t open = FindOpenMark(source, from);
     while (open < source.size()) {
         const size_t inside = open + openMark.size();
         const size_t close = FindUnit(source, u'}', inside);
@@ -111,8 +112,8 @@ void ResTreeNode::ApplyParameters(const Parameters& parameters) {
             }
             inner.pop_back();
         } else if (const String* text = entry->Text()) {
-            if (HasVariables(*text)) {
-                level.node->SetEntryText(entry, ExpandVariables(*text, parameters));
+            if (const uint32_t open = FindVariable(*text); open != String::npos) {
+                level.node->SetEntryText(entry, ExpandVariables(*text, parameters, open));
             }
         } else if (ResTreeNode* child = entry->Child()) {
             child->EnsureDeferredLoaded();

@@ -61,10 +61,11 @@ class InstanceParameters : public Parameters {
 };
 
 // `text` with every "#{name}" that has a parameter replaced by its value, in one pass. An unknown one stays, without
-// the blanks inside its braces; a "#{" that isn't closed stays with all that follows.
-String ExpandVariables(const String& text, const Parameters& parameters);
+// the blanks inside its braces; a "#{" that isn't closed stays with all that follows. `from` is what FindVariable gave,
+// for who has it.
+String ExpandVariables(const String& text, const Parameters& parameters, uint32_t from = 0);
 
-// True if there is anything to expand.
-bool HasVariables(const String& text);
+// The offset of the first "#{"; npos if there is nothing to expand.
+uint32_t FindVariable(const String& text);
 
 }  // namespace zkhw

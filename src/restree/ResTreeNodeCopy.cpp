@@ -82,11 +82,12 @@ void ResTreeNode::MergeWalk::Run() {
 
 void ResTreeNode::MergeWalk::MergeText(Level& level, const NodeEntry& entry) {
     const String& text = *entry.Text();
-    if (parameters == nullptr || !HasVariables(text)) {
+    const uint32_t open = parameters == nullptr ? String::npos : FindVariable(text);
+    if (open == String::npos) {
         StoreText(level, entry, String(text));
         return;
     }
-    StoreText(level, entry, ExpandVariables(text, *parameters));
+    StoreText(level, entry, ExpandVariables(text, *parameters, open));
     if (level.target == top) {
         // Nobody hears of nodes that are just being made, but the node that holds the new one may gather its changes.
         top->RaiseTextChange(entry);

@@ -93,15 +93,16 @@ TEST(ExpandVariables, ResultMayHaveAnyLength) {
     }
 }
 
-TEST(HasVariables, TellsAMark) {
-    EXPECT_TRUE(HasVariables(u"#{"));
-    EXPECT_TRUE(HasVariables(u"0123456789#{"));
-    EXPECT_TRUE(HasVariables(u"##{"));
-    EXPECT_FALSE(HasVariables(u""));
-    EXPECT_FALSE(HasVariables(u"#"));
-    EXPECT_FALSE(HasVariables(u"# {"));
-    EXPECT_FALSE(HasVariables(u"{#}"));
-    EXPECT_FALSE(HasVariables(u"0123456789#"));
+TEST(FindVariable, GivesTheFirstMark) {
+    EXPECT_EQ(FindVariable(u"#{"), 0u);
+    EXPECT_EQ(FindVariable(u"0123456789#{"), 10u);
+    EXPECT_EQ(FindVariable(u"##{a}#{b}"), 1u);
+}
+
+TEST(FindVariable, GivesNposWithoutAMark) {
+    for (const char16_t* text : {u"", u"#", u"# {", u"{#}", u"0123456789#"}) {
+        EXPECT_EQ(FindVariable(text), String::npos) << ExactText(String(text));
+    }
 }
 
 TEST(InstanceParameters, AreTheNameAndTheLoopVariable) {
