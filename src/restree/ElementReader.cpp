@@ -188,7 +188,9 @@ ResTreeNode* ElementReader::FindPrototype() {
 ResTreeNode& ElementReader::MakeChild(String&& entryName, String&& elementName, bool isOrdered) {
     ResTreeNode* prototype = FindPrototype();
     ResTreeNode* child = nullptr;
-    node.ReplaceChild(!frame.mergeExisting, std::move(entryName), std::move(elementName), isOrdered, child, Before());
+    const HashedKey hashed(entryName.View());
+    node.ReplaceChild(!frame.mergeExisting, hashed, std::move(entryName), std::move(elementName), isOrdered, child,
+                      Before());
     if (child == nullptr) {
         // An observer has put something else in the place that was just cleared. What follows is read all the same.
         return node;

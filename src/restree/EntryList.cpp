@@ -221,8 +221,8 @@ void EntryList::GrowArray(uint32_t size) {
 
 void EntryList::InsertInArray(uint32_t slot, NodeEntry* entry) {
     if (count == capacity) {
-        // Most nodes have fewer than eight entries.
-        GrowArray(capacity + (capacity < 8 ? 2U : capacity < 16 ? 4U : 8U));
+        // Most nodes have fewer than eight entries. Copies know their size beforehand (Reserve).
+        GrowArray(capacity + (capacity < 16 ? 4U : 8U));
     }
     std::copy_backward(items + slot, items + count, items + count + 1);
     items[slot] = entry;

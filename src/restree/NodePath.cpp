@@ -50,6 +50,19 @@ void AppendComponents(TextBuilder& result, PieceReader& reader, bool isFirst) {
     }
 }
 
+// How many components follow that of `reader`.
+size_t CountFurther(PieceReader& reader) {
+    const std::u16string_view rest = reader.RawToTheEnd();
+    if (!HasBackslash(rest)) {
+        return static_cast<size_t>(std::count(rest.begin(), rest.end(), u'/'));
+    }
+    size_t count = 0;
+    while (reader.Next()) {
+        ++count;
+    }
+    return count;
+}
+
 // The length of the components that both paths begin with, unit by unit alike and without escapes, with the separator
 // behind them. Something is left of both.
 size_t SharedLength(std::u16string_view a, std::u16string_view b) {
@@ -77,7 +90,7 @@ void AppendRelativePath(TextBuilder& result, std::u16string_view target, std::u1
     }
     if (hasBase) {
         result.Append(u"..");
-        while (baseReader.Next()) {
+        for (size_t count = CountFurther(baseReader); count > 0; --count) {
             result.Append(u"/..");
         }
     }

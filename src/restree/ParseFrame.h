@@ -17,8 +17,11 @@ namespace zkhw {
 
 struct ParseFrame {
     void ForgetInstances() {
-        instances.clear();
-        loopVariables.clear();
+        // Called twice for each element, and hardly any has some.
+        if (!instances.empty()) {
+            instances.clear();
+            loopVariables.clear();
+        }
     }
 
     std::unique_ptr<ParseFrame> previous;  // The frame below; null for the bottom frame.

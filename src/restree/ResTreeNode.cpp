@@ -243,9 +243,8 @@ ResTreeNode::Added ResTreeNode::MakeChildAt(EntryPosition position, HashedKey ha
 }
 
 // RemoveIfMismatched and AddChildEntry in one, with one search where one is enough.
-ResTreeNode::Added ResTreeNode::ReplaceChild(bool unconditional, String&& key, String&& childType, bool childOrdered,
-                                             ResTreeNode*& child, const String* before) {
-    const HashedKey hashed(key.View());
+ResTreeNode::Added ResTreeNode::ReplaceChild(bool unconditional, HashedKey hashed, String&& key, String&& childType,
+                                             bool childOrdered, ResTreeNode*& child, const String* before) {
     if (unconditional || IsOrdered() || before != nullptr) {
         RemoveIfMismatched(unconditional, hashed, childType.View(), childOrdered);
     } else {

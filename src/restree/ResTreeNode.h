@@ -360,8 +360,8 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     Added AddText(String&& key, String&& text, EntryKind kind, uint32_t change, const String* before);
     Added AddChildAt(EntryPosition position, HashedKey hashed, String&& key, String&& childType, bool childOrdered,
                      ResTreeNode*& child);
-    Added ReplaceChild(bool unconditional, String&& key, String&& childType, bool childOrdered, ResTreeNode*& child,
-                       const String* before);
+    Added ReplaceChild(bool unconditional, HashedKey hashed, String&& key, String&& childType, bool childOrdered,
+                       ResTreeNode*& child, const String* before);
     Added MakeChildAt(EntryPosition position, HashedKey hashed, String&& key, String&& childType, bool childOrdered,
                       ResTreeNode*& child);
     static bool IsChildOfKind(const NodeEntry& entry, std::u16string_view entryType, bool entryOrdered);

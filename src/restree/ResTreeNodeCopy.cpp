@@ -169,10 +169,13 @@ ResTreeNode* ResTreeNode::PrepareClone(EntryPosition position, HashedKey key, Re
         }
     }
     ResTreeNode* child = nullptr;
+    String name(key.text);
     String childType(source.type);
+    const HashedKey hashed(name.View(), key.hash);
     entry = IsOrdered()
-                ? AddChildAt(position, key, String(key.text), std::move(childType), source.IsOrdered(), child).entry
-                : ReplaceChild(!overwrite, String(key.text), std::move(childType), source.IsOrdered(), child, nullptr)
+                ? AddChildAt(position, hashed, std::move(name), std::move(childType), source.IsOrdered(), child).entry
+                : ReplaceChild(!overwrite, hashed, std::move(name), std::move(childType), source.IsOrdered(), child,
+                               nullptr)
                       .entry;
     return StillHolds(entry) ? child : nullptr;
 }
