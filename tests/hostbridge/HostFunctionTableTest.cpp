@@ -113,14 +113,16 @@ TEST(HostFunctionTable, BoundRowIsFatalOnceTheRuntimeHasGone) {
 
 TEST(HostFunctionTable, RowIsBoundAnewWhenAnotherModuleAnswers) {
     EXPECT_IN_CHILD([] {
-        void* module = LoadModule(STAND_IN_RUNTIME);
-        HostFunctionRecord record{nullptr, nullptr, "malloc"};
-        runtimeModule = GetMainModule();
+        void* const first = LoadModule(UNNAMED_RUNTIME);
+        void* const second = LoadModule(STAND_IN_RUNTIME);
+        HostFunctionRecord record{nullptr, nullptr, "HostNewHandleClear"};
+        runtimeModule = first;
         ResolveHostFunction(record);
-        const bool wasMain = record.module == runtimeModule && record.function != nullptr;
-        runtimeModule = module;
+        const auto* const functionOfFirst = record.function;
+        const bool wasFirst = record.module == first && functionOfFirst != nullptr;
+        runtimeModule = second;
         ResolveHostFunction(record);
-        return wasMain && record.module == module && record.function != nullptr;
+        return wasFirst && record.module == second && record.function != nullptr && record.function != functionOfFirst;
     });
 }
 

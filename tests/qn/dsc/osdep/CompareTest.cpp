@@ -100,7 +100,8 @@ TEST(Compare, DigitsAreNotNumbers) {
         u"9");
 }
 
-TEST(Compare, OtherControlCharactersDoNotCount) {
+// Windows has an order of its own outside printable ASCII: docs/platforms.md lists where it differs.
+TEST(Compare, OtherControlCharactersDoNotCountAsOnlyLinuxOrdersSo) {
     for (char16_t unit = 0; unit <= 0x7F; ++unit) {
         const bool isIgnored = (unit < 0x20 && (unit < 9 || unit > 13)) || unit == 0x7F;
         if (isIgnored) {
@@ -190,7 +191,7 @@ TEST(Compare, AccentBehindADifferenceDoesNotChangeIt) {
     ExpectLess(u"a-\u0308", u"b");
 }
 
-TEST(Compare, FullWidthFormsEqualTheirAscii) {
+TEST(Compare, FullWidthFormsEqualTheirAsciiAsOnlyLinuxOrdersSo) {
     ExpectEqual(u"\uff21\uff42\uff11", u"Ab1");
 }
 
@@ -204,7 +205,7 @@ TEST(Compare, CapitalIIsSmallIAndNotDotless) {
     ExpectLess(u"i", u"\u0131");
 }
 
-TEST(Compare, ScriptsFollowLatin) {
+TEST(Compare, ScriptsFollowLatinAsOnlyLinuxOrdersSo) {
     ExpectAscending({u"z", u"\u03b1", u"\u0430", u"\u05d0", u"\u0e01", u"\u3042", u"\u4e00"});
 }
 

@@ -75,13 +75,14 @@ TEST(WinError, MapsEveryOtherNumberTo42) {
     }
 }
 
-TEST(WinError, HasTheMessageWithoutStopAndLineBreak) {
+// Wine words the errors of the system in its own way.
+TEST(WinError, HasTheMessageWithoutStopAndLineBreakAsOnlyLinuxHasTheseWords) {
     const WinError failure = WinErrorOf(2);
     EXPECT_STREQ(failure.what(), "The system cannot find the file specified");
     EXPECT_EQ(failure.GetErrorCode(), 7);
 }
 
-TEST(WinError, HasTheSystemsTexts) {
+TEST(WinError, HasTheSystemsTextsAsOnlyLinuxHasTheseWords) {
     EXPECT_STREQ(WinErrorOf(0).what(), "The operation completed successfully");
     EXPECT_STREQ(WinErrorOf(3).what(), "The system cannot find the path specified");
     EXPECT_STREQ(WinErrorOf(5).what(), "Access is denied");
@@ -182,7 +183,7 @@ TEST(PosixError, CopyKeepsTheMessage) {
     EXPECT_EQ(copy.GetSystemError(), static_cast<uint32_t>(EACCES));
 }
 
-TEST(SystemError, MessageEndsInStopAndLineBreak) {
+TEST(SystemError, MessageEndsInStopAndLineBreakAsOnlyLinuxHasTheseWords) {
     NarrowString text;
     ASSERT_TRUE(GetSystemMessage(2, text));
     EXPECT_STREQ(text.CStr(), "The system cannot find the file specified.\r\n");
