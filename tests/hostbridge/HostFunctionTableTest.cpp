@@ -9,7 +9,6 @@ namespace zkhw {
 namespace {
 
 using qn::dsc::osdep::FindExport;
-using qn::dsc::osdep::GetMainModule;
 
 constexpr const char* names[] = {
     "HostSetHandleSizeClear",
@@ -118,7 +117,7 @@ TEST(HostFunctionTable, RowIsBoundAnewWhenAnotherModuleAnswers) {
         HostFunctionRecord record{nullptr, nullptr, "HostNewHandleClear"};
         runtimeModule = first;
         ResolveHostFunction(record);
-        const auto* const functionOfFirst = record.function;
+        const qn::dsc::osdep::CodePointer functionOfFirst = record.function;
         const bool wasFirst = record.module == first && functionOfFirst != nullptr;
         runtimeModule = second;
         ResolveHostFunction(record);

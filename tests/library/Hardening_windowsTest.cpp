@@ -29,8 +29,8 @@ class ShippedFile : public testing::TestWithParam<const char*> {
         headers = At<IMAGE_NT_HEADERS64>(start);
         ASSERT_EQ(headers.Signature, static_cast<DWORD>(IMAGE_NT_SIGNATURE));
         ASSERT_EQ(headers.OptionalHeader.Magic, IMAGE_NT_OPTIONAL_HDR64_MAGIC);
-        const size_t table = start + offsetof(IMAGE_NT_HEADERS64, OptionalHeader) +
-                             headers.FileHeader.SizeOfOptionalHeader;
+        const size_t table =
+            start + offsetof(IMAGE_NT_HEADERS64, OptionalHeader) + headers.FileHeader.SizeOfOptionalHeader;
         for (size_t i = 0; i < headers.FileHeader.NumberOfSections; ++i) {
             sections.push_back(At<IMAGE_SECTION_HEADER>(table + i * sizeof(IMAGE_SECTION_HEADER)));
         }
@@ -46,9 +46,7 @@ class ShippedFile : public testing::TestWithParam<const char*> {
         return value;
     }
 
-    bool Allows(WORD characteristic) const {
-        return (headers.OptionalHeader.DllCharacteristics & characteristic) != 0;
-    }
+    bool Allows(WORD characteristic) const { return (headers.OptionalHeader.DllCharacteristics & characteristic) != 0; }
     bool HasCharacteristic(WORD characteristic) const {
         return (headers.FileHeader.Characteristics & characteristic) != 0;
     }

@@ -221,8 +221,8 @@ TEST_F(LoadResourceFile, ThatCannotBeOpenedLeavesTheTreeAlone) {
     folder.MakeFolder("sub");
     Write("secret.xml", "<A/>");
     files.FailOnPath(FileCall::OpenText, folder.System(u"secret.xml"), EACCES);
-    ExpectThatNoneLoads({u"missing.xml", u"sub", u"sub\\", u"secret.xml", u"secret.xml\\", u"secret.xml\\x",
-                         u"no\\such\\folder.xml"});
+    ExpectThatNoneLoads(
+        {u"missing.xml", u"sub", u"sub\\", u"secret.xml", u"secret.xml\\", u"secret.xml\\x", u"no\\such\\folder.xml"});
 }
 
 // Windows has no pipes in folders, and Wine doesn't show links that lead nowhere or in a circle.

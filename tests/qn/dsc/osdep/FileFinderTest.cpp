@@ -67,8 +67,8 @@ TEST(FileFinder, OrdersOtherAlphabetsByTheirUpperCaseToo) {
     // e acute, E acute and o slashed, a pair, a Chinese character, U+E000 and U+FF21.
     WriteFiles(folder, {"\xC3\xA9", "\xC3\x89z", "\xC3\xB8", "\xF0\x9F\x98\x80", "\xE6\x97\xA5", "\xEE\x80\x80",
                         "\xEF\xBC\xA1", "z"});
-    EXPECT_EQ(Found(folder, u"*"), (Names{".", "..", "z", "{00E9}", "{00C9}z", "{00F8}", "{65E5}", "{D83D}{DE00}",
-                                          "{E000}", "{FF21}"}));
+    EXPECT_EQ(Found(folder, u"*"),
+              (Names{".", "..", "z", "{00E9}", "{00C9}z", "{00F8}", "{65E5}", "{D83D}{DE00}", "{E000}", "{FF21}"}));
 }
 
 // Names are UTF-16 on Windows, and may not hold every sign.
@@ -76,8 +76,7 @@ TEST(FileFinder, OrdersBytesOutsideUtf8ByTheirUnitsAsOnlyLinuxNamesAreBytes) {
     const TemporaryFolder folder;
     // A byte outside UTF-8, a pair, U+E000, and U+FF21 beside U+FF41, which differ in letter case.
     WriteFiles(folder, {"\xFF", "\xF0\x9F\x98\x80", "\xEE\x80\x80", "\xEF\xBC\xA1", "\xEF\xBD\x81", "z"});
-    EXPECT_EQ(Found(folder, u"*"),
-              (Names{".", "..", "z", "{D83D}{DE00}", "{DCFF}", "{E000}", "{FF21}", "{FF41}"}));
+    EXPECT_EQ(Found(folder, u"*"), (Names{".", "..", "z", "{D83D}{DE00}", "{DCFF}", "{E000}", "{FF21}", "{FF41}"}));
 }
 
 TEST(FileFinder, PatternsAreBlindToLetterCase) {
@@ -277,7 +276,8 @@ TEST(FileFinder, ListsAFolderOfManyFilesInOrder) {
     ExpectManyNamesInOrder(folder);
 }
 
-// Wine doesn't show links that lead nowhere. Such a name stands as written: to ask for it must not read the folder again.
+// Wine doesn't show links that lead nowhere. Such a name stands as written: to ask for it must not read the folder
+// again.
 TEST(FileFinder, ListsAFolderOfManyLinksInOrderAsOnlyLinuxHasDanglingLinks) {
     const TemporaryFolder folder;
     for (int i = 0; i < manyNames; ++i) {
