@@ -329,7 +329,7 @@ TEST_F(FindResourceFilesIn, EachFolderIsListedOnce) {
 
 TEST_F(FindResourceFilesIn, DeepFoldersTakeNoStack) {
     std::string deepest = "d";
-    for (int i = 0; i < 900; ++i) {
+    for (uint32_t i = 0; i < qn::dsc::osdep::FoldersBeyondTheSmallStack(900); ++i) {
         deepest += "/d";
     }
     folder.WriteFile(deepest + "/deep_resource.xml", "");

@@ -307,14 +307,15 @@ TEST(CopyDirectoryTree, NoFailureLeavesAnythingOpen) {
     }
 }
 
-TEST(CopyDirectoryTree, CopiesTwoThousandNestedFoldersOnASmallStack) {
+TEST(CopyDirectoryTree, CopiesNestedFoldersOnASmallStack) {
     const TemporaryFolder folder;
     folder.MakeFolder("a");
     folder.MakeFolder("b");
-    folder.MakeNestedFolders("d", 2000);
+    const uint32_t depth = FoldersBeyondTheSmallStack(2000);
+    folder.MakeNestedFolders("d", depth);
     RunOnSmallStack([&folder] { EXPECT_NO_THROW(CopyDirectoryTree(folder.System(u"d"), folder.System(u"b\\"))); });
     String deepest = folder.System(u"b");
-    for (int i = 0; i < 1999; ++i) {
+    for (uint32_t i = 1; i < depth; ++i) {
         deepest.Append(u"\\d");
     }
     EXPECT_TRUE(IsDirectory(deepest));
