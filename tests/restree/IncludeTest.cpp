@@ -466,6 +466,18 @@ TEST_F(Include, CopyOfAFileIsAnother) {
     EXPECT_EQ(LoadFile(*loaded, u"one.xml"), "\nOne:One\n  One:One\n    V=1\n");
 }
 
+TEST_F(Include, AsksForTheIdentityOfEachFileTwiceHoweverDeep) {
+    constexpr int levels = 10;
+    for (int i = 0; i < levels; ++i) {
+        Write("f" + std::to_string(i) + ".xml", "<F><:Include>f" + std::to_string(i + 1) + ".xml</:Include></F>");
+    }
+    Write("f10.xml", "<F><V>reached</V></F>");
+    auto loaded = MakeUnnamedRoot();
+    EXPECT_EQ(loaded->LoadResourceFile(PathOf(u"f0.xml"), false, nullptr), 0);
+    // Once for each of the ten as what is to be included, once for each that includes.
+    EXPECT_EQ(files.Count(FileCall::ReadIdentity), 20u);
+}
+
 // File n includes file n + 1; the last one holds a value.
 TEST_F(Include, NestsTwoHundredAndFiftySixLevelsDeep) {
     for (const int levels : {255, 256, 257, 300}) {
