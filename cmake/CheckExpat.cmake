@@ -14,25 +14,34 @@ function(zkfpga_is_expat_old version package result)
   set(${result} ${isOld} PARENT_SCOPE)
 endfunction()
 
-# The version of the package that libexpat's library comes from, where Debian's tools know it.
-function(zkfpga_find_expat_package result)
+# The version of the package that `library` comes from: what stands beside it in libexpat.version (scripts/setup-windows
+# writes that), otherwise that of the machine's own libexpat, where Debian's tools know it.
+function(zkfpga_find_expat_package library result)
   set(${result} "" PARENT_SCOPE)
+  get_filename_component(folder "${library}" DIRECTORY)
   find_program(ZKFPGA_DPKG_QUERY dpkg-query)
   mark_as_advanced(ZKFPGA_DPKG_QUERY)
-  if(ZKFPGA_DPKG_QUERY AND NOT CMAKE_CROSSCOMPILING)
+  if(EXISTS "${folder}/libexpat.version")
+    file(STRINGS "${folder}/libexpat.version" package LIMIT_COUNT 1)
+    set(${result} "${package}" PARENT_SCOPE)
+  elseif(ZKFPGA_DPKG_QUERY AND NOT CMAKE_CROSSCOMPILING)
     execute_process(COMMAND ${ZKFPGA_DPKG_QUERY} --show "--showformat=\${Version}" libexpat1
       OUTPUT_VARIABLE package ERROR_QUIET RESULT_VARIABLE status)
     if(status EQUAL 0)
-      set(${result} ${package} PARENT_SCOPE)
+      set(${result} "${package}" PARENT_SCOPE)
     endif()
   endif()
 endfunction()
 
-function(zkfpga_warn_of_old_expat version)
-  zkfpga_find_expat_package(package)
+function(zkfpga_warn_of_old_expat version library)
+  zkfpga_find_expat_package("${library}" package)
   zkfpga_is_expat_old("${version}" "${package}" isOld)
   if(isOld)
-    message(WARNING "libexpat ${version} (${package}) has known faults that a resource file can reach: "
+    set(origin "")
+    if(package)
+      set(origin ", as package ${package},")
+    endif()
+    message(WARNING "libexpat ${version}${origin} has known faults that a resource file can reach: "
       "take 2.5.0-1+deb12u5 or later on Debian 12, 2.8.4 or later elsewhere.")
   endif()
 endfunction()

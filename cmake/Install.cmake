@@ -21,5 +21,11 @@ install(DIRECTORY examples/host/ DESTINATION ${CMAKE_INSTALL_DOCDIR}/examples)
 # The folder of zkfpga.pc may lie at any depth: lib, lib64, lib/x86_64-linux-gnu.
 file(RELATIVE_PATH pc_to_prefix ${CMAKE_INSTALL_FULL_LIBDIR}/pkgconfig ${CMAKE_INSTALL_PREFIX})
 file(RELATIVE_PATH pc_to_include ${CMAKE_INSTALL_FULL_LIBDIR}/pkgconfig ${CMAKE_INSTALL_FULL_INCLUDEDIR})
+# On Windows what a host calls for strings, memory and ids is the system's; and the library is named as a file, so that
+# it is found by a linker that was told -static, too.
+set(pc_libraries "-L\${libdir} -lzkfpgarestree")
+if(WIN32)
+  set(pc_libraries "\${libdir}/libzkfpgarestree.dll.a -lole32 -loleaut32 -luuid")
+endif()
 configure_file(cmake/zkfpga.pc.in ${CMAKE_BINARY_DIR}/zkfpga.pc @ONLY)
 install(FILES ${CMAKE_BINARY_DIR}/zkfpga.pc DESTINATION ${CMAKE_INSTALL_LIBDIR}/pkgconfig)

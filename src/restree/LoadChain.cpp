@@ -29,7 +29,13 @@ LoadChain::Identity LoadChain::IdentityOf(const NarrowString& path) {
 }
 
 bool LoadChain::IsReading(const Identity& file) const {
-    return path != nullptr && file.has_value() && IdentityOf(*path) == file;
+    if (path == nullptr || !file.has_value()) {
+        return false;
+    }
+    if (!ownIdentity.has_value()) {
+        ownIdentity = IdentityOf(*path);
+    }
+    return ownIdentity == file;
 }
 
 bool LoadChain::IsIncludeRefused(const NarrowString& included) const {

@@ -39,6 +39,8 @@ class LoadChain {
     const LoadChain* includer;
     const LoadChain* outer;  // The next load out on this thread, also where that one didn't ask by an ":Include".
     uint32_t depth;
+    // That of `path`, from the first question on: every include asks all loads further out.
+    mutable Identity ownIdentity;
 };
 
 }  // namespace zkhw

@@ -23,3 +23,12 @@ expect(2.5.0 2.5.0-1 ON)
 expect(2.7.1 2.7.1-2 ON)
 expect(2.8.4 2.8.4-1 OFF)
 expect(2.8.4 2.8.4-1+b1 OFF)
+
+# What stands beside a library that was built from a package goes before what the machine has.
+set(folder ${CMAKE_CURRENT_BINARY_DIR}/expat-beside-its-version)
+file(WRITE ${folder}/libexpat.version "2.5.0-1+deb12u3\n")
+zkfpga_find_expat_package(${folder}/libexpat.a package)
+if(NOT package STREQUAL "2.5.0-1+deb12u3")
+  message(SEND_ERROR "the package of a library that was built from one is ${package}")
+endif()
+file(REMOVE_RECURSE ${folder})

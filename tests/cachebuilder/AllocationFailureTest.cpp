@@ -103,26 +103,31 @@ TEST(ToolOutOfMemory, GivesOutOfMemoryWhenTheRootCannotBeAllocated) {
     EXPECT_EQ(found, 1U);
 }
 
-// Folders, a link to one of them, and one that is met after deep ones.
-void FillForAWalk(const qn::dsc::osdep::TemporaryFolder& folder) {
+// Folders, a link to one of them, and one that is met after as many nested ones.
+void FillForAWalk(const qn::dsc::osdep::TemporaryFolder& folder, uint32_t nested) {
     folder.WriteFile("0_resource.xml", "");
     folder.WriteFile("a/a_resource.xml", "");
     folder.WriteFile("a/in/d_resource.xml", "");
     folder.WriteFile("b/b_resource.xml", "");
     folder.MakeLink("../b", "a/to");
-    folder.MakeNestedFolders(std::string(120, 'c'), 40);
+    folder.MakeNestedFolders(std::string(120, 'c'), nested);
     folder.WriteFile("d/d_resource.xml", "");
 }
 
-TEST(WalkOutOfMemory, NeverThrowsKeepsWhatWasFoundAndLeavesNothingOpen) {
+// More than fit into a path that a call of Linux takes.
+constexpr uint32_t deepWalk = 40;
+constexpr uint32_t shallowWalk = 2;
+
+// `openDescriptors` counts what the process has open.
+void FailEachAllocationOfAWalk(uint32_t nested, std::ptrdiff_t (*openDescriptors)()) {
     const qn::dsc::osdep::TemporaryFolder folder;
-    FillForAWalk(folder);
+    FillForAWalk(folder, nested);
     const qn::dsc::String directory = folder.System();
     const qn::dsc::String pattern(u"*resource.xml");
     std::vector<qn::dsc::String> all;
     FindResourceFiles(directory, pattern, all);
     ASSERT_EQ(all.size(), 6U);
-    const std::ptrdiff_t openBefore = OpenDescriptors();
+    const std::ptrdiff_t openBefore = openDescriptors();
     for (const bool fromThenOn : {false, true}) {
         bool wasReached = true;
         for (uint64_t nth = 1; wasReached; ++nth) {
@@ -139,14 +144,23 @@ TEST(WalkOutOfMemory, NeverThrowsKeepsWhatWasFoundAndLeavesNothingOpen) {
                 ++next;
             }
             EXPECT_TRUE(wasReached || found.size() == all.size());
-            ASSERT_EQ(OpenDescriptors(), openBefore) << "allocation " << nth;
+            ASSERT_EQ(openDescriptors(), openBefore) << "allocation " << nth;
         }
     }
 }
 
-TEST(WalkOutOfMemory, TheTestForNewerFilesNeverThrows) {
+TEST(WalkOutOfMemory, NeverThrowsAndKeepsWhatWasFound) {
+    FailEachAllocationOfAWalk(shallowWalk, [] { return std::ptrdiff_t{0}; });
+}
+
+// The system below Wine takes no path of more than 4,095 bytes, and Windows has no list of open descriptors.
+TEST(WalkOutOfMemory, LeavesNothingOpenHoweverDeepAsOnlyLinuxHasThem) {
+    FailEachAllocationOfAWalk(deepWalk, &OpenDescriptors);
+}
+
+void FailEachAllocationOfATestForNewerFiles(uint32_t nested) {
     const qn::dsc::osdep::TemporaryFolder folder;
-    FillForAWalk(folder);
+    FillForAWalk(folder, nested);
     folder.SetFileTime("b/b_resource.xml", 5000000000, 0);
     const qn::dsc::String directory = folder.System();
     const qn::dsc::String pattern(u"*resource.xml");
@@ -161,6 +175,15 @@ TEST(WalkOutOfMemory, TheTestForNewerFilesNeverThrows) {
     }
     // The file is there by two paths, so hardly any failure hides it.
     EXPECT_GT(timesFound, 1U);
+}
+
+TEST(WalkOutOfMemory, TheTestForNewerFilesNeverThrows) {
+    FailEachAllocationOfATestForNewerFiles(shallowWalk);
+}
+
+// The system below Wine takes no path of more than 4,095 bytes.
+TEST(WalkOutOfMemory, TheTestForNewerFilesNeverThrowsHoweverDeepAsOnlyLinuxNestsSoDeep) {
+    FailEachAllocationOfATestForNewerFiles(deepWalk);
 }
 
 }  // namespace

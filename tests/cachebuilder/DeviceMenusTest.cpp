@@ -308,7 +308,8 @@ TEST_F(DeviceMenusDeathTest, LinkOfTheRootIsATrap) {
     EXPECT_EXIT(Install(), qn::dsc::osdep::EndsByTrap, "");
 }
 
-TEST_F(DeviceMenusDeathTest, TargetsBeforeTheTrapAreServedAndThoseBehindItAreNot) {
+// On Windows the child begins anew, with a folder of its own that is gone when it ends.
+TEST_F(DeviceMenusDeathTest, TargetsBeforeTheTrapAreServedAndThoseBehindItAreNotAsOnlyLinuxForks) {
     Load(deviceSpecs);
     AddTarget("A", "virtex5");
     AddTarget("Z", "virtex5");

@@ -193,7 +193,8 @@ TEST_F(FPGAResTreeOf, HostWithoutTargetsIsToldOnceAndGoesOnWithAnEmptyTree) {
 TEST_F(FPGAResTreeOf, HostRuntimeSaysWhereTheTargetsAre) {
     installation.Write("x_resource.xml", "<Target name=\"X\"/>");
     EXPECT_IN_CHILD([&] {
-        LoadStandInRuntime().specialDirectories[28] = installation.Root().Native("Targets");
+        LoadStandInRuntime().specialDirectories[28] =
+            qn::dsc::NarrowString(installation.Root().System(u"Targets")).CStr();
         FPGAResTree owner;
         ResTreeNode* node = nullptr;
         return owner.GetRootNode(node) == 0 && node->FindRaw(u"X") != nullptr;

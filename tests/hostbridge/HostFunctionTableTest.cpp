@@ -9,7 +9,6 @@ namespace zkhw {
 namespace {
 
 using qn::dsc::osdep::FindExport;
-using qn::dsc::osdep::GetMainModule;
 
 constexpr const char* names[] = {
     "HostSetHandleSizeClear",
@@ -113,14 +112,16 @@ TEST(HostFunctionTable, BoundRowIsFatalOnceTheRuntimeHasGone) {
 
 TEST(HostFunctionTable, RowIsBoundAnewWhenAnotherModuleAnswers) {
     EXPECT_IN_CHILD([] {
-        void* module = LoadModule(STAND_IN_RUNTIME);
-        HostFunctionRecord record{nullptr, nullptr, "malloc"};
-        runtimeModule = GetMainModule();
+        void* const first = LoadModule(UNNAMED_RUNTIME);
+        void* const second = LoadModule(STAND_IN_RUNTIME);
+        HostFunctionRecord record{nullptr, nullptr, "HostNewHandleClear"};
+        runtimeModule = first;
         ResolveHostFunction(record);
-        const bool wasMain = record.module == runtimeModule && record.function != nullptr;
-        runtimeModule = module;
+        const qn::dsc::osdep::CodePointer functionOfFirst = record.function;
+        const bool wasFirst = record.module == first && functionOfFirst != nullptr;
+        runtimeModule = second;
         ResolveHostFunction(record);
-        return wasMain && record.module == module && record.function != nullptr;
+        return wasFirst && record.module == second && record.function != nullptr && record.function != functionOfFirst;
     });
 }
 

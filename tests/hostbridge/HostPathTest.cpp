@@ -70,7 +70,15 @@ TEST_F(HostPathTest, RefusalWithoutMemoryForItsWordsIsCaughtAsWell) {
     EXPECT_EQ(TextOf(path), "");
 }
 
-TEST_F(HostPathTest, TextIsGivenInTheFormOfTheSystem) {
+TEST_F(HostPathTest, TextInTheFormOfTheSystemIsGivenAsItIs) {
+    HostPath path{String(u"C:\\opt\\host")};
+    String text(u"before");
+    EXPECT_TRUE(path.GetText(text));
+    EXPECT_EQ(ExactText(text), "C:\\opt\\host");
+}
+
+// On Windows paths are in the system's form from the outset.
+TEST_F(HostPathTest, TextIsGivenInTheFormOfTheSystemAsOnlyLinuxHasNativePaths) {
     HostPath path{String(u"/opt/host")};
     String text(u"before");
     EXPECT_TRUE(path.GetText(text));
@@ -86,10 +94,10 @@ TEST_F(HostPathTest, TextThatTheHostCannotGiveLeavesTheResultAlone) {
 }
 
 TEST_F(HostPathTest, TextMayBeAskedForAgain) {
-    HostPath path{String(u"/one")};
+    HostPath path{String(u"C:\\one")};
     String text;
     path.GetText(text);
-    StoreInHostPath(u"/another", HostPathForm::FileSystem, path.Get());
+    StoreInHostPath(u"C:\\another", HostPathForm::FileSystem, path.Get());
     path.GetText(text);
     EXPECT_EQ(ExactText(text), "C:\\another");
     EXPECT_EQ(host.LiveHandleCount(), 1u);
@@ -159,7 +167,7 @@ using HostSpecialDirectory = HostTest;
 TEST_F(HostSpecialDirectory, EachNumberHasItsCode) {
     const int32_t codes[] = {0, 1, 3, 4, 5, 6, 7, 8, 9, 10, 13, 14, 15, 16, 17, 18, 19, 21, 22, 23, 24, 25, 26, 27, 28};
     for (int32_t code = 0; code <= 30; ++code) {
-        host.specialDirectories[code] = "/directory" + std::to_string(code);
+        host.specialDirectories[code] = "C:\\directory" + std::to_string(code);
     }
     for (uint32_t number = 0; number <= 24; ++number) {
         EXPECT_EQ(ExactText(GetHostSpecialDir(number)), "C:\\directory" + std::to_string(codes[number])) << number;
@@ -174,7 +182,7 @@ TEST_F(HostSpecialDirectory, NumberOutOfTheTableIsEmptyAndTheHostIsNotAsked) {
 }
 
 TEST_F(HostSpecialDirectory, IsAskedForByWayOfAPath) {
-    host.specialDirectories[3] = "/opt";
+    host.specialDirectories[3] = "C:\\opt";
     EXPECT_EQ(ExactText(GetHostSpecialDir(2)), "C:\\opt");
     EXPECT_EQ(TakeCalls(), (Calls{"HostEmptyPath", "HostGetSpecialDir 3", "HostPathToString", "HostDisposeHandle",
                                   "HostDestroyPath"}));
@@ -185,7 +193,7 @@ TEST_F(HostSpecialDirectory, TextOfTheHostMayHaveTheFormOfTheSystem) {
     EXPECT_EQ(ExactText(GetHostSpecialDir(24)), "C:\\host\\Targets");
 }
 
-TEST_F(HostSpecialDirectory, TextOfTheHostMayBeNative) {
+TEST_F(HostSpecialDirectory, TextOfTheHostMayBeNativeAsOnlyLinuxHasNativePaths) {
     host.specialDirectories[28] = "/opt/Z\xC3\xBCrich/Targets/";
     EXPECT_EQ(ExactText(GetHostSpecialDir(24)), "C:\\opt\\Z{00FC}rich\\Targets\\");
 }

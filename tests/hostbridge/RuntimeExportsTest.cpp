@@ -63,7 +63,8 @@ TEST(RuntimeExports, HooksDoNothing) {
     EXPECT_EQ(runtimeTlsIndex, 0xFFFFFFFF);
 }
 
-TEST(RuntimeExports, EachSetterCallsItsHookWithWhatWasSet) {
+// On Windows a call inside a module reaches the module's own function, whatever the host exports.
+TEST(RuntimeExports, EachSetterCallsItsHookWithWhatWasSetAsOnlyLinuxLetsHostsReplaceIt) {
     EXPECT_EQ(RunProgram(HOOK_PROBE, {}, "/").end, "exit 0");
 }
 

@@ -5,15 +5,29 @@ execute_process(COMMAND ${pkg_config} --cflags --libs zkfpga OUTPUT_VARIABLE pac
   COMMAND_ERROR_IS_FATAL ANY)
 separate_arguments(package UNIX_COMMAND ${package})
 
-# The installation isn't where the loader looks by itself.
-set(package ${package} -Wl,-rpath,${prefix}/${libdir})
+if(system STREQUAL "Windows")
+  set(exporting -Wl,--export-all-symbols)
+  set(text_type -DWCHAR=char16_t -D__WCHAR_DEFINED -D__STRALIGN_H_)
+  list(APPEND package ${link_options})
+  set(resources ${programs}/pkg-config/browse/browse.res.o)
+else()
+  set(exporting -rdynamic)
+  set(resources "")
+  set(text_type "")
+  # The installation isn't where the loader looks by itself.
+  list(APPEND package -Wl,-rpath,${prefix}/${libdir})
+endif()
 foreach(program browse reserve)
   file(REMOVE_RECURSE ${programs}/pkg-config/${program})
   file(MAKE_DIRECTORY ${programs}/pkg-config/${program})
 endforeach()
-execute_process(COMMAND ${c_compiler} -std=c99 ${c_options} -rdynamic browse.c runtime.c ${package}
-  -o ${programs}/pkg-config/browse/browse WORKING_DIRECTORY ${prefix}/${docdir}/examples/browse
+if(resources)
+  execute_process(COMMAND ${rc_compiler} browse.rc ${resources}
+    WORKING_DIRECTORY ${prefix}/${docdir}/examples/browse COMMAND_ERROR_IS_FATAL ANY)
+endif()
+execute_process(COMMAND ${c_compiler} -std=c99 ${c_options} ${exporting} browse.c runtime.c ${resources} ${package}
+  -o ${programs}/pkg-config/browse/browse${suffix} WORKING_DIRECTORY ${prefix}/${docdir}/examples/browse
   COMMAND_ERROR_IS_FATAL ANY)
-execute_process(COMMAND ${cxx_compiler} -std=c++20 ${cxx_options} reserve.cpp ${package}
-  -o ${programs}/pkg-config/reserve/reserve WORKING_DIRECTORY ${prefix}/${docdir}/examples/reserve
+execute_process(COMMAND ${cxx_compiler} -std=c++20 ${cxx_options} ${text_type} reserve.cpp ${package}
+  -o ${programs}/pkg-config/reserve/reserve${suffix} WORKING_DIRECTORY ${prefix}/${docdir}/examples/reserve
   COMMAND_ERROR_IS_FATAL ANY)

@@ -22,9 +22,8 @@ void ReplaceAll(std::string& text, const std::string& from, const std::string& t
     }
 }
 
-std::string SystemForm(std::string native) {
-    ReplaceAll(native, "/", "\\");
-    return "C:" + native;
+std::string SystemForm(const qn::dsc::osdep::TemporaryFolder& folder) {
+    return qn::dsc::NarrowString(folder.System()).CStr();
 }
 
 }  // namespace
@@ -42,8 +41,17 @@ std::string ExpectedText(const std::string& name) {
 ExampleHost::ExampleHost(const std::string& program) {
     std::filesystem::copy(ZKFPGA_SOURCE_DIR "/examples/installation", folder.Native(),
                           std::filesystem::copy_options::recursive);
-    host = folder.Native(std::filesystem::path(program).filename().string());
-    std::filesystem::copy_file(program, host);
+    const std::string name = std::filesystem::path(program).filename().string();
+    std::filesystem::copy_file(program, folder.Native(name));
+    host = Root() + HOST_SEPARATOR + name;
+    const std::filesystem::path library = LIBRARY_BESIDE_HOST;
+    if (!library.empty()) {
+        std::filesystem::copy_file(library, folder.Native(library.filename().string()));
+    }
+}
+
+std::string ExampleHost::Root() const {
+    return std::string(HOST_SEPARATOR) == "/" ? folder.Native() : SystemForm(folder);
 }
 
 ProgramResult ExampleHost::Run(const std::vector<std::string>& arguments) const {
@@ -63,7 +71,7 @@ ProgramResult ExampleHost::RunForLeaks(const std::vector<std::string>& arguments
 ProgramResult ExampleHost::RunHere(const std::string& program, const std::vector<std::string>& arguments) const {
     ProgramResult result = RunProgram(program, arguments, "/");
     for (std::string* text : {&result.output, &result.errors}) {
-        ReplaceAll(*text, SystemForm(folder.Native()), "{root}");
+        ReplaceAll(*text, SystemForm(folder), "{root}");
         ReplaceAll(*text, folder.Native(), "{root}");
     }
     return result;

@@ -18,8 +18,11 @@ std::string ExpectedText(const std::string& name);
 
 class ExampleHost {
   public:
-    // `program` is a native path.
+    // `program` is a native path. On Windows the installed library comes beside it, where the system looks for it.
     explicit ExampleHost(const std::string& program);
+
+    // The installation's folder as an argument: a native path on Linux, in the system's form on Windows.
+    std::string Root() const;
 
     // Runs it by its path, in the root of the file system. In what it prints, the installation's folder is shown as
     // "{root}", in either form.

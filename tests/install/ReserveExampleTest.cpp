@@ -15,7 +15,7 @@ using qn::dsc::osdep::ProgramResult;
 // The parameter is the way in which the program was built.
 class BuiltReserveExample : public testing::TestWithParam<const char*> {
   protected:
-    BuiltReserveExample() : host(std::string(HOST_PROGRAMS "/") + GetParam() + "/reserve/reserve") {}
+    BuiltReserveExample() : host(std::string(HOST_PROGRAMS "/") + GetParam() + "/reserve/reserve" PROGRAM_SUFFIX) {}
 
     ExampleHost host;
 };
@@ -56,7 +56,8 @@ TEST_P(BuiltReserveExample, ReportsThatThereIsNoTree) {
     EXPECT_EQ(result.output, "");
 }
 
-TEST(ReserveExample, LeaksNothing) {
+// The checker is one of Linux.
+TEST(ReserveExample, LeaksNothingAsOnlyLinuxHasTheChecker) {
     const ExampleHost host(HOST_PROGRAMS "/cmake/reserve/reserve");
     ExpectSuccess(host.RunForLeaks({}), ExpectedText("reserve_scanned.txt"));
     ExpectSuccess(host.RunForLeaks({}), ExpectedText("reserve_cached.txt"));

@@ -156,7 +156,8 @@ TEST_F(HostProcess, SpecialDirectoryIsAskedForAtTheFirstQueryAndNeverAgain) {
                   "found 00000000 1\n");
 }
 
-TEST_F(HostProcess, RuntimeMayNameAnotherFolderByANativePath) {
+// On Windows paths are in the system's form from the outset.
+TEST_F(HostProcess, RuntimeMayNameAnotherFolderByANativePathAsOnlyLinuxHasNativePaths) {
     installation.Root().WriteFile("Elsewhere/QN/FPGA/x_resource.xml", "<Target name=\"X\"><K>v</K></Target>");
     ExpectAnswers(
         {runtime, "special|" + installation.Root().Native("Elsewhere"), "property|X|K|", "found|Board|Speed|"},

@@ -1,12 +1,13 @@
 /* A host that was made without any header of the library: it knows the names of the functions, the ids of the
  * interfaces, and the number of each operation in its table. It runs beside the folder Targets without a run-time, and
  * its argument is the library's file. Says which slot gave something unexpected; exit status 0 if none did. */
-#include <dlfcn.h>
 #include <stdint.h>
 #include <stdio.h>
 #include <stdlib.h>
 #include <string.h>
 #include <uchar.h>
+
+#include "SlotsHostModule.h"
 
 /* In memory order. */
 static const uint8_t node5[16] = {0xA8, 0xAB, 0x4A, 0x2C, 0x50, 0x45, 0x9D, 0x47,
@@ -224,7 +225,7 @@ static void WalkTree(void* tree) {
 }
 
 static void* Export(void* library, const char* name) {
-    void* const address = dlsym(library, name);
+    void* const address = FindExport(library, name);
     if (address == NULL) {
         printf("no %s\n", name);
         exit(2);
@@ -233,7 +234,7 @@ static void* Export(void* library, const char* name) {
 }
 
 int main(int argc, char** argv) {
-    void* const library = argc == 2 ? dlopen(argv[1], RTLD_NOW) : NULL;
+    void* const library = argc == 2 ? LoadLibraryFile(argv[1]) : NULL;
     if (library == NULL) {
         printf("no library\n");
         return 2;

@@ -59,9 +59,9 @@ def main():
         tool = 'zkfpga_make_resource_cache' + ('.exe' if emulator else '')
         library = glob.glob(os.path.join(prefix, 'bin/zkfpgarestree.dll' if emulator else 'lib*/**/libzkfpgarestree.so'),
                             recursive=True)
-        for path in library + [os.path.join(prefix, 'include/zkfpga/zkfpga.h'),
-                               os.path.join(prefix, 'share/doc/zkfpga/platforms.md')]:
-            if not os.path.exists(path):
+        for path in ['include/zkfpga/zkfpga.h', 'share/doc/zkfpga/platforms.md', 'lib*/**/zkfpgaConfig.cmake',
+                     'lib*/**/zkfpga.pc', 'lib/libzkfpgarestree.dll.a' if emulator else 'lib*/**/libzkfpgarestree.so']:
+            if not glob.glob(os.path.join(prefix, path), recursive=True):
                 sys.exit('not in the package: ' + path)
         if len(library) != 1:
             sys.exit('the package has no library')

@@ -324,8 +324,7 @@ R:R
 }
 
 TEST(ElementNodes, WordsThatAreTrue) {
-    for (const char* word : {"true", "yes", "1", "on", "enable", "TRUE", "Yes", "oN", "ENABLE",
-                             "\xEF\xBC\xB4\xEF\xBC\xB2\xEF\xBC\xB5\xEF\xBC\xA5"}) {
+    for (const char* word : {"true", "yes", "1", "on", "enable", "TRUE", "Yes", "oN", "ENABLE"}) {
         EXPECT_EQ(TreeOf("<R ordered='" + std::string(word) + "'><A/></R>"), "\nR:R ordered\n  A=\n") << word;
     }
 }
@@ -338,11 +337,19 @@ TEST(ElementNodes, EverythingElseIsFalse) {
 }
 
 TEST(ElementNodes, UnitsThatDoNotCountLeaveAWordTrue) {
-    for (const char* word : {"tr&#127;ue", "&#127;1", "enable&#127;"}) {
+    for (const char* word : {"tr&#173;ue", "&#173;1", "enable&#173;"}) {
         EXPECT_EQ(TreeOf("<R ordered='" + std::string(word) + "'><A/></R>"), "\nR:R ordered\n  A=\n") << word;
     }
     for (const char* word : {"tr-ue", "'true", "true-"}) {
         EXPECT_EQ(TreeOf("<R ordered=\"" + std::string(word) + "\"><A/></R>"), "\nR:R\n  A=\n") << word;
+    }
+}
+
+// Windows has an order of its own outside printable ASCII: docs/platforms.md lists where it differs.
+TEST(ElementNodes, DeleteCharactersAndWidthLeaveAWordTrueAsOnlyLinuxOrdersSo) {
+    for (const char* word :
+         {"tr&#127;ue", "&#127;1", "enable&#127;", "\xEF\xBC\xB4\xEF\xBC\xB2\xEF\xBC\xB5\xEF\xBC\xA5"}) {
+        EXPECT_EQ(TreeOf("<R ordered='" + std::string(word) + "'><A/></R>"), "\nR:R ordered\n  A=\n") << word;
     }
 }
 

@@ -42,10 +42,15 @@ TEST(ElementValues, WordForSpaceIsBlindToCase) {
 }
 
 TEST(ElementValues, WordForSpaceIsComparedByTheLanguage) {
-    // A delete character counts for nothing, and the width of a letter neither.
+    // A soft hyphen counts for nothing, any other one counts.
+    EXPECT_EQ(ValueOf("<A xml:space='pre&#173;serve'> x </A>"), "A= x ");
+    EXPECT_EQ(ValueOf("<A xml:space='pre-serve'> x </A>"), "A=x");
+}
+
+// Windows has an order of its own outside printable ASCII: docs/platforms.md lists where it differs.
+TEST(ElementValues, DeleteCharactersAndWidthLeaveTheWordForSpaceAsOnlyLinuxOrdersSo) {
     EXPECT_EQ(ValueOf("<A xml:space='pre&#127;serve'> x </A>"), "A= x ");
     EXPECT_EQ(ValueOf("<A xml:space='\xEF\xBD\x90reserve'> x </A>"), "A= x ");
-    EXPECT_EQ(ValueOf("<A xml:space='pre-serve'> x </A>"), "A=x");
 }
 
 TEST(ElementValues, TextMayHaveAnyLength) {

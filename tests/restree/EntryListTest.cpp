@@ -103,15 +103,25 @@ TEST(EntryList, OrderedListFindsTheFirstOfEqualKeys) {
     EXPECT_EQ(NumberOf(*list.Find(u"foo")), 3u);
 }
 
-TEST(EntryList, FullWidthKeyIsTheSameKey) {
-    // U+FF21 is the full-width A, U+FF42 the full-width b.
+// `key` compares as equal to "ab".
+void ExpectTheSameKeyAsAb(const std::u16string& key) {
     EntryList sorted(false);
     InsertSorted(sorted, u"ab", 1);
-    EXPECT_EQ(NumberOf(*sorted.FindPlace(u"\uFF21\uFF42").entry), 1u);
+    EXPECT_EQ(NumberOf(*sorted.FindPlace(key).entry), 1u);
     EntryList ordered(true);
-    ordered.Insert(EntryList::End(), MakeNumbered(u"\uFF21\uFF42", 2));
+    ordered.Insert(EntryList::End(), MakeNumbered(key, 2));
     ordered.Insert(EntryList::End(), MakeNumbered(u"AB", 3));
     EXPECT_EQ(NumberOf(*ordered.Find(u"ab")), 2u);
+}
+
+TEST(EntryList, KeyWithASoftHyphenIsTheSameKey) {
+    ExpectTheSameKeyAsAb(u"A\u00ADb");
+}
+
+// Windows has an order of its own outside printable ASCII: docs/platforms.md lists where it differs.
+TEST(EntryList, FullWidthKeyIsTheSameKeyAsOnlyLinuxOrdersSo) {
+    // The full-width A and b.
+    ExpectTheSameKeyAsAb(u"\uFF21\uFF42");
 }
 
 TEST(EntryList, MissingKeyIsInsertedInFrontOfTheNextKey) {
@@ -255,7 +265,15 @@ TEST(EntryList, FailedInsertChangesNothing) {
 
 // --- Against a plain model ---
 
-// How the keys below compare: by their letters, blind to case and width, and without control characters.
+// How the keys below may be spelled beside the plain letters in either case.
+struct Spelling {
+    char16_t uncounted;  // Makes no difference, wherever it stands.
+    char16_t wideA;      // The first of 26 letters that are equal to the plain ones; 0 if none are used.
+};
+constexpr Spelling softHyphens{0xAD, 0};
+constexpr Spelling controlsAndWideLetters{1, 0xFF21};
+
+// How those keys compare: by their letters, blind to case and width.
 char16_t Folded(char16_t unit) {
     if (unit >= 0xFF21 && unit <= 0xFF3A) {
         unit = static_cast<char16_t>(unit - 0xFF21 + u'A');
@@ -266,7 +284,7 @@ char16_t Folded(char16_t unit) {
 std::u16string Folded(const std::u16string& key) {
     std::u16string folded;
     for (const char16_t unit : key) {
-        if (unit != 1) {
+        if (unit != softHyphens.uncounted && unit != controlsAndWideLetters.uncounted) {
             folded.push_back(Folded(unit));
         }
     }
@@ -282,16 +300,17 @@ class Random {
     std::mt19937 engine;
 };
 
-// One of `variety` keys in one of its spellings; those outside ASCII come only if `wide`.
-std::u16string RandomKey(Random& random, uint32_t variety, bool wide) {
+// One of `variety` keys in one of its spellings; units outside ASCII come only if `wide`.
+std::u16string RandomKey(Random& random, uint32_t variety, const Spelling& spelling, bool wide) {
     uint32_t number = random.Below(variety);
     std::u16string key;
     while (number != 0) {
         const char16_t letter = static_cast<char16_t>(number % 5);
-        constexpr char16_t bases[] = {u'a', u'A', 0xFF21};
-        key.push_back(static_cast<char16_t>(bases[wide && random.Below(64) == 0 ? 2 : random.Below(2)] + letter));
-        if (random.Below(32) == 0) {
-            key.push_back(1);
+        const bool isWide = wide && spelling.wideA != 0 && random.Below(64) == 0;
+        const char16_t plainA = random.Below(2) == 0 ? u'a' : u'A';
+        key.push_back(static_cast<char16_t>((isWide ? spelling.wideA : plainA) + letter));
+        if ((wide || spelling.uncounted < 0x80) && random.Below(32) == 0) {
+            key.push_back(spelling.uncounted);
         }
         number /= 5;
     }
@@ -305,7 +324,8 @@ class OrderedModel {
         uint32_t number;
     };
 
-    explicit OrderedModel(uint32_t seed) : random(seed), variety(1 + random.Below(60)), hasWideKeys(seed % 2 != 0) {}
+    OrderedModel(uint32_t seed, const Spelling& spelling)
+        : random(seed), variety(1 + random.Below(60)), spelling(spelling), hasWideKeys(seed % 2 != 0) {}
 
     void Run(uint32_t operations) {
         for (uint32_t i = 0; i < operations; ++i) {
@@ -348,7 +368,7 @@ class OrderedModel {
     }
 
     void Insert() {
-        const std::u16string key = RandomKey(random, variety, hasWideKeys);
+        const std::u16string key = RandomKey(random, variety, spelling, hasWideKeys);
         const size_t index = AnyPlace(items.size());
         list.Insert(list.AtIndex(static_cast<uint32_t>(index)), MakeNumbered(key, made));
         items.insert(items.begin() + static_cast<std::ptrdiff_t>(index), {Folded(key), made});
@@ -368,7 +388,7 @@ class OrderedModel {
     }
 
     void Find() {
-        const std::u16string key = RandomKey(random, variety, hasWideKeys);
+        const std::u16string key = RandomKey(random, variety, spelling, hasWideKeys);
         const std::u16string folded = Folded(key);
         const auto expected =
             std::find_if(items.begin(), items.end(), [&](const Item& item) { return item.key == folded; });
@@ -380,7 +400,7 @@ class OrderedModel {
     }
 
     void Assign() {
-        const std::u16string key = RandomKey(random, variety, hasWideKeys);
+        const std::u16string key = RandomKey(random, variety, spelling, hasWideKeys);
         const size_t index = random.Below(static_cast<uint32_t>(items.size()));
         list.AssignKey(list.At(list.AtIndex(static_cast<uint32_t>(index))), String(std::u16string_view(key)));
         items[index].key = Folded(key);
@@ -388,26 +408,36 @@ class OrderedModel {
 
     Random random;
     uint32_t variety;
+    Spelling spelling;
     bool hasWideKeys;
     uint32_t made = 0;
     EntryList list{true};
     std::vector<Item> items;
 };
 
-TEST(EntryList, OrderedListDoesWhatAVectorDoes) {
+void RunOrderedModels(const Spelling& spelling) {
     for (uint32_t seed = 0; seed < 1000; ++seed) {
-        OrderedModel(seed).Run(150);
+        OrderedModel(seed, spelling).Run(150);
         ASSERT_FALSE(testing::Test::HasFatalFailure()) << "seed " << seed;
     }
     for (uint32_t seed = 0; seed < 8; ++seed) {
-        OrderedModel(seed).Run(5000);
+        OrderedModel(seed, spelling).Run(5000);
         ASSERT_FALSE(testing::Test::HasFatalFailure()) << "long run, seed " << seed;
     }
 }
 
+TEST(EntryList, OrderedListDoesWhatAVectorDoes) {
+    RunOrderedModels(softHyphens);
+}
+
+TEST(EntryList, OrderedListDoesWhatAVectorDoesWithWideKeysAsOnlyLinuxOrdersSo) {
+    RunOrderedModels(controlsAndWideLetters);
+}
+
 class SortedModel {
   public:
-    explicit SortedModel(uint32_t seed) : random(seed), variety(1 + random.Below(4000)), hasWideKeys(seed % 2 != 0) {}
+    SortedModel(uint32_t seed, const Spelling& spelling)
+        : random(seed), variety(1 + random.Below(4000)), spelling(spelling), hasWideKeys(seed % 2 != 0) {}
 
     void Run(uint32_t operations) {
         for (uint32_t i = 0; i < operations; ++i) {
@@ -422,7 +452,7 @@ class SortedModel {
 
   private:
     void Step() {
-        const std::u16string key = RandomKey(random, variety, hasWideKeys);
+        const std::u16string key = RandomKey(random, variety, spelling, hasWideKeys);
         const auto item = items.find(Folded(key));
         const bool isThere = item != items.end();
         const EntryList::Place place = list.FindPlace(key);
@@ -444,21 +474,30 @@ class SortedModel {
 
     Random random;
     uint32_t variety;
+    Spelling spelling;
     bool hasWideKeys;
     uint32_t made = 0;
     EntryList list{false};
     std::map<std::u16string, uint32_t> items;
 };
 
-TEST(EntryList, SortedListDoesWhatAMapDoes) {
+void RunSortedModels(const Spelling& spelling) {
     for (uint32_t seed = 0; seed < 1000; ++seed) {
-        SortedModel(seed).Run(150);
+        SortedModel(seed, spelling).Run(150);
         ASSERT_FALSE(testing::Test::HasFatalFailure()) << "seed " << seed;
     }
     for (uint32_t seed = 0; seed < 8; ++seed) {
-        SortedModel(seed).Run(5000);
+        SortedModel(seed, spelling).Run(5000);
         ASSERT_FALSE(testing::Test::HasFatalFailure()) << "long run, seed " << seed;
     }
+}
+
+TEST(EntryList, SortedListDoesWhatAMapDoes) {
+    RunSortedModels(softHyphens);
+}
+
+TEST(EntryList, SortedListDoesWhatAMapDoesWithWideKeysAsOnlyLinuxOrdersSo) {
+    RunSortedModels(controlsAndWideLetters);
 }
 
 // --- Many entries ---
@@ -547,14 +586,23 @@ TEST(EntryList, LongOrderedListTellsKeysApartThatDifferInAMarkAlone) {
     EXPECT_EQ(list.Find(u"-xy"), nullptr);
 }
 
-TEST(EntryList, LongOrderedListFindsAsciiKeysByWideOnesAndTheOtherWayRound) {
+// `ab` and `cd` compare as equal to "ab" and "cd".
+void ExpectToBeFoundInALongOrderedList(const std::u16string& ab, const std::u16string& cd) {
     EntryList list(true);
     FillLong(list);
     list.Insert(EntryList::End(), MakeNumbered(u"ab", 100));
-    EXPECT_EQ(NumberOf(*list.Find(u"\uFF21\uFF42")), 100u);
-    list.Insert(EntryList::End(), MakeNumbered(u"\uFF43d", 101));
+    EXPECT_EQ(NumberOf(*list.Find(ab)), 100u);
+    list.Insert(EntryList::End(), MakeNumbered(cd, 101));
     EXPECT_EQ(NumberOf(*list.Find(u"CD")), 101u);
     EXPECT_EQ(NumberOf(*list.Find(u"AB")), 100u);
+}
+
+TEST(EntryList, LongOrderedListFindsAsciiKeysByOthersAndTheOtherWayRound) {
+    ExpectToBeFoundInALongOrderedList(u"A\u00ADb", u"c\u00ADd");
+}
+
+TEST(EntryList, LongOrderedListFindsAsciiKeysByWideOnesAsOnlyLinuxOrdersSo) {
+    ExpectToBeFoundInALongOrderedList(u"\uFF21\uFF42", u"\uFF43d");
 }
 
 TEST(EntryList, PiecesThatGoFromALongOrderedListLeaveTheOthersFindable) {
@@ -574,19 +622,28 @@ TEST(EntryList, PiecesThatGoFromALongOrderedListLeaveTheOthersFindable) {
     }
 }
 
-TEST(EntryList, PlainAndOtherKeysMixInASortedList) {
+// `a` and `c` compare as equal to "a" and "c".
+void ExpectToMixInASortedList(const std::u16string& a, const std::u16string& c) {
     EntryList list(false);
     InsertSorted(list, u"d", 4);
     InsertSorted(list, u"a", 0);
-    // The full-width c, and a key with a mark, which come into an array that isn't in order yet.
-    InsertSorted(list, u"\uFF23", 3);
+    // It and a key with a mark come into an array that isn't in order yet.
+    InsertSorted(list, c, 3);
     InsertSorted(list, u"b-", 2);
     InsertSorted(list, u"b", 1);
     EXPECT_EQ(NumberOf(*list.Find(u"c")), 3u);
     EXPECT_EQ(NumberOf(*list.FindPlace(u"C").entry), 3u);
-    EXPECT_EQ(NumberOf(*list.Find(u"\uFF41")), 0u);
+    EXPECT_EQ(NumberOf(*list.Find(a)), 0u);
     EXPECT_EQ(list.Find(u"-b"), nullptr);
     EXPECT_EQ(Walk(list), UpTo(5));
+}
+
+TEST(EntryList, PlainAndOtherKeysMixInASortedList) {
+    ExpectToMixInASortedList(u"a\u00AD", u"\u00ADC");
+}
+
+TEST(EntryList, PlainAndWideKeysMixInASortedListAsOnlyLinuxOrdersSo) {
+    ExpectToMixInASortedList(u"\uFF41", u"\uFF23");
 }
 
 TEST(EntryList, SortedListThatGrowsLongIsInOrderAllTheWay) {

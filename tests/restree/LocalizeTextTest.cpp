@@ -10,13 +10,21 @@ namespace {
 using qn::dsc::ExactText;
 using qn::dsc::String;
 
+struct Choice {
+    const char16_t* list;
+    const char* chosen;
+};
+
+void ExpectChoices(const std::vector<Choice>& choices) {
+    for (const Choice& choice : choices) {
+        const String list(choice.list);
+        EXPECT_EQ(ExactText(LocalizeText(list)), choice.chosen + std::string("{0000}") + ExactText(list));
+    }
+}
+
 // Without a host the language is English.
 TEST(LocalizeText, ChoosesATextAndKeepsTheList) {
-    struct Row {
-        const char16_t* list;
-        const char* chosen;
-    };
-    const Row rows[] = {
+    ExpectChoices({
         {u"eng=Clock,jpn=X", "Clock"},
         {u"jpn=X,eng=Clock", "Clock"},
         {u"ENG=Clock", "Clock"},
@@ -35,12 +43,13 @@ TEST(LocalizeText, ChoosesATextAndKeepsTheList) {
         {u"a text of more than eight units,eng=Clock", "Clock"},
         {u",,eng=Clock,,", "Clock"},
         {u"eng=\u540D", "{540D}"},
-        {u"\uFF45\uFF4E\uFF47=Wide", "Wide"},
-    };
-    for (const Row& row : rows) {
-        const String list(row.list);
-        EXPECT_EQ(ExactText(LocalizeText(list)), row.chosen + std::string("{0000}") + ExactText(list));
-    }
+        {u"e\u00ADng=Soft hyphen", "Soft hyphen"},
+    });
+}
+
+// Windows has an order of its own outside printable ASCII: docs/platforms.md lists where it differs.
+TEST(LocalizeText, WidthOfALanguagesNameDoesNotCountAsOnlyLinuxOrdersSo) {
+    ExpectChoices({{u"\uFF45\uFF4E\uFF47=Wide", "Wide"}});
 }
 
 TEST(LocalizeText, GivesTheListAloneIfNoTextFits) {

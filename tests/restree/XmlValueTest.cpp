@@ -24,10 +24,18 @@ R:R
 )");
 }
 
-TEST(XmlValue, WordIsBlindToCaseAndWidth) {
-    ASSERT_TREE("<R><V TYPE='XML'><a/></V><W type='\xEF\xBD\x98\xEF\xBD\x8D\xEF\xBD\x8C'><b/></W></R>", R"(
+TEST(XmlValue, WordIsComparedByTheLanguage) {
+    ASSERT_TREE("<R><V TYPE='XML'><a/></V><W type='x&#173;ml'><b/></W></R>", R"(
 R:R
   V=<a></a>
+  W=<b></b>
+)");
+}
+
+// Windows has an order of its own outside printable ASCII: docs/platforms.md lists where it differs.
+TEST(XmlValue, WidthOfTheWordDoesNotCountAsOnlyLinuxOrdersSo) {
+    ASSERT_TREE("<R><W type='\xEF\xBD\x98\xEF\xBD\x8D\xEF\xBD\x8C'><b/></W></R>", R"(
+R:R
   W=<b></b>
 )");
 }

@@ -1,5 +1,7 @@
 #include <windows.h>
 
+#include <algorithm>
+
 #include <gtest/gtest.h>
 
 #include "support/SmallStack.h"
@@ -25,6 +27,12 @@ void RunOnSmallStack(const std::function<void()>& work) {
     ASSERT_NE(thread, nullptr) << GetLastError();
     ASSERT_EQ(WaitForSingleObject(thread, INFINITE), WAIT_OBJECT_0);
     CloseHandle(thread);
+}
+
+uint32_t FoldersBeyondTheSmallStack(uint32_t wanted) {
+    // Recursion would have what the search finds in every frame. Wine goes through a path name by name at each call, so
+    // that 2,000 folders take many minutes.
+    return std::min(wanted, static_cast<uint32_t>(stackSize / sizeof(WIN32_FIND_DATAW)) + 8);
 }
 
 }  // namespace qn::dsc::osdep

@@ -12,6 +12,9 @@
  *
  * In one line, with zkfpga installed:
  *   cc -std=c99 -rdynamic browse.c runtime.c $(pkg-config --cflags --libs zkfpga) -o browse
+ * For Windows, with the compiler's names of that system:
+ *   windres browse.rc browse.res.o
+ *   cc -std=c99 -Wl,--export-all-symbols browse.c runtime.c browse.res.o $(pkg-config --cflags --libs zkfpga) -o browse
  */
 
 #include <stdio.h>
@@ -181,7 +184,7 @@ static void ShowConversions(ZkStringHandle text) {
     const int same = StringLength(back) == StringLength(text) &&
                      memcmp(StringBytes(back), StringBytes(text), StringLength(text)) == 0;
     printf("  %u bytes, %u units of UTF-16, %s on the way back\n", (unsigned)StringLength(text),
-           (unsigned)(StringLength(wide) / sizeof(char16_t)), same ? "the same" : "another text");
+           (unsigned)(StringLength(wide) / sizeof(WCHAR)), same ? "the same" : "another text");
     HostDisposeHandle(back);
     HostDisposeHandle(wide);
 }
@@ -212,12 +215,18 @@ static int ShowProperty(const char* target, const char* property) {
     return SUCCEEDED(result) && found;
 }
 
+/* The last separator of a path: on Windows that may be a backslash. Null if there is none. */
+static const char* LastSeparator(const char* path) {
+    const char* const slash = strrchr(path, '/');
+    return slash != NULL ? slash : strrchr(path, '\\');
+}
+
 int main(int argc, char** argv) {
     if (argc < 2 || argc > 4) {
         fprintf(stderr, "usage: browse FOLDER [TARGET [PROPERTY]]\n");
         return 2;
     }
-    const char* const programSlash = strrchr(argv[0], '/');
+    const char* const programSlash = LastSeparator(argv[0]);
     char* const ownFolder = CopyBytes(argv[0], programSlash == NULL ? 0 : (size_t)(programSlash - argv[0]));
     SetInstallationFolder(strcmp(argv[1], "-") != 0 ? argv[1] : programSlash == NULL ? "." : ownFolder);
 

@@ -184,17 +184,18 @@ int32_t HostSystemTextToPath(const char* text, ZkPath path) {
 
 /* The one folder that the library asks for. Its text is a native path here. */
 int32_t HostGetSpecialDir(int32_t code, ZkPath path) {
-    static const char below[] = "/Targets";
+    /* With the separator that the folder itself is written with. */
+    const char* const below = strchr(installationFolder, '\\') != NULL ? "\\Targets" : "/Targets";
     if (code != targetsFolder) {
         return wrongArgument;
     }
     const size_t length = strlen(installationFolder);
-    char* const text = malloc(length + sizeof below);
+    char* const text = malloc(length + strlen(below) + 1);
     if (text == NULL) {
         return noMemory;
     }
     memcpy(text, installationFolder, length);
-    memcpy(text + length, below, sizeof below);
+    memcpy(text + length, below, strlen(below) + 1);
     const int32_t error = SetPathText(path, text, strlen(text));
     free(text);
     return error;

@@ -4,6 +4,7 @@
 //
 // In one line, with zkfpga installed:
 //   c++ -std=c++20 reserve.cpp $(pkg-config --cflags --libs zkfpga) -o reserve
+// For Windows also -DWCHAR=char16_t -D__WCHAR_DEFINED -D__STRALIGN_H_: text is char16_t then, as elsewhere.
 
 #include <array>
 #include <cstdio>

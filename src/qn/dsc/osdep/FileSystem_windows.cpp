@@ -101,14 +101,9 @@ int NativeFileSystem::ReadAttributes(const String& path, FileAttributes& attribu
 }
 
 int NativeFileSystem::ReadIdentity(const String& path, FileIdentity& identity) {
-    FileAttributes attributes;
-    const int error = ReadAttributes(path, attributes);
     CallPath call;
-    if (error != 0) {
-        return error;
-    }
-    MakeCallPath(path.View(), call);
-    return ReadCallIdentity(call.text, identity);
+    const int error = MakeCallPath(path.View(), call);
+    return error != 0 ? error : ReadCallIdentity(call, identity);
 }
 
 int NativeFileSystem::BeginSearch(const String& pattern, SearchHandle& search, String& firstName) {

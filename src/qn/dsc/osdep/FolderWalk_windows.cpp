@@ -85,7 +85,7 @@ int NativeFolderWalk::ReadWriteTime(size_t number, uint64_t& time) {
 int NativeFolderWalk::ReadIdentity(size_t level, FileIdentity& identity) {
     CallPath call;
     const int error = MakeCallPath(std::u16string_view(path).substr(0, levels[level].pathLength), call);
-    return error != 0 ? error : ReadCallIdentity(call.text, identity);
+    return error != 0 ? error : ReadCallIdentity(call, identity);
 }
 
 std::u16string NativeFolderWalk::PathOf(size_t number) const {

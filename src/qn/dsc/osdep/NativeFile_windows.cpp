@@ -215,9 +215,12 @@ int ReadCallAttributes(const std::u16string& path, FileAttributes& attributes) {
     return error;
 }
 
-int ReadCallIdentity(const std::u16string& path, FileIdentity& identity) {
+int ReadCallIdentity(const CallPath& call, FileIdentity& identity) {
     BY_HANDLE_FILE_INFORMATION information;
-    const int error = ReadFileInformation(path, information);
+    int error = ReadFileInformation(call.text, information);
+    if (error == 0 && call.endsInSeparator && !IsFolder(information.dwFileAttributes)) {
+        error = ENOTDIR;
+    }
     if (error == 0) {
         identity = {information.dwVolumeSerialNumber,
                     (uint64_t{information.nFileIndexHigh} << 32) | information.nFileIndexLow};

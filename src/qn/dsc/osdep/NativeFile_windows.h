@@ -36,6 +36,6 @@ uint64_t TicksOf(const FILETIME& time);
 // Of a folder or a file; links are followed. 0 or an errno number.
 int ReadFileInformation(const std::u16string& path, BY_HANDLE_FILE_INFORMATION& information);
 int ReadCallAttributes(const std::u16string& path, FileAttributes& attributes);
-int ReadCallIdentity(const std::u16string& path, FileIdentity& identity);
+int ReadCallIdentity(const CallPath& call, FileIdentity& identity);
 
 }  // namespace qn::dsc::osdep

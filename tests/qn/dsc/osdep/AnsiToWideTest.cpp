@@ -74,7 +74,8 @@ TEST(AnsiToWide, DefaultCodePageMakesPairsOfFourBytes) {
     EXPECT_EQ(Wide("\xF0\x90\x80\x80\xF4\x8F\xBF\xBF", ""), u"\xD800\xDC00\xDBFF\xDFFF");
 }
 
-TEST(AnsiToWide, DefaultCodePageKeepsBytesThatAreNoUtf8) {
+// Windows puts its default character in the place of what is no text.
+TEST(AnsiToWide, DefaultCodePageKeepsBytesThatAreNoUtf8AsOnlyLinuxKeepsBytes) {
     struct Row {
         std::string_view bytes;
         std::u16string_view units;
@@ -98,7 +99,7 @@ TEST(AnsiToWide, DefaultCodePageKeepsBytesThatAreNoUtf8) {
     }
 }
 
-TEST(AnsiToWide, DefaultCodePageBringsEverySequenceOfThreeBytesBack) {
+TEST(AnsiToWide, DefaultCodePageBringsEverySequenceOfThreeBytesBackAsOnlyLinuxKeepsBytes) {
     const std::string bytes = "a\x7F\x80\xA0\xBF\xC2\xC3\xDF\xE0\xE2\xED\xEF\xF0\xF4\xFF";
     for (char first : bytes) {
         for (char second : bytes) {

@@ -53,6 +53,22 @@ TEST(FileSystemOfWindows, AFileWithASeparatorBehindItNamesNothing) {
     folder.WriteFile("file", "x");
     EXPECT_NE(AttributesError(folder.System(u"file\\")), 0);
     EXPECT_EQ(AttributesError(folder.System(u"file")), 0);
+    FileIdentity identity;
+    EXPECT_EQ(GetFileSystem().ReadIdentity(folder.System(u"file\\"), identity), ENOTDIR);
+    EXPECT_EQ(GetFileSystem().ReadIdentity(folder.System(u"file"), identity), 0);
+}
+
+TEST(FileSystemOfWindows, AFolderHasOneIdentityWithASeparatorAndWithout) {
+    const TemporaryFolder folder;
+    folder.MakeFolder("a/b");
+    FileIdentity plain;
+    FileIdentity separated;
+    FileIdentity other;
+    ASSERT_EQ(GetFileSystem().ReadIdentity(folder.System(u"a"), plain), 0);
+    ASSERT_EQ(GetFileSystem().ReadIdentity(folder.System(u"A\\"), separated), 0);
+    ASSERT_EQ(GetFileSystem().ReadIdentity(folder.System(u"a\\b"), other), 0);
+    EXPECT_TRUE(plain == separated);
+    EXPECT_FALSE(plain == other);
 }
 
 TEST(FileSystemOfWindows, RelativePathsBeginAtTheWorkingFolder) {

@@ -2,6 +2,7 @@
 
 #include <gtest/gtest.h>
 
+#include <atomic>
 #include <cerrno>
 #include <cstring>
 #include <new>
@@ -75,13 +76,14 @@ TEST(WinError, MapsEveryOtherNumberTo42) {
     }
 }
 
-TEST(WinError, HasTheMessageWithoutStopAndLineBreak) {
+// Wine words the errors of the system in its own way.
+TEST(WinError, HasTheMessageWithoutStopAndLineBreakAsOnlyLinuxHasTheseWords) {
     const WinError failure = WinErrorOf(2);
     EXPECT_STREQ(failure.what(), "The system cannot find the file specified");
     EXPECT_EQ(failure.GetErrorCode(), 7);
 }
 
-TEST(WinError, HasTheSystemsTexts) {
+TEST(WinError, HasTheSystemsTextsAsOnlyLinuxHasTheseWords) {
     EXPECT_STREQ(WinErrorOf(0).what(), "The operation completed successfully");
     EXPECT_STREQ(WinErrorOf(3).what(), "The system cannot find the path specified");
     EXPECT_STREQ(WinErrorOf(5).what(), "Access is denied");
@@ -104,12 +106,34 @@ TEST(WinError, OfANumberWithoutATextIsUnknown) {
 }
 
 TEST(WinError, TakesTheNumberOfItsOwnThread) {
+    // Each waits for the other without a call of the system, which could have a number of its own.
+    std::atomic<int> step = 0;
+    uint32_t numberElsewhere = 1;
+    std::thread other([&] {
+        while (step != 1) {
+        }
+        SetLastSystemError(2);
+        step = 2;
+        while (step != 3) {
+        }
+        numberElsewhere = WinError().GetSystemError();
+    });
+    SetLastSystemError(5);
+    step = 1;
+    while (step != 2) {
+    }
+    const uint32_t numberHere = LastSystemError();
+    step = 3;
+    other.join();
+    EXPECT_EQ(numberHere, 5U);
+    EXPECT_EQ(numberElsewhere, 2U);
+}
+
+// On Windows a thread has made calls of the system before it begins.
+TEST(WinError, ANewThreadHasNoNumberAsOnlyLinuxStartsThreadsSo) {
     SetLastSystemError(5);
     uint32_t numberElsewhere = 1;
-    std::thread([&numberElsewhere] {
-        numberElsewhere = LastSystemError();
-        SetLastSystemError(2);
-    }).join();
+    std::thread([&numberElsewhere] { numberElsewhere = LastSystemError(); }).join();
     EXPECT_EQ(numberElsewhere, 0U);
     EXPECT_EQ(WinError().GetSystemError(), 5U);
 }
@@ -120,7 +144,7 @@ TEST(WinError, CopyKeepsEverything) {
     failure.SetFile("qn/dsc/osdep/path");
     const WinError copy(failure);
     SetLastSystemError(5);
-    EXPECT_STREQ(copy.what(), "The system cannot find the file specified");
+    EXPECT_STREQ(copy.what(), WinErrorOf(2).what());
     EXPECT_EQ(copy.GetSystemError(), 2U);
     EXPECT_EQ(copy.GetLine(), 3);
     EXPECT_STREQ(copy.GetFile(), "qn/dsc/osdep/path");
@@ -183,6 +207,15 @@ TEST(PosixError, CopyKeepsTheMessage) {
 }
 
 TEST(SystemError, MessageEndsInStopAndLineBreak) {
+    NarrowString text;
+    ASSERT_TRUE(GetSystemMessage(2, text));
+    const std::string message = text.CStr();
+    ASSERT_GT(message.size(), 3U);
+    EXPECT_EQ(message.substr(message.size() - 3), ".\r\n");
+    EXPECT_EQ(WinErrorOf(2).what(), message.substr(0, message.size() - 3));
+}
+
+TEST(SystemError, MessageIsASentenceAsOnlyLinuxHasTheseWords) {
     NarrowString text;
     ASSERT_TRUE(GetSystemMessage(2, text));
     EXPECT_STREQ(text.CStr(), "The system cannot find the file specified.\r\n");

@@ -33,12 +33,19 @@ TEST(IsDirectory, AFolderIsOne) {
 TEST(IsDirectory, AnythingElseIsNot) {
     const TemporaryFolder folder;
     folder.WriteFile("file", "");
-    folder.MakePipe("pipe");
-    folder.MakeLink("nowhere", "dangling");
-    for (const char16_t* name : {u"file", u"file\\", u"pipe", u"dangling", u"nope", u"file\\x"}) {
+    for (const char16_t* name : {u"file", u"file\\", u"nope", u"file\\x"}) {
         EXPECT_FALSE(IsDirectory(folder.System(name))) << ExactText(String(name));
     }
     EXPECT_FALSE(IsDirectory(u""));
+}
+
+// Windows has no pipes in folders, and Wine doesn't show links that lead nowhere.
+TEST(IsDirectory, APipeOrADanglingLinkIsNotAsOnlyLinuxHasThem) {
+    const TemporaryFolder folder;
+    folder.MakePipe("pipe");
+    folder.MakeLink("nowhere", "dangling");
+    EXPECT_FALSE(IsDirectory(folder.System(u"pipe")));
+    EXPECT_FALSE(IsDirectory(folder.System(u"dangling")));
 }
 
 TEST(IsDirectory, ARelativePathOfARealFolderIsNot) {
@@ -91,7 +98,8 @@ TEST(IsExistingFile, AFileIsOneAndAFolderIsNot) {
     EXPECT_FALSE(IsExistingFile(u"D:\\file"));
 }
 
-TEST(IsExistingFile, WhatIsNoFolderIsAFile) {
+// Windows has no pipes in folders.
+TEST(IsExistingFile, WhatIsNoFolderIsAFileAsOnlyLinuxHasPipes) {
     const TemporaryFolder folder;
     folder.MakePipe("pipe");
     EXPECT_TRUE(IsExistingFile(folder.System(u"pipe")));
@@ -169,18 +177,28 @@ TEST(GetFileModificationTime, IsZeroIfItCantBeRead) {
 
 TEST(GetCurrentDirectoryPath, IsInTheSystemsForm) {
     const TemporaryFolder folder;
+    folder.MakeFolder("a/Z\xC3\xBCrich");
+    const WorkingFolderScope scope(folder.Native("a/Z\xC3\xBCrich"));
+    EXPECT_EQ(ExactText(GetCurrentDirectoryPath()), ExactText(folder.System(u"a\\Z\u00FCrich")));
+}
+
+// Names are UTF-16 on Windows, and may not hold every sign.
+TEST(GetCurrentDirectoryPath, MayHaveAnyBytesAsOnlyLinuxNamesAreBytes) {
+    const TemporaryFolder folder;
     folder.MakeFolder("a\\b/\xFF");
     const WorkingFolderScope scope(folder.Native("a\\b/\xFF"));
     EXPECT_EQ(ExactText(GetCurrentDirectoryPath()), ExactText(folder.System(u"a\xF05C"
                                                                             u"b\\\xDCFF")));
 }
 
-TEST(GetCurrentDirectoryPath, OfTheRootIsTheDrive) {
+// Each drive has a root on Windows.
+TEST(GetCurrentDirectoryPath, OfTheRootIsTheDriveAsOnlyLinuxHasOneRoot) {
     const WorkingFolderScope scope("/");
     EXPECT_EQ(ExactText(GetCurrentDirectoryPath()), "C:\\");
 }
 
-TEST(GetCurrentDirectoryPath, OfARemovedFolderIsEmpty) {
+// Windows doesn't remove the working folder of a process.
+TEST(GetCurrentDirectoryPath, OfARemovedFolderIsEmptyAsOnlyLinuxRemovesOpenFolders) {
     const TemporaryFolder folder;
     folder.MakeFolder("sub");
     const WorkingFolderScope scope(folder.Native("sub"));
@@ -188,7 +206,8 @@ TEST(GetCurrentDirectoryPath, OfARemovedFolderIsEmpty) {
     EXPECT_EQ(ExactText(GetCurrentDirectoryPath()), "");
 }
 
-TEST(GetCurrentDirectoryPath, MayBeLongerThan260Units) {
+// The call that Windows is asked by gives at most 260 bytes.
+TEST(GetCurrentDirectoryPath, MayBeLongerThan260UnitsAsOnlyLinuxHasNoLimit) {
     const TemporaryFolder folder;
     const std::string deep = std::string(200, 'a') + "/" + std::string(200, 'b');
     folder.MakeFolder(deep);
@@ -211,7 +230,8 @@ TEST(CopyFileTo, CopiesEveryByte) {
     }
 }
 
-TEST(CopyFileTo, TheCopyBelongsToItsOwnerAlone) {
+// Windows has no permission bits.
+TEST(CopyFileTo, TheCopyBelongsToItsOwnerAloneAsOnlyLinuxHasPermissions) {
     const TemporaryFolder folder;
     folder.WriteFile("from", "abc");
     CopyFileTo(folder.System(u"from"), folder.System(u"to"), false);
@@ -270,11 +290,16 @@ TEST(CopyFileTo, AMissingSourceLeavesTheDestination) {
     EXPECT_EQ(folder.ReadFile("to"), "old");
 }
 
-TEST(CopyFileTo, OnlyRegularFilesAreCopied) {
+TEST(CopyFileTo, AFolderIsNotCopied) {
     const TemporaryFolder folder;
     folder.MakeFolder("sub");
-    folder.MakePipe("pipe");
     EXPECT_THROW(CopyFileTo(folder.System(u"sub"), folder.System(u"to"), true), PosixError);
+    EXPECT_FALSE(folder.Exists("to"));
+}
+
+TEST(CopyFileTo, APipeIsNotCopiedAsOnlyLinuxHasPipes) {
+    const TemporaryFolder folder;
+    folder.MakePipe("pipe");
     EXPECT_THROW(CopyFileTo(folder.System(u"pipe"), folder.System(u"to"), true), PosixError);
     EXPECT_FALSE(folder.Exists("to"));
 }

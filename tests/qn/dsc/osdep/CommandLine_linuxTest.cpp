@@ -1,3 +1,5 @@
+// Native paths, which only Linux has beside those in the system's form.
+
 #include "qn/dsc/osdep/CommandLine.h"
 
 #include <gtest/gtest.h>

@@ -45,7 +45,7 @@ bool Holds(const std::string& line, const std::string& text) {
 // The parameter is the path of the file.
 class ShippedFile : public testing::TestWithParam<const char*> {};
 
-INSTANTIATE_TEST_SUITE_P(Files, ShippedFile, testing::Values(ZKFPGA_TOOL, ZKFPGA_LIBRARY),
+INSTANTIATE_TEST_SUITE_P(Files, ShippedFile, testing::Values(ZKFPGA_TOOL, SHIPPED_LIBRARY),
                          [](const auto& file) { return std::string(file.param) == ZKFPGA_TOOL ? "Tool" : "Library"; });
 
 TEST_P(ShippedFile, IsLoadedAtAnyAddress) {
