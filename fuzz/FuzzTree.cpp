@@ -1,0 +1,426 @@
+// A tree that a host reads, edits, watches and reserves through its views, beside a slow model of it (TreeModel.h). The
+// input is a sequence of operations. After each one tree and model hold the same, the same observers have been called
+// in the same order, and each answer was the same; at the end nothing is left of the objects.
+//
+// Not followed: a renaming onto a sibling of an unordered node, which loses the node's entry for good, and children
+// named as the property that shows reservations, which a reservation would destroy under way. What observers do that
+// remove nodes under way has no model: with such an observer the rest of the run has only to be sound.
+
+#include <algorithm>
+#include <array>
+#include <memory>
+#include <string>
+#include <tuple>
+#include <utility>
+#include <vector>
+
+#include "FuzzInput.h"
+#include "TreeLaws.h"
+#include "TreeModel.h"
+#include "TreeQuestions.h"
+#include "interfaces/ResTreeNodeAdapter.h"
+#include "qn/dsc/osdep/Compare.h"
+#include "restree/ChangeFlags.h"
+#include "restree/ResTreeNode.h"
+#include "restree/ResTreeOwner.h"
+#include "zkfpga/tree_owner.h"
+
+namespace {
+
+using fuzz::Require;
+using fuzz::View;
+using fuzz::model::Call;
+using fuzz::model::Registration;
+using zkhw::ResTreeNode;
+
+constexpr size_t mostNodes = 24;
+constexpr size_t mostLinks = 5;
+constexpr size_t observerCount = 6;
+constexpr uint32_t allFlags = 0x7FF;
+
+// What each observer does when it is called.
+enum Habit : size_t { JustListens, ListensToo, SetsAProperty, EndsItself, BringsAnother, RemovesEntries };
+
+constexpr std::u16string_view names[] = {u"a",  u"A",        u"b",         u"B2",          u"c/d",
+                                         u"e\\f", u"..",       u".",         u"",            u"-a",
+                                         u"Seen", u"Reserves", u"Protocols", u"DisplayName", u"ZKHWReservation",
+                                         u"\u00E4"};
+constexpr std::u16string_view texts[] = {u"",        u"x",           u"/a",         u"a,b",    u"../a",  u"../b , ../B2",
+                                         u"/",       u"a/b",         u"../c\\/d",   u".",      u"..",    u"b/a,../..",
+                                         u"b,A,-a",  u"Module,List", u"/a/b,/b2/a", u"/b/../a"};
+constexpr std::u16string_view types[] = {u"Thing", u"Module", u"Target", u"a", u"AList", u"Resource", u"b", u""};
+constexpr std::u16string_view owners[] = {u"a", u"A", u"b", u"it em", u"", u"\u00C4"};
+
+template <size_t size>
+std::u16string Pick(const std::u16string_view (&table)[size], uint8_t number) {
+    return std::u16string(table[number % size]);
+}
+
+// Removing observers can do anything; others only so much in one operation, or they would go on for ever.
+constexpr int reactionsPerOperation = 4;
+
+class Owner : public zkhw::ResTreeOwner {
+  public:
+    explicit Owner(bool ordered) : ordered(ordered) {}
+    int32_t CreateRootNode(ResTreeNode*& root) override {
+        root = new ResTreeNode(u"", u"Root", ordered);
+        return 0;
+    }
+
+  private:
+    bool ordered;
+};
+
+struct Session;
+
+class Observer final : public IzkhwResourceTreeNodeObserver {
+  public:
+    Observer() = default;
+    virtual ~Observer() = default;
+    Observer(const Observer&) = delete;
+    Observer& operator=(const Observer&) = delete;
+
+    HRESULT STDMETHODCALLTYPE QueryInterface(REFIID, void** result) override {
+        *result = nullptr;
+        return E_NOINTERFACE;
+    }
+    ULONG STDMETHODCALLTYPE AddRef() override { return static_cast<ULONG>(++references); }
+    ULONG STDMETHODCALLTYPE Release() override { return static_cast<ULONG>(--references); }
+    HRESULT STDMETHODCALLTYPE NodeChanged(IzkhwResourceTreeNode* node, ULONG changes, ULONG id) override;
+
+    Session* session = nullptr;
+    size_t number = 0;
+    int references = 0;
+};
+
+struct Session {
+    explicit Session(bool ordered) : owner(std::make_unique<Owner>(ordered)), model(ordered) {
+        owner->GetRootNode(root);
+        View view;
+        owner->GetRootNodeInterface(view.ReceiveAny());
+        set = static_cast<zkhw::ResTreeNodeAdapter*>(view.Get())->GetObservers();
+        for (size_t i = 0; i < observerCount; ++i) {
+            observers[i].session = this;
+            observers[i].number = i;
+        }
+        model.reaction = [this](Registration registration) { React(registration); };
+    }
+
+    View ViewOf(const fuzz::model::Node& node) const { return fuzz::MakeView(*node.real, set); }
+
+    // The model's share of what an observer does.
+    void React(Registration registration) {
+        if (isEnding || modelReactions == 0 || registration.observer < SetsAProperty) {
+            return;
+        }
+        --modelReactions;
+        if (registration.observer == SetsAProperty) {
+            model.Set(*registration.node, u"Seen", u"1");
+        } else if (registration.observer == EndsItself) {
+            model.Unadvise(*registration.node, registration.observer, registration.id, false);
+        } else if (registration.observer == BringsAnother) {
+            model.Advise(*registration.node, JustListens, allFlags, 5);
+        }
+    }
+
+    std::array<Observer, observerCount> observers;
+    std::unique_ptr<Owner> owner;
+    ResTreeNode* root = nullptr;
+    zkhw::AdapterObserverSet* set = nullptr;
+    fuzz::model::Tree model;
+    std::vector<Call> calls;
+    std::vector<View> kept;  // Views that outlive their nodes.
+    int reactions = 0;
+    int modelReactions = 0;
+    size_t links = 0;
+    bool isEnding = false;
+    bool isWild = false;  // An observer has removed something under way: the model doesn't count any more.
+};
+
+HRESULT Observer::NodeChanged(IzkhwResourceTreeNode* node, ULONG changes, ULONG id) {
+    session->calls.push_back({number, changes, id, static_cast<zkhw::ResTreeNodeAdapter*>(node)->GetNode()});
+    if (session->isEnding || session->reactions == 0 || number < SetsAProperty) {
+        return S_OK;
+    }
+    --session->reactions;
+    if (number == SetsAProperty) {
+        node->SetProperty(fuzz::In(u"Seen"), fuzz::In(u"1"));
+    } else if (number == EndsItself) {
+        node->Unadvise(this, id, 0);
+    } else if (number == BringsAnother) {
+        node->Advise(&session->observers[JustListens], allFlags, 5);
+    } else {
+        session->isWild = true;
+        View parent;
+        node->GetParent(fuzz::Receive(parent));
+        node->RemoveEntry(fuzz::In((changes & zkhw::ChildAdded) != 0 ? u"b" : u"a"));
+        if (parent && (id & 1) != 0) {
+            parent->RemoveEntry(fuzz::In(u"a"));
+        }
+    }
+    return E_FAIL;
+}
+
+// --- Comparison ---
+
+void SameNode(fuzz::model::Node& node, ResTreeNode& real) {
+    node.real = &real;
+    Require(real.GetName().View() == node.name && real.GetType().View() == node.type, "name and type are the same");
+    Require(real.IsOrdered() == node.ordered, "both keep the order or neither");
+    Require(real.HasNoPendingChanges() == (node.pending == 0), "changes wait in both or in neither");
+    const std::vector<zkhw::Reservation>& held = real.GetReservations();
+    Require(held.size() == node.holders.size(), "as many hold the node");
+    for (size_t i = 0; i < held.size(); ++i) {
+        Require(held[i].owner.View() == node.holders[i].owner && held[i].mode == node.holders[i].mode,
+                "the same hold the node, in the same way");
+    }
+    auto entry = real.Begin();
+    for (const auto& expected : node.entries) {
+        Require(entry != real.End(), "no entry too few");
+        Require(entry.Key().View() == expected->key && entry->Kind() == expected->kind, "the same entries in order");
+        if (expected->child) {
+            Require(entry->Child()->GetParent() == &real, "a child knows its parent");
+            SameNode(*expected->child, *entry->Child());
+        } else {
+            const zkhw::String* text = entry->IsText() ? entry->Text() : entry->LinkPath();
+            Require(text->View() == expected->text, "each has its value");
+        }
+        ++entry;
+    }
+    Require(entry == real.End(), "no entry too many");
+}
+
+void SameCalls(Session& session) {
+    Require(session.calls == session.model.calls, "the same observers are called with the same, in order");
+    session.calls.clear();
+    session.model.calls.clear();
+}
+
+// --- Operations ---
+
+using fuzz::In;
+
+void AddEntry(Session& session, fuzz::model::Node& node, fuzz::Input& input, zkhw::EntryKind kind) {
+    std::u16string key = Pick(names, input.TakeByte());
+    const uint8_t options = input.TakeByte();
+    const std::u16string before = Pick(names, input.TakeByte());
+    const std::u16string* position = (options & 1) != 0 ? &before : nullptr;
+    const bool ordered = (options & 2) != 0;
+    const std::u16string text = kind == zkhw::ChildEntry ? Pick(types, options / 4) : Pick(texts, options / 4);
+    const zkhw::String beforeText(before);
+    const zkhw::String* realPosition = position == nullptr ? nullptr : &beforeText;
+    ResTreeNode& real = *node.real;
+    bool isNew = false;
+    if (kind == zkhw::ChildEntry) {
+        if (session.model.Nodes().size() >= mostNodes || key == u"ZKHWReservation") {
+            return;
+        }
+        ResTreeNode* child = nullptr;
+        isNew = real.AddChildEntry(key, text, ordered, child, realPosition).isNew;
+    } else if (kind == zkhw::LinkEntry) {
+        if (++session.links > mostLinks) {
+            return;
+        }
+        isNew = real.AddLinkEntry(zkhw::String(key), zkhw::String(text), realPosition).isNew;
+    } else {
+        isNew = real.AddTextEntry(zkhw::String(key), zkhw::String(text), kind, realPosition).isNew;
+    }
+    const bool isNewInModel = session.model.Add(node, key, kind, text, ordered, position) != nullptr;
+    Require(session.isWild || isNew == isNewInModel, "an entry is new to both");
+}
+
+void Rename(Session& session, fuzz::model::Node& node, const std::u16string& name) {
+    if (fuzz::model::Tree::WouldLose(node, name)) {
+        return;
+    }
+    Require(session.ViewOf(node)->SetName(In(name)) == S_OK || session.isWild, "a renaming that loses nothing is done");
+    session.model.Rename(node, name);
+}
+
+void Reserve(Session& session, fuzz::model::Node& node, fuzz::Input& input) {
+    const uint8_t operation = input.TakeByte();
+    const std::u16string owner = Pick(owners, operation / 16);
+    const uint8_t options = input.TakeByte();
+    const uint32_t mode = options % 16 < 9 ? options % 3 + 1U : options % 16;
+    const std::u16string type = Pick(types, options / 16);
+    View view = session.ViewOf(node);
+    const auto same = [&](HRESULT result, bool expected) {
+        Require(session.isWild || result == (expected ? S_OK : S_FALSE), "a reservation gives the same");
+    };
+    ULONG granted = 77;
+    switch (operation % 6) {
+        case 0:
+        case 1: {
+            const HRESULT result = view->Reserve(In(owner), mode, &granted);
+            const uint32_t expected = session.model.Reserve(node, owner, mode);
+            same(result, expected != 0);
+            Require(session.isWild || granted == expected, "a node is held in the same way");
+            break;
+        }
+        case 2:
+        case 3:
+            same(view->Unreserve(In(owner)), session.model.Release(node, owner));
+            break;
+        case 4:
+            same(view->ReserveDescendants(In(owner), mode, In(type)),
+                 session.model.ReserveAll(node, owner, mode, type));
+            break;
+        default:
+            same(view->UnreserveDescendants(In(owner), In(type)), session.model.ReleaseAll(node, owner, type));
+    }
+}
+
+void Watch(Session& session, fuzz::model::Node& node, fuzz::Input& input) {
+    const uint8_t operation = input.TakeByte();
+    const size_t number = operation / 4 % observerCount;
+    const uint8_t choice = input.TakeByte();
+    const uint32_t id = choice % 8 == 7 ? 0xFFFFFFFF : choice % 8;
+    View view = session.ViewOf(node);
+    if (operation % 4 == 0) {
+        const bool subtree = (choice & 8) != 0;
+        view->Unadvise(&session.observers[number], id, subtree ? 1 : 0);
+        session.model.Unadvise(node, number, id, subtree);
+    } else {
+        const uint32_t mask = (choice & 8) != 0 ? allFlags : input.TakeNumber() & allFlags;
+        view->Advise(&session.observers[number], mask, id);
+        session.model.Advise(node, number, mask, id);
+        session.kept.push_back(std::move(view));
+    }
+}
+
+void Bracket(Session& session, fuzz::model::Node& node, uint8_t options) {
+    View view = session.ViewOf(node);
+    if ((options & 1) == 0) {
+        ULONG pending = 77;
+        view->BeginChange(&pending);
+        const uint32_t expected = session.model.BeginChanges(node);
+        Require(session.isWild || pending == expected, "the same changes wait");
+        ++node.brackets;
+    } else if (node.brackets > 0) {
+        --node.brackets;
+        view->EndChange(options & 0x1C, options & 2);
+        session.model.EndChanges(node, options & 0x1C, (options & 2) != 0);
+    }
+}
+
+void CheckClone(Session& session, fuzz::model::Node& node) {
+    if (node.name == u"ZKHWReservation") {
+        return;
+    }
+    View view = session.ViewOf(node);
+    View clone;
+    Require(view->CloneDetached(nullptr, fuzz::Receive(clone)) == S_OK, "a node can be cloned");
+    fuzz::model::Tree copy(node.ordered);
+    copy.reaction = [](Registration) {};
+    copy.root.name = node.name;
+    copy.root.type = node.type;
+    copy.CopyInto(copy.root, node);
+    ResTreeNode& real = *static_cast<zkhw::ResTreeNodeAdapter*>(clone.Get())->GetNode();
+    SameNode(copy.root, real);
+    // What is done to the copy leaves the original as it is; the comparison that follows shows it.
+    clone->SetProperty(In(u"a"), In(u"changed"));
+    clone->RemoveEntry(In(u"b"));
+    clone->Reserve(In(u"copy"), 1, nullptr);
+}
+
+void Step(Session& session, fuzz::Input& input) {
+    const uint8_t operation = input.TakeByte();
+    const std::vector<fuzz::model::Node*> nodes = session.model.Nodes();
+    fuzz::model::Node& node = *nodes[input.TakeByte() % nodes.size()];
+    switch (operation % 16) {
+        case 0:
+        case 1:
+        case 2:
+            AddEntry(session, node, input, zkhw::ChildEntry);
+            break;
+        case 3:
+            AddEntry(session, node, input, zkhw::LinkEntry);
+            break;
+        case 4:
+            AddEntry(session, node, input, zkhw::TextEntry);
+            break;
+        case 5:
+        case 6: {
+            const std::u16string key = Pick(names, input.TakeByte());
+            const std::u16string value = Pick(texts, input.TakeByte());
+            session.ViewOf(node)->SetProperty(In(key), In(value));
+            session.model.Set(node, key, value);
+            break;
+        }
+        case 7: {
+            const std::u16string key = Pick(names, input.TakeByte());
+            session.ViewOf(node)->RemoveEntry(In(key));
+            session.model.RemoveByName(node, key);
+            break;
+        }
+        case 8:
+            Rename(session, node, Pick(names, input.TakeByte()));
+            break;
+        case 9:
+        case 10:
+            Reserve(session, node, input);
+            break;
+        case 11:
+        case 12:
+            Watch(session, node, input);
+            break;
+        case 13:
+            Bracket(session, node, input.TakeByte());
+            break;
+        case 14:
+            CheckClone(session, node);
+            break;
+        default: {
+            const std::u16string path = Pick(names, input.TakeByte()) + Pick(texts, input.TakeByte());
+            const std::u16string type = Pick(types, input.TakeByte());
+            fuzz::SameAnswers(node, session.ViewOf(node), path, type, Pick(owners, operation / 16));
+        }
+    }
+}
+
+// Every registration hears of the end of the tree, whatever it listens to, in the order of the set.
+void End(Session& session) {
+    session.isEnding = true;
+    std::vector<const Registration*> left;
+    for (const auto& registration : session.model.registrations) {
+        left.push_back(registration.get());
+    }
+    std::sort(left.begin(), left.end(), [&](const Registration* a, const Registration* b) {
+        const auto key = [&](const Registration* registration) {
+            return std::make_tuple(reinterpret_cast<uintptr_t>(registration->node->real),
+                                   reinterpret_cast<uintptr_t>(&session.observers[registration->observer]),
+                                   registration->id);
+        };
+        return key(a) < key(b);
+    });
+    for (const Registration* registration : left) {
+        session.model.calls.push_back({registration->observer, zkhw::NodeDeleted, 0, registration->node->real});
+    }
+    session.owner.reset();
+    if (!session.isWild) {
+        SameCalls(session);
+    }
+    session.kept.clear();
+    for (const Observer& observer : session.observers) {
+        Require(observer.references == 0, "every reference to an observer is given back");
+    }
+}
+
+}  // namespace
+
+extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
+    fuzz::Input input(data, size);
+    Session session((input.TakeByte() & 1) != 0);
+    SameNode(session.model.root, *session.root);
+    for (int steps = 0; !input.IsEmpty() && !session.isWild && steps < 100; ++steps) {
+        session.reactions = session.modelReactions = reactionsPerOperation;
+        Step(session, input);
+        if (!session.isWild) {
+            SameNode(session.model.root, *session.root);
+            SameCalls(session);
+        }
+    }
+    fuzz::CheckTree(*session.root);
+    End(session);
+    return 0;
+}
