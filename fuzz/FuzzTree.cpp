@@ -23,6 +23,7 @@
 #include "restree/ChangeFlags.h"
 #include "restree/ResTreeNode.h"
 #include "restree/ResTreeOwner.h"
+#include "restree/TextList.h"
 #include "zkfpga/tree_owner.h"
 
 namespace {
@@ -37,6 +38,7 @@ constexpr size_t mostNodes = 24;
 constexpr size_t mostLinks = 5;
 constexpr size_t observerCount = 6;
 constexpr uint32_t allFlags = 0x7FF;
+constexpr std::u16string_view reservationKey = u"ZKHWReservation";
 
 // What each observer does when it is called.
 enum Habit : size_t { JustListens, ListensToo, SetsAProperty, EndsItself, BringsAnother, RemovesEntries };
@@ -212,7 +214,7 @@ void AddEntry(Session& session, fuzz::model::Node& node, fuzz::Input& input, zkh
     ResTreeNode& real = *node.real;
     bool isNew = false;
     if (kind == zkhw::ChildEntry) {
-        if (session.model.Nodes().size() >= mostNodes || key == u"ZKHWReservation") {
+        if (session.model.Nodes().size() >= mostNodes || key == reservationKey) {
             return;
         }
         ResTreeNode* child = nullptr;
@@ -230,11 +232,12 @@ void AddEntry(Session& session, fuzz::model::Node& node, fuzz::Input& input, zkh
 }
 
 void Rename(Session& session, fuzz::model::Node& node, const std::u16string& name) {
-    if (fuzz::model::Tree::WouldLose(node, name)) {
+    if (name == reservationKey || fuzz::model::Tree::WouldLose(node, name)) {
         return;
     }
-    Require(session.ViewOf(node)->SetName(In(name)) == S_OK || session.isWild, "a renaming that loses nothing is done");
-    session.model.Rename(node, name);
+    const HRESULT result = session.ViewOf(node)->SetName(In(name));
+    const bool isDone = session.model.Rename(node, name);
+    Require(session.isWild || result == (isDone ? S_OK : S_FALSE), "both are renamed or neither");
 }
 
 void Reserve(Session& session, fuzz::model::Node& node, fuzz::Input& input) {
@@ -288,6 +291,19 @@ void Watch(Session& session, fuzz::model::Node& node, fuzz::Input& input) {
     }
 }
 
+// "Reserves" becomes a list of up to three nodes, wherever they stand.
+void Depend(Session& session, fuzz::model::Node& node, const std::vector<fuzz::model::Node*>& nodes,
+            fuzz::Input& input) {
+    std::vector<zkhw::String> paths;
+    const uint8_t count = input.TakeByte() % 4;
+    for (uint8_t i = 0; i < count; ++i) {
+        paths.emplace_back(fuzz::model::Tree::PathOf(*nodes[input.TakeByte() % nodes.size()]));
+    }
+    const std::u16string list(zkhw::JoinAll(paths, u',', true).View());
+    session.ViewOf(node)->SetProperty(In(u"Reserves"), In(list));
+    session.model.Set(node, u"Reserves", list);
+}
+
 void Bracket(Session& session, fuzz::model::Node& node, uint8_t options) {
     View view = session.ViewOf(node);
     if ((options & 1) == 0) {
@@ -304,9 +320,6 @@ void Bracket(Session& session, fuzz::model::Node& node, uint8_t options) {
 }
 
 void CheckClone(Session& session, fuzz::model::Node& node) {
-    if (node.name == u"ZKHWReservation") {
-        return;
-    }
     View view = session.ViewOf(node);
     View clone;
     Require(view->CloneDetached(nullptr, fuzz::Receive(clone)) == S_OK, "a node can be cloned");
@@ -339,8 +352,7 @@ void Step(Session& session, fuzz::Input& input) {
         case 4:
             AddEntry(session, node, input, zkhw::TextEntry);
             break;
-        case 5:
-        case 6: {
+        case 5: {
             const std::u16string key = Pick(names, input.TakeByte());
             const std::u16string value = Pick(texts, input.TakeByte());
             session.ViewOf(node)->SetProperty(In(key), In(value));
@@ -360,9 +372,12 @@ void Step(Session& session, fuzz::Input& input) {
         case 10:
             Reserve(session, node, input);
             break;
+        case 6:
         case 11:
-        case 12:
             Watch(session, node, input);
+            break;
+        case 12:
+            Depend(session, node, nodes, input);
             break;
         case 13:
             Bracket(session, node, input.TakeByte());

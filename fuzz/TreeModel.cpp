@@ -238,12 +238,12 @@ bool Tree::WouldLose(const Node& node, std::u16string_view newName) {
     return taken != nullptr && taken->child.get() != &node;
 }
 
-void Tree::Rename(Node& node, std::u16string_view newName) {
+bool Tree::Rename(Node& node, std::u16string_view newName) {
     if (node.parent != nullptr) {
         // The first entry of that name: in an ordered node it may be another one.
         Entry* entry = Find(*node.parent, node.name);
         if (entry == nullptr) {
-            return;
+            return false;
         }
         entry->key = newName;
         if (!node.parent->ordered) {
@@ -256,6 +256,7 @@ void Tree::Rename(Node& node, std::u16string_view newName) {
     if (node.parent != nullptr) {
         Raise(*node.parent, zkhw::ChildNameChanged);
     }
+    return true;
 }
 
 void Tree::CopyInto(Node& target, Node& source) {

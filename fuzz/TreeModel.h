@@ -117,7 +117,8 @@ class Tree {
     void RemoveByName(Node& node, std::u16string_view key);
     // Whether Rename would lose the node's entry.
     static bool WouldLose(const Node& node, std::u16string_view newName);
-    void Rename(Node& node, std::u16string_view newName);
+    // False if the parent has no entry of the node's name: a sibling of that name has lost it by its own renaming.
+    bool Rename(Node& node, std::u16string_view newName);
     // `source` as a copy without a parent, without its reservations and observers.
     void CopyInto(Node& target, Node& source);
 
