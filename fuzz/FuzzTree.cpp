@@ -43,13 +43,15 @@ constexpr std::u16string_view reservationKey = u"ZKHWReservation";
 // What each observer does when it is called.
 enum Habit : size_t { JustListens, ListensToo, SetsAProperty, EndsItself, BringsAnother, RemovesEntries };
 
-constexpr std::u16string_view names[] = {u"a",  u"A",        u"b",         u"B2",          u"c/d",
-                                         u"e\\f", u"..",       u".",         u"",            u"-a",
-                                         u"Seen", u"Reserves", u"Protocols", u"DisplayName", u"ZKHWReservation",
+constexpr std::u16string_view names[] = {u"a",         u"A",           u"b",
+                                         u"B2",        u"c/d",         u"e\\f",
+                                         u"..",        u".",           u"",
+                                         u"-a",        u"Seen",        u"Reserves",
+                                         u"Protocols", u"DisplayName", u"ZKHWReservation",
                                          u"\u00E4"};
-constexpr std::u16string_view texts[] = {u"",        u"x",           u"/a",         u"a,b",    u"../a",  u"../b , ../B2",
-                                         u"/",       u"a/b",         u"../c\\/d",   u".",      u"..",    u"b/a,../..",
-                                         u"b,A,-a",  u"Module,List", u"/a/b,/b2/a", u"/b/../a"};
+constexpr std::u16string_view texts[] = {u"",       u"x",           u"/a",         u"a,b",    u"../a", u"../b , ../B2",
+                                         u"/",      u"a/b",         u"../c\\/d",   u".",      u"..",   u"b/a,../..",
+                                         u"b,A,-a", u"Module,List", u"/a/b,/b2/a", u"/b/../a"};
 constexpr std::u16string_view types[] = {u"Thing", u"Module", u"Target", u"a", u"AList", u"Resource", u"b", u""};
 constexpr std::u16string_view owners[] = {u"a", u"A", u"b", u"it em", u"", u"\u00C4"};
 

@@ -67,8 +67,8 @@ inline bool IsPlain(std::string_view bytes) {
         return false;
     }
     const std::string squeezed = Squeezed(bytes);
-    const bool leadsOut = Contains(squeezed, {"..", "=\"/", "='/", ",/", "[/"}) ||
-                          squeezed.find(">/") != std::string::npos;
+    const bool leadsOut =
+        Contains(squeezed, {"..", "=\"/", "='/", ",/", "[/"}) || squeezed.find(">/") != std::string::npos;
     const bool popsEarly = Contains(squeezed, {"\"xml\"", "'xml'"}) || !HasPlainLinks(squeezed);
     const bool isStamped = Contains(squeezed, {"fpga_xmlsource", "targetxmlpath", "targetdir", ":deferredloadpath",
                                                "targetclassshortclassname", "xmlparseerrors"});

@@ -30,9 +30,11 @@ std::u16string Plain(const String& text) {
 }
 
 // The types that every root knows, each with one of those that it inherits from.
-constexpr std::pair<std::u16string_view, std::u16string_view> relations[] = {
-    {u"IOResource", u"Resource"},    {u"Target", u"ResourceList"}, {u"Connector", u"ResourceList"},
-    {u"Module", u"Resource"}, {u"Module", u"ResourceList"}};
+constexpr std::pair<std::u16string_view, std::u16string_view> relations[] = {{u"IOResource", u"Resource"},
+                                                                             {u"Target", u"ResourceList"},
+                                                                             {u"Connector", u"ResourceList"},
+                                                                             {u"Module", u"Resource"},
+                                                                             {u"Module", u"ResourceList"}};
 
 bool IsA(std::u16string_view type, std::u16string_view wanted) {
     if (Compare(type, wanted) == 0) {
@@ -111,7 +113,8 @@ Node* Tree::Resolve(Node& node, const Entry& entry) {
 }
 
 std::u16string Tree::PathOf(const Node& node) {
-    return node.parent == nullptr ? u"/" : Plain(zkhw::JoinEscapedPath(String(PathOf(*node.parent)), String(node.name)));
+    return node.parent == nullptr ? u"/"
+                                  : Plain(zkhw::JoinEscapedPath(String(PathOf(*node.parent)), String(node.name)));
 }
 
 std::u16string Tree::DisplayPathOf(Node& node) {
@@ -121,7 +124,8 @@ std::u16string Tree::DisplayPathOf(Node& node) {
     const Entry* display = Find(node, u"DisplayName");
     const String text(display == nullptr ? u"" : std::u16string_view(display->text));
     const bool isGiven = display != nullptr && IsText(*display);
-    return Plain(zkhw::JoinDisplayPath(String(DisplayPathOf(*node.parent)), String(node.name), isGiven ? &text : nullptr));
+    return Plain(
+        zkhw::JoinDisplayPath(String(DisplayPathOf(*node.parent)), String(node.name), isGiven ? &text : nullptr));
 }
 
 bool Tree::Supports(Node& node, std::u16string_view type) {

@@ -186,8 +186,8 @@ void Tree::Unadvise(Node& node, size_t observer, uint32_t id, bool subtree) {
     std::vector<Registration*> matches;
     for (const auto& registration : registrations) {
         const bool isExact = id != anyId && !subtree;
-        const bool fits = isExact ? registration->id == id
-                                  : id == anyId || registration->id == anyId || registration->id == id;
+        const bool fits =
+            isExact ? registration->id == id : id == anyId || registration->id == anyId || registration->id == id;
         const bool isHere = subtree ? IsAtOrBelow(registration->node, &node) : registration->node == &node;
         if (fits && isHere && registration->observer == observer) {
             matches.push_back(registration.get());

@@ -102,7 +102,8 @@ void CollectDescendants(Node& node, std::u16string_view type, std::vector<Node*>
 std::u16string JoinDisplay(const std::u16string& parent, Node& node) {
     const Entry* display = Property(node, u"DisplayName");
     const String text(display == nullptr ? u"" : std::u16string_view(display->text));
-    return std::u16string(zkhw::JoinDisplayPath(String(parent), String(node.name), display == nullptr ? nullptr : &text).View());
+    return std::u16string(
+        zkhw::JoinDisplayPath(String(parent), String(node.name), display == nullptr ? nullptr : &text).View());
 }
 
 std::u16string Join(const std::u16string& parent, const std::u16string& name) {
@@ -119,7 +120,8 @@ struct NameWalk {
 
     bool Passes(Node& node) const {
         const Entry* excluded = exclusion.empty() ? nullptr : Property(node, exclusion);
-        const bool isExcluded = excluded != nullptr && (excluded->text.empty() || zkhw::ParseBool(String(excluded->text)));
+        const bool isExcluded =
+            excluded != nullptr && (excluded->text.empty() || zkhw::ParseBool(String(excluded->text)));
         return Tree::Supports(node, type) && !isExcluded;
     }
 
@@ -185,9 +187,9 @@ void SameTexts(Node& node, View& view) {
 void SameNeighbours(Node& node, View& view, const std::u16string& type) {
     View parent;
     view->GetParent(Receive(parent));
-    Require(static_cast<bool>(parent) == (node.parent != nullptr) &&
-                view->HasParent() == YesOrNo(node.parent != nullptr),
-            "GetParent");
+    Require(
+        static_cast<bool>(parent) == (node.parent != nullptr) && view->HasParent() == YesOrNo(node.parent != nullptr),
+        "GetParent");
     std::vector<const ResTreeNode*> children;
     bool any = false;
     for (const auto& entry : node.entries) {

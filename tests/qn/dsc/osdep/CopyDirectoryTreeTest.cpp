@@ -141,8 +141,8 @@ TEST(CopyDirectoryTree, NamesThatDifferInCaseBecomeOne) {
 
 TEST(CopyDirectoryTree, EveryNativeNameIsCopied) {
     const TemporaryFolder folder;
-    const Names names = {"a\\b", "\xFF", "\xF0\x9F\x98\x80", "C:", "a:b", "*", "...", "\xED\xA0\x80", "x.",
-                         ".\x01", "..\xE2\x80\x8B"};
+    const Names names = {"a\\b", "\xFF",  "\xF0\x9F\x98\x80", "C:", "a:b", "*", "...", "\xED\xA0\x80",
+                         "x.",   ".\x01", "..\xE2\x80\x8B"};
     for (const std::string& name : names) {
         folder.WriteFile("from/" + name, name);
     }
