@@ -35,7 +35,9 @@ std::u16string Take(BSTR text) {
     return taken;
 }
 
-Texts Take(ULONG count, BSTR* array) {
+}  // namespace
+
+Texts TakeTexts(ULONG count, BSTR* array) {
     Texts taken;
     for (ULONG i = 0; i < count; ++i) {
         taken.push_back(Take(array[i]));
@@ -43,6 +45,8 @@ Texts Take(ULONG count, BSTR* array) {
     CoTaskMemFree(array);
     return taken;
 }
+
+namespace {
 
 std::vector<const ResTreeNode*> Take(ULONG count, IzkhwResourceTreeNode** array) {
     std::vector<const ResTreeNode*> taken;
@@ -168,7 +172,7 @@ void SameTexts(Node& node, View& view) {
     BSTR* array = nullptr;
     view->GetPropertyNames(&count, &array);
     const Texts keys = PropertyKeys(node);
-    Require(Take(count, array) == keys, "GetPropertyNames");
+    Require(TakeTexts(count, array) == keys, "GetPropertyNames");
     for (ULONG i = 0; i <= keys.size(); ++i) {
         BSTR value = nullptr;
         Require(view->GetPropertyAt(i, &value) == YesOrNo(i < keys.size()), "GetPropertyAt ends behind the last");
@@ -220,8 +224,8 @@ void SameNames(Node& node, View& view, const std::u16string& type, bool includeP
     BSTR* names = nullptr;
     BSTR* displays = nullptr;
     view->GetDescendantNamesEx(nullptr, In(type), includePath ? 1 : 0, In(u"Seen"), &count, &names, &displays);
-    Require(Take(count, names) == walk.names, "GetDescendantNamesEx gives the same names");
-    Require(Take(count, displays) == walk.displays, "GetDescendantNamesEx gives the same display paths");
+    Require(TakeTexts(count, names) == walk.names, "GetDescendantNamesEx gives the same names");
+    Require(TakeTexts(count, displays) == walk.displays, "GetDescendantNamesEx gives the same display paths");
 }
 
 void SameFinding(Node& node, View& view, const std::u16string& path) {

@@ -4,6 +4,7 @@
 
 #include <string>
 #include <string_view>
+#include <vector>
 
 #include "TreeModel.h"
 #include "interfaces/InterfacePointer.h"
@@ -28,6 +29,9 @@ inline LPCWSTR In(const std::u16string& text) {
 inline IzkhwResourceTreeNode** Receive(View& view) {
     return reinterpret_cast<IzkhwResourceTreeNode**>(view.ReceiveAny());
 }
+
+// What an operation has given as an array of texts; frees it.
+std::vector<std::u16string> TakeTexts(ULONG count, BSTR* array);
 
 View MakeView(zkhw::ResTreeNode& node, zkhw::AdapterObserverSet* observers);
 
