@@ -175,8 +175,8 @@ Texts NamesBelow(IzkhwResourceTreeNode5* root, const Text& path, const Options& 
     for (size_t i = 0; i < answers.size(); ++i) {
         Text replacement = options.strip.empty() ? answers[i] : options.Cut(answers[i]);
         if (options.aliases || options.displays) {
-            replacement = Cluster(u"3", Element(u"resource", replacement) + Element(u"alias", u"") +
-                                            Element(u"display name", shown[i]));
+            replacement = Cluster(
+                u"3", Element(u"resource", replacement) + Element(u"alias", u"") + Element(u"display name", shown[i]));
         }
         answers[i] = replacement.empty() ? answers[i] : replacement;
     }
@@ -207,9 +207,8 @@ void AppendProperties(IzkhwResourceTreeNode5* root, const Text& path, const Text
         const Text name = prefix + EscapedName(keys[i]);
         zkhw::OwnedBstr value;
         node->GetPropertyAt(i, value.Receive());
-        answers.push_back(withValues
-                              ? Cluster(u"2", Element(u"name", name) + Element(u"value", Text(value.View())))
-                              : name);
+        answers.push_back(withValues ? Cluster(u"2", Element(u"name", name) + Element(u"value", Text(value.View())))
+                                     : name);
     }
 }
 
@@ -235,8 +234,7 @@ void SameProperty(IzkEIOGResourceTree2& tree, IzkhwResourceTreeNode5* root, cons
     ULONG consumed = 0;
     root->FindNode(In(path), &consumed, nullptr, fuzz::Receive(node));
     zkhw::OwnedBstr expected;
-    const HRESULT result =
-        (node ? node.Get() : root)->GetProperty(In(path.substr(consumed)), expected.Receive());
+    const HRESULT result = (node ? node.Get() : root)->GetProperty(In(path.substr(consumed)), expected.Receive());
     zkhw::OwnedBstr given;
     Require(tree.GetProperty(In(path), nullptr, given.Receive()) == result, "GetProperty gives the same result");
     Require(given.View() == expected.View(), "GetProperty gives the same value");
