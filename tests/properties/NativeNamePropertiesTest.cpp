@@ -96,7 +96,7 @@ TEST(NativeNameProperties, AListedNameLeadsToItsFile) {
             if (name == u"." || name == u"..") {
                 continue;
             }
-            SCOPED_TRACE(qn::dsc::ExactText(String(name)));
+            SCOPED_TRACE(qn::dsc::ExactText(String(name)) + ", a name of seed 12");
             qn::dsc::osdep::BinaryFile file;
             ASSERT_NO_THROW(file.Open(path, qn::dsc::osdep::BinaryMode::Read));
             char bytes[256];
