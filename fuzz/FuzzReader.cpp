@@ -18,7 +18,7 @@ using zkhw::ResTreeNode;
 
 // Copies of copies can make a few bytes fill any memory; this is where an input stops and memory is said to be out.
 // Far more than what an input of some hundred bytes spells out takes.
-constexpr uint64_t mostAllocations = 1500;
+constexpr uint64_t mostAllocations = 800;
 
 // From the file, or the same as a text.
 void Load(ResTreeNode& root, bool asChild, bool fromText, const std::string& text) {
