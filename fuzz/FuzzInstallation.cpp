@@ -56,8 +56,8 @@ constexpr std::u16string_view summary[] = {
 // What is stamped on a node but not kept, or kept of other nodes.
 constexpr std::u16string_view stamps[] = {u"TargetDir", u"TargetClassShortClassName", u"FPGA_XMLSource"};
 
-template <size_t size>
-bool IsOneOf(const std::u16string_view (&names)[size], std::u16string_view name) {
+template <size_t Size>
+bool IsOneOf(const std::u16string_view (&names)[Size], std::u16string_view name) {
     return std::any_of(std::begin(names), std::end(names), [name](auto each) { return Equal(each, name); });
 }
 

@@ -6,11 +6,7 @@
 // named as the property that shows reservations, which a reservation would destroy under way. What observers do that
 // remove nodes under way has no model: with such an observer the rest of the run has only to be sound.
 
-#include <algorithm>
-#include <array>
-#include <memory>
 #include <string>
-#include <tuple>
 #include <utility>
 #include <vector>
 
@@ -18,30 +14,23 @@
 #include "TreeLaws.h"
 #include "TreeModel.h"
 #include "TreeQuestions.h"
+#include "TreeSession.h"
 #include "interfaces/ResTreeNodeAdapter.h"
 #include "qn/dsc/osdep/Compare.h"
-#include "restree/ChangeFlags.h"
 #include "restree/ResTreeNode.h"
-#include "restree/ResTreeOwner.h"
 #include "restree/TextList.h"
-#include "zkfpga/tree_owner.h"
 
 namespace {
 
 using fuzz::Require;
+using fuzz::Session;
 using fuzz::View;
-using fuzz::model::Call;
 using fuzz::model::Registration;
 using zkhw::ResTreeNode;
 
-constexpr size_t mostNodes = 24;
+constexpr size_t mostNodes = 16;
 constexpr size_t mostLinks = 5;
-constexpr size_t observerCount = 6;
-constexpr uint32_t allFlags = 0x7FF;
 constexpr std::u16string_view reservationKey = u"ZKHWReservation";
-
-// What each observer does when it is called.
-enum Habit : size_t { JustListens, ListensToo, SetsAProperty, EndsItself, BringsAnother, RemovesEntries };
 
 constexpr std::u16string_view names[] = {u"a",         u"A",           u"b",
                                          u"B2",        u"c/d",         u"e\\f",
@@ -55,149 +44,9 @@ constexpr std::u16string_view texts[] = {u"",       u"x",           u"/a",      
 constexpr std::u16string_view types[] = {u"Thing", u"Module", u"Target", u"a", u"AList", u"Resource", u"b", u""};
 constexpr std::u16string_view owners[] = {u"a", u"A", u"b", u"it em", u"", u"\u00C4"};
 
-template <size_t size>
-std::u16string Pick(const std::u16string_view (&table)[size], uint8_t number) {
-    return std::u16string(table[number % size]);
-}
-
-// Removing observers can do anything; others only so much in one operation, or they would go on for ever.
-constexpr int reactionsPerOperation = 4;
-
-class Owner : public zkhw::ResTreeOwner {
-  public:
-    explicit Owner(bool ordered) : ordered(ordered) {}
-    int32_t CreateRootNode(ResTreeNode*& root) override {
-        root = new ResTreeNode(u"", u"Root", ordered);
-        return 0;
-    }
-
-  private:
-    bool ordered;
-};
-
-struct Session;
-
-class Observer final : public IzkhwResourceTreeNodeObserver {
-  public:
-    Observer() = default;
-    virtual ~Observer() = default;
-    Observer(const Observer&) = delete;
-    Observer& operator=(const Observer&) = delete;
-
-    HRESULT STDMETHODCALLTYPE QueryInterface(REFIID, void** result) override {
-        *result = nullptr;
-        return E_NOINTERFACE;
-    }
-    ULONG STDMETHODCALLTYPE AddRef() override { return static_cast<ULONG>(++references); }
-    ULONG STDMETHODCALLTYPE Release() override { return static_cast<ULONG>(--references); }
-    HRESULT STDMETHODCALLTYPE NodeChanged(IzkhwResourceTreeNode* node, ULONG changes, ULONG id) override;
-
-    Session* session = nullptr;
-    size_t number = 0;
-    int references = 0;
-};
-
-struct Session {
-    explicit Session(bool ordered) : owner(std::make_unique<Owner>(ordered)), model(ordered) {
-        owner->GetRootNode(root);
-        View view;
-        owner->GetRootNodeInterface(view.ReceiveAny());
-        set = static_cast<zkhw::ResTreeNodeAdapter*>(view.Get())->GetObservers();
-        for (size_t i = 0; i < observerCount; ++i) {
-            observers[i].session = this;
-            observers[i].number = i;
-        }
-        model.reaction = [this](Registration registration) { React(registration); };
-    }
-
-    View ViewOf(const fuzz::model::Node& node) const { return fuzz::MakeView(*node.real, set); }
-
-    // The model's share of what an observer does.
-    void React(Registration registration) {
-        if (isEnding || modelReactions == 0 || registration.observer < SetsAProperty) {
-            return;
-        }
-        --modelReactions;
-        if (registration.observer == SetsAProperty) {
-            model.Set(*registration.node, u"Seen", u"1");
-        } else if (registration.observer == EndsItself) {
-            model.Unadvise(*registration.node, registration.observer, registration.id, false);
-        } else if (registration.observer == BringsAnother) {
-            model.Advise(*registration.node, JustListens, allFlags, 5);
-        }
-    }
-
-    std::array<Observer, observerCount> observers;
-    std::unique_ptr<Owner> owner;
-    ResTreeNode* root = nullptr;
-    zkhw::AdapterObserverSet* set = nullptr;
-    fuzz::model::Tree model;
-    std::vector<Call> calls;
-    std::vector<View> kept;  // Views that outlive their nodes.
-    int reactions = 0;
-    int modelReactions = 0;
-    size_t links = 0;
-    bool isEnding = false;
-    bool isWild = false;  // An observer has removed something under way: the model doesn't count any more.
-};
-
-HRESULT Observer::NodeChanged(IzkhwResourceTreeNode* node, ULONG changes, ULONG id) {
-    session->calls.push_back({number, changes, id, static_cast<zkhw::ResTreeNodeAdapter*>(node)->GetNode()});
-    if (session->isEnding || session->reactions == 0 || number < SetsAProperty) {
-        return S_OK;
-    }
-    --session->reactions;
-    if (number == SetsAProperty) {
-        node->SetProperty(fuzz::In(u"Seen"), fuzz::In(u"1"));
-    } else if (number == EndsItself) {
-        node->Unadvise(this, id, 0);
-    } else if (number == BringsAnother) {
-        node->Advise(&session->observers[JustListens], allFlags, 5);
-    } else {
-        session->isWild = true;
-        View parent;
-        node->GetParent(fuzz::Receive(parent));
-        node->RemoveEntry(fuzz::In((changes & zkhw::ChildAdded) != 0 ? u"b" : u"a"));
-        if (parent && (id & 1) != 0) {
-            parent->RemoveEntry(fuzz::In(u"a"));
-        }
-    }
-    return E_FAIL;
-}
-
-// --- Comparison ---
-
-void SameNode(fuzz::model::Node& node, ResTreeNode& real) {
-    node.real = &real;
-    Require(real.GetName().View() == node.name && real.GetType().View() == node.type, "name and type are the same");
-    Require(real.IsOrdered() == node.ordered, "both keep the order or neither");
-    Require(real.HasNoPendingChanges() == (node.pending == 0), "changes wait in both or in neither");
-    const std::vector<zkhw::Reservation>& held = real.GetReservations();
-    Require(held.size() == node.holders.size(), "as many hold the node");
-    for (size_t i = 0; i < held.size(); ++i) {
-        Require(held[i].owner.View() == node.holders[i].owner && held[i].mode == node.holders[i].mode,
-                "the same hold the node, in the same way");
-    }
-    auto entry = real.Begin();
-    for (const auto& expected : node.entries) {
-        Require(entry != real.End(), "no entry too few");
-        Require(entry.Key().View() == expected->key && entry->Kind() == expected->kind, "the same entries in order");
-        if (expected->child) {
-            Require(entry->Child()->GetParent() == &real, "a child knows its parent");
-            SameNode(*expected->child, *entry->Child());
-        } else {
-            const zkhw::String* text = entry->IsText() ? entry->Text() : entry->LinkPath();
-            Require(text->View() == expected->text, "each has its value");
-        }
-        ++entry;
-    }
-    Require(entry == real.End(), "no entry too many");
-}
-
-void SameCalls(Session& session) {
-    Require(session.calls == session.model.calls, "the same observers are called with the same, in order");
-    session.calls.clear();
-    session.model.calls.clear();
+template <size_t Size>
+std::u16string Pick(const std::u16string_view (&table)[Size], uint8_t number) {
+    return std::u16string(table[number % Size]);
 }
 
 // --- Operations ---
@@ -277,7 +126,7 @@ void Reserve(Session& session, fuzz::model::Node& node, fuzz::Input& input) {
 
 void Watch(Session& session, fuzz::model::Node& node, fuzz::Input& input) {
     const uint8_t operation = input.TakeByte();
-    const size_t number = operation / 4 % observerCount;
+    const size_t number = operation / 4 % fuzz::observerCount;
     const uint8_t choice = input.TakeByte();
     const uint32_t id = choice % 8 == 7 ? 0xFFFFFFFF : choice % 8;
     View view = session.ViewOf(node);
@@ -286,7 +135,7 @@ void Watch(Session& session, fuzz::model::Node& node, fuzz::Input& input) {
         view->Unadvise(&session.observers[number], id, subtree ? 1 : 0);
         session.model.Unadvise(node, number, id, subtree);
     } else {
-        const uint32_t mask = (choice & 8) != 0 ? allFlags : input.TakeNumber() & allFlags;
+        const uint32_t mask = (choice & 8) != 0 ? fuzz::allFlags : input.TakeNumber() & fuzz::allFlags;
         view->Advise(&session.observers[number], mask, id);
         session.model.Advise(node, number, mask, id);
         session.kept.push_back(std::move(view));
@@ -331,7 +180,7 @@ void CheckClone(Session& session, fuzz::model::Node& node) {
     copy.root.type = node.type;
     copy.CopyInto(copy.root, node);
     ResTreeNode& real = *static_cast<zkhw::ResTreeNodeAdapter*>(clone.Get())->GetNode();
-    SameNode(copy.root, real);
+    fuzz::SameNode(copy.root, real);
     // What is done to the copy leaves the original as it is; the comparison that follows shows it.
     clone->SetProperty(In(u"a"), In(u"changed"));
     clone->RemoveEntry(In(u"b"));
@@ -395,49 +244,21 @@ void Step(Session& session, fuzz::Input& input) {
     }
 }
 
-// Every registration hears of the end of the tree, whatever it listens to, in the order of the set.
-void End(Session& session) {
-    session.isEnding = true;
-    std::vector<const Registration*> left;
-    for (const auto& registration : session.model.registrations) {
-        left.push_back(registration.get());
-    }
-    std::sort(left.begin(), left.end(), [&](const Registration* a, const Registration* b) {
-        const auto key = [&](const Registration* registration) {
-            return std::make_tuple(reinterpret_cast<uintptr_t>(registration->node->real),
-                                   reinterpret_cast<uintptr_t>(&session.observers[registration->observer]),
-                                   registration->id);
-        };
-        return key(a) < key(b);
-    });
-    for (const Registration* registration : left) {
-        session.model.calls.push_back({registration->observer, zkhw::NodeDeleted, 0, registration->node->real});
-    }
-    session.owner.reset();
-    if (!session.isWild) {
-        SameCalls(session);
-    }
-    session.kept.clear();
-    for (const Observer& observer : session.observers) {
-        Require(observer.references == 0, "every reference to an observer is given back");
-    }
-}
-
 }  // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
     fuzz::Input input(data, size);
     Session session((input.TakeByte() & 1) != 0);
-    SameNode(session.model.root, *session.root);
-    for (int steps = 0; !input.IsEmpty() && !session.isWild && steps < 100; ++steps) {
-        session.reactions = session.modelReactions = reactionsPerOperation;
+    fuzz::SameNode(session.model.root, *session.root);
+    for (int steps = 0; !input.IsEmpty() && !session.isWild && steps < 48; ++steps) {
+        session.reactions = session.modelReactions = fuzz::reactionsPerOperation;
         Step(session, input);
         if (!session.isWild) {
-            SameNode(session.model.root, *session.root);
-            SameCalls(session);
+            fuzz::SameNode(session.model.root, *session.root);
+            fuzz::SameCalls(session);
         }
     }
     fuzz::CheckTree(*session.root);
-    End(session);
+    fuzz::End(session);
     return 0;
 }

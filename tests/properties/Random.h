@@ -26,9 +26,9 @@ class Random {
     size_t Below(size_t bound) { return static_cast<size_t>(Next() % bound); }
     bool OneIn(size_t count) { return Below(count) == 0; }
 
-    template <typename T, size_t size>
-    const T& Of(const T (&choices)[size]) {
-        return choices[Below(size)];
+    template <typename T, size_t Size>
+    const T& Of(const T (&choices)[Size]) {
+        return choices[Below(Size)];
     }
 
     // Up to `most` units out of `alphabet`.
