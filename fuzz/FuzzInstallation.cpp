@@ -104,7 +104,7 @@ bool Survives(const NodeEntry& entry) {
     const std::u16string_view written = text.substr(text.find(u'\0') + 1);
     return zkhw::TrimWhitespace(written).View() == written && written.find(u'\r') == std::u16string_view::npos &&
            written.find(u"#{") == std::u16string_view::npos &&
-           !(isPath && written.find_first_of(u"/") != std::u16string_view::npos) &&
+           !(isPath && written.find(u'/') != std::u16string_view::npos) &&
            !(isPath && written.find(u"\\\\") != std::u16string_view::npos);
 }
 
