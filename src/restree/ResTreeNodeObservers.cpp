@@ -134,28 +134,35 @@ bool ResTreeNode::WatchAncestors() {
 }
 
 bool ResTreeNode::WatchDependants() {
+    struct Level {
+        ResTreeNode* node;
+        std::vector<ResTreeNode*> dependants;
+        size_t next = 0;
+    };
     // A node that has been walked once has all its dependants registered already, so cycles and repeated paths end.
     const ReleaseScope scope;
     bool anyNew = false;
-    std::unordered_set<ResTreeNode*> walked{this};
-    std::vector<ResTreeNode*> open{this};
-    std::vector<ResTreeNode*> dependants;
-    while (!open.empty()) {
-        ResTreeNode* node = open.back();
-        open.pop_back();
-        dependants.clear();
-        node->GetDependants(dependants, false);
+    std::unordered_set<ResTreeNode*> walked;
+    std::vector<Level> levels;
+    const auto enter = [&](ResTreeNode* node) {
+        if (walked.insert(node).second) {
+            levels.push_back({node, {}});
+            node->GetDependants(levels.back().dependants, false);
+        }
+    };
+    enter(this);
+    while (!levels.empty()) {
+        Level& level = levels.back();
         // The load of a deferred content may have removed the node itself, or one that an earlier step has found.
-        if (node->isDefunct) {
+        if (level.next == level.dependants.size() || level.node->HasLeft()) {
+            levels.pop_back();
             continue;
         }
-        for (ResTreeNode* dependant : dependants) {
-            anyNew |= dependant->Register(node, ReservationChanged, dependantContext, node);
-        }
-        for (auto dependant = dependants.rbegin(); dependant != dependants.rend(); ++dependant) {
-            if (walked.insert(*dependant).second) {
-                open.push_back(*dependant);
-            }
+        ResTreeNode* dependant = level.dependants[level.next++];
+        if (!dependant->HasLeft()) {
+            // A dependant hears of its own before the next one is registered: that is the order of notices.
+            anyNew |= dependant->Register(level.node, ReservationChanged, dependantContext, level.node);
+            enter(dependant);
         }
     }
     return anyNew;

@@ -68,6 +68,19 @@ TEST_F(ReservationNotices, NothingIsToldOfWhatChangesNothing) {
     EXPECT_EQ(log.Take(), "");
 }
 
+// N watches B, B watches C, and only then does N come to watch C itself.
+TEST_F(ReservationNotices, ADependantIsWatchedThroughTheEarlierOnesOfTheListFirst) {
+    ResTreeNode* n = Make(u"N", u"../B,../C");
+    ResTreeNode* b = Make(u"B", u"../C");
+    ResTreeNode* c = Make(u"C");
+    n->AddObserver(&observer, ReservationChanged, 7);
+    b->AddObserver(&second, ReservationChanged, 8);
+    c->ReserveOne(u"a", ReserveRead);
+    EXPECT_EQ(log.Take(),
+              "o: N ReservationChanged #7\np: B ReservationChanged #8\n"
+              "o: N ReservationChanged #7\n");
+}
+
 TEST_F(ReservationNotices, HeldBackChangesArriveTogetherWithWhatWasPending) {
     ResTreeNode* n = Make(u"N");
     n->AddObserver(&observer, everything, 7);

@@ -329,20 +329,25 @@ inline int Compare(const String& left, const char16_t* right) {
 inline bool operator==(const String& left, const String& right) {
     return osdep::Equal(left.View(), right.View());
 }
-inline bool operator==(const String& left, std::u16string_view right) {
+// Templates, so that a view is not made a String to be compared so: views compare by their units.
+template <std::same_as<String> T>
+bool operator==(const T& left, std::u16string_view right) {
     return osdep::Equal(left.View(), right);
 }
-inline bool operator==(const String& left, const char16_t* right) {
+template <std::same_as<String> T>
+bool operator==(const T& left, const char16_t* right) {
     return Compare(left, right) == 0;
 }
 
 inline bool operator<(const String& left, const String& right) {
     return osdep::Compare(left.View(), right.View()) < 0;
 }
-inline bool operator<(const String& left, const char16_t* right) {
+template <std::same_as<String> T>
+bool operator<(const T& left, const char16_t* right) {
     return Compare(left, right) < 0;
 }
-inline bool operator<(const char16_t* left, const String& right) {
+template <std::same_as<String> T>
+bool operator<(const char16_t* left, const T& right) {
     return Compare(right, left) > 0;
 }
 

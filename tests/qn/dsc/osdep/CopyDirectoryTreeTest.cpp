@@ -143,7 +143,8 @@ TEST(CopyDirectoryTree, NamesThatDifferInCaseBecomeOneAsOnlyLinuxTellsCaseApart)
 // Names are UTF-16 on Windows, and may not hold every sign.
 TEST(CopyDirectoryTree, EveryNativeNameIsCopiedAsOnlyLinuxNamesAreBytes) {
     const TemporaryFolder folder;
-    const Names names = {"a\\b", "\xFF", "\xF0\x9F\x98\x80", "C:", "a:b", "*", "...", "\xED\xA0\x80", "x."};
+    const Names names = {"a\\b", "\xFF",  "\xF0\x9F\x98\x80", "C:", "a:b", "*", "...", "\xED\xA0\x80",
+                         "x.",   ".\x01", "..\xE2\x80\x8B"};
     for (const std::string& name : names) {
         folder.WriteFile("from/" + name, name);
     }

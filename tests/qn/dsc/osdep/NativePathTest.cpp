@@ -84,6 +84,13 @@ TEST(NativePath, NamesOfMoreDotsAreNames) {
     EXPECT_EQ(Native(u"C:\\a.\\.b"), "/a./.b");
 }
 
+// By Compare these are "." and "..", since the other units count for nothing there.
+TEST(NativePath, NamesThatOnlyCompareAsDotsAreNames) {
+    EXPECT_EQ(Native(u"C:\\a\\.\x01\\b"), "/a/.\x01/b");
+    EXPECT_EQ(Native(u"C:\\a\\.\x02."), "/a/.\x02.");
+    EXPECT_EQ(Native(u"C:\\a\\..\u200B\\b"), "/a/..\xE2\x80\x8B/b");
+}
+
 TEST(NativePath, DoubledSeparatorsCountAsOne) {
     EXPECT_EQ(Native(u"C:\\\\a\\\\\\b\\\\"), "/a/b/");
 }
