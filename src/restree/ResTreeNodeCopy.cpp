@@ -169,14 +169,15 @@ ResTreeNode* ResTreeNode::PrepareClone(EntryPosition position, HashedKey key, Re
         }
     }
     ResTreeNode* child = nullptr;
-    String name(key.text);
+    String childName(key.text);
     String childType(source.type);
-    const HashedKey hashed(name.View(), key.hash);
-    entry = IsOrdered()
-                ? AddChildAt(position, hashed, std::move(name), std::move(childType), source.IsOrdered(), child).entry
-                : ReplaceChild(!overwrite, hashed, std::move(name), std::move(childType), source.IsOrdered(), child,
-                               nullptr)
-                      .entry;
+    const HashedKey hashed(childName.View(), key.hash);
+    entry =
+        IsOrdered()
+            ? AddChildAt(position, hashed, std::move(childName), std::move(childType), source.IsOrdered(), child).entry
+            : ReplaceChild(!overwrite, hashed, std::move(childName), std::move(childType), source.IsOrdered(), child,
+                           nullptr)
+                  .entry;
     return StillHolds(entry) ? child : nullptr;
 }
 
