@@ -17,24 +17,29 @@ void OpenAttributes::Add(ParseFrame* frame) {
     // Outermost first: what is there stays.
     for (auto next = missing.rbegin(); next != missing.rend(); ++next) {
         ParseFrame& added = **next;
+        marks.push_back({enteredAttributes.size(), enteredLoopVariables.size()});
         added.isInOpenAttributes = true;
         added.pendingAttributes.ForEach([&](String&& name, AttributeList::Place place) {
-            attributes.try_emplace(std::move(name), Place{&added, place});
+            const auto [entered, isNew] = attributes.try_emplace(std::move(name), Place{&added, place});
+            if (isNew) {
+                enteredAttributes.push_back(entered);
+            }
         });
-        loopVariables.insert(added.loopVariables.begin(), added.loopVariables.end());
+        for (const String& variable : added.loopVariables) {
+            enteredLoopVariables.push_back(loopVariables.insert(variable));
+        }
     }
 }
 
-void OpenAttributes::Remove(ParseFrame& frame) {
+void OpenAttributes::Remove(ParseFrame& frame) noexcept {
     frame.isInOpenAttributes = false;
-    frame.pendingAttributes.ForEach([&](String&& name, AttributeList::Place) {
-        const auto found = attributes.find(name);
-        if (found != attributes.end() && found->second.frame == &frame) {
-            attributes.erase(found);
-        }
-    });
-    for (const String& variable : frame.loopVariables) {
-        loopVariables.erase(loopVariables.find(variable));
+    const Mark mark = marks.back();
+    marks.pop_back();
+    for (; enteredAttributes.size() > mark.attributes; enteredAttributes.pop_back()) {
+        attributes.erase(enteredAttributes.back());
+    }
+    for (; enteredLoopVariables.size() > mark.loopVariables; enteredLoopVariables.pop_back()) {
+        loopVariables.erase(enteredLoopVariables.back());
     }
 }
 

@@ -9,6 +9,7 @@
 #include <map>
 #include <set>
 #include <string_view>
+#include <vector>
 
 #include "qn/dsc/StringBase.h"
 #include "restree/AttributeList.h"
@@ -29,8 +30,9 @@ class OpenAttributes {
     // fit only for being released.
     void Add(ParseFrame* frame);
 
-    // Takes out a frame that is in, and that has no frame above it that is. What it holds is still what it was.
-    void Remove(ParseFrame& frame);
+    // Takes out a frame that is in, the last one that came in of those that are. Needs no memory: it is done on the way
+    // out of a failure, too.
+    void Remove(ParseFrame& frame) noexcept;
 
     // True if what is in has neither attributes nor loop variables.
     bool IsEmpty() const { return attributes.empty() && loopVariables.empty(); }
@@ -44,8 +46,21 @@ class OpenAttributes {
     bool HasAnyBut(std::u16string_view hidden) const;
 
   private:
-    std::map<String, Place> attributes;
-    std::multiset<String> loopVariables;  // One for each frame that has it.
+    using Attributes = std::map<String, Place>;
+    using LoopVariables = std::multiset<String>;
+
+    // What was in before a frame came in.
+    struct Mark {
+        size_t attributes;
+        size_t loopVariables;
+    };
+
+    Attributes attributes;
+    LoopVariables loopVariables;  // One for each frame that has it.
+    // In the order in which they came in; frames leave in the reverse order.
+    std::vector<Attributes::iterator> enteredAttributes;
+    std::vector<LoopVariables::iterator> enteredLoopVariables;
+    std::vector<Mark> marks;  // One for each frame that is in.
 };
 
 }  // namespace zkhw

@@ -175,6 +175,26 @@ TEST(LoadResourceText, WithoutMemoryLeavesATreeThatWorks) {
     EXPECT_TRUE(wasRefused);
 }
 
+TEST(LoadResourceText, ForgetsItsParametersWithoutMemory) {
+    // So many questions that the open attributes and loop variables are known by name when memory runs out for good.
+    const String xml(
+        u"<R K='k'><P><V>#{a}#{b}#{K}#{i}#{e}#{f}#{g}#{h}#{j}#{l}#{m}#{n}#{o}#{p}#{q}#{r}#{s}#{t}#{u}#{v}</V></P>"
+        u"<X names='x[i=1..2]' c='3'><Q prototype='../P' a='1' b='2' A='3'/></X></R>");
+    bool isDone = false;
+    for (uint64_t nth = 1; !isDone; ++nth) {
+        auto root = MakeRoot();
+        try {
+            const support::AllocationFaultScope faults(nth, true);
+            isDone = root->LoadResourceText(xml, true, nullptr) == 0;
+        } catch (const std::bad_alloc&) {
+            isDone = false;
+        }
+        EXPECT_EQ(root->LoadResourceText(u"<Z name='z'/>", true, nullptr), 0) << nth;
+        EXPECT_NE(root->FindRaw(u"z"), nullptr) << nth;
+        ASSERT_LT(nth, 100000u);
+    }
+}
+
 // --- Files ---
 
 class LoadResourceFile : public ResourceFiles {
