@@ -42,8 +42,12 @@ void AppendArguments(const std::string& operation, const std::string& list, Argu
 Arguments OfInterfaces() {
     static const std::regex declaration(R"(struct (\w+) : public \w+ \{)");
     static const std::regex operation(R"(virtual HRESULT STDMETHODCALLTYPE (\w+)\(([^)]*)\))");
-    static const Names ofTheHost = {"IzkhwResourceTreeNodeObserver", "IzkProjectItem", "IzkProjectItemLocator",
-                                    "IzkItemResourceLink",           "IzkItemMarker",  "IzkProject",
+    static const Names ofTheHost = {"IzkhwResourceTreeNodeObserver",
+                                    "IzkProjectItem",
+                                    "IzkProjectItemLocator",
+                                    "IzkItemResourceLink",
+                                    "IzkItemMarker",
+                                    "IzkProject",
                                     "IzkHostContext"};
     Arguments all;
     for (const char* const header : {"tree_node.h", "tree_owner.h", "tree_root.h", "host_interfaces.h"}) {
@@ -94,11 +98,11 @@ bool IsNumber(const Argument& argument) {
 
 // Where something has to be stored and the headers have no result for null: breaking that has no answer.
 const Names withoutAnAnswer = {
-    "IzkhwResourceTreeNode::GetProperty value",      "IzkhwResourceTreeNode::GetPropertyAt value",
-    "IzkhwResourceTreeNode::BeginChange pending",    "IzkhwResourceTreeNode::GetXml xml",
-    "IzkhwResourceTreeNode3::GetFilteredXml xml",    "IzkhwResourceTreeNode4::CloneDetached clone",
-    "IzkhwResourceTreeNode4::GetFilteredXmlEx xml",  "IzkEIOGResourceTree::GetProperty value",
-    "IzkEIOGResourceTree2::GetFilteredXml xml",      "IzkProjectItemSelector::SelectItem item",
+    "IzkhwResourceTreeNode::GetProperty value",     "IzkhwResourceTreeNode::GetPropertyAt value",
+    "IzkhwResourceTreeNode::BeginChange pending",   "IzkhwResourceTreeNode::GetXml xml",
+    "IzkhwResourceTreeNode3::GetFilteredXml xml",   "IzkhwResourceTreeNode4::CloneDetached clone",
+    "IzkhwResourceTreeNode4::GetFilteredXmlEx xml", "IzkEIOGResourceTree::GetProperty value",
+    "IzkEIOGResourceTree2::GetFilteredXml xml",     "IzkProjectItemSelector::SelectItem item",
     "IzkProjectItemSelector::SelectItem result",
 };
 
@@ -151,7 +155,8 @@ TEST(MisuseCases, EveryIdOfTheHeadersIsAskedOfEveryObject) {
     size_t count = 0;
     for (std::sregex_iterator each(text.begin(), text.end(), definition), end; each != end; ++each) {
         ++count;
-        for (const char* const object : {" of a view", " of a tree", " of an owner", " of a selector", " of the library"}) {
+        for (const char* const object :
+             {" of a view", " of a tree", " of an owner", " of a selector", " of the library"}) {
             EXPECT_EQ(names.count((*each)[1].str() + object), 1U) << (*each)[1] << object;
         }
     }

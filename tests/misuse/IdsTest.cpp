@@ -7,11 +7,20 @@
 
 namespace {
 
-const std::vector<std::string> ids = {
-    "IzkhwResourceTreeNode",  "IzkhwResourceTreeNode2", "IzkhwResourceTreeNode3", "IzkhwResourceTreeNode4",
-    "IzkhwResourceTreeNode5", "IzkhwResourceTreeOwner", "IzkEIOGResourceTree",    "IzkEIOGResourceTree2",
-    "IzkProjectItemSelector", "IzkItemMarker",          "IzkItemResourceLink",    "IUnknown",
-    "nothing",                "almost"};
+const std::vector<std::string> ids = {"IzkhwResourceTreeNode",
+                                      "IzkhwResourceTreeNode2",
+                                      "IzkhwResourceTreeNode3",
+                                      "IzkhwResourceTreeNode4",
+                                      "IzkhwResourceTreeNode5",
+                                      "IzkhwResourceTreeOwner",
+                                      "IzkEIOGResourceTree",
+                                      "IzkEIOGResourceTree2",
+                                      "IzkProjectItemSelector",
+                                      "IzkItemMarker",
+                                      "IzkItemResourceLink",
+                                      "IUnknown",
+                                      "nothing",
+                                      "almost"};
 
 const std::set<std::string> nodeIds = {"IzkhwResourceTreeNode", "IzkhwResourceTreeNode2", "IzkhwResourceTreeNode3",
                                        "IzkhwResourceTreeNode4", "IzkhwResourceTreeNode5"};

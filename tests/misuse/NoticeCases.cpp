@@ -1,5 +1,5 @@
-// An observer that takes away what the library stands on, out of the call of every operation that lets it hear anything:
-// "Operation, action", and out of the removal of its node: "NodeDeleting of A, action".
+// An observer that takes away what the library stands on, out of the call of every operation that lets it hear
+// anything: "Operation, action", and out of the removal of its node: "NodeDeleting of A, action".
 
 #include <memory>
 

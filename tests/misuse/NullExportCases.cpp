@@ -27,13 +27,12 @@ std::string FoundText(Wanted found, unsigned char value) {
 void GetProperty(Text basePath, Text subPath, Text options, Wanted value, Wanted found) {
     const HostString text(untouched);
     unsigned char isFound = 9;
-    const HRESULT result =
-        library.FPGAResTree_GetProperty(basePath, subPath, options, value == nullptr ? nullptr : text.Get(),
-                                        found == nullptr ? nullptr : &isFound);
+    const HRESULT result = library.FPGAResTree_GetProperty(
+        basePath, subPath, options, value == nullptr ? nullptr : text.Get(), found == nullptr ? nullptr : &isFound);
     Say(Hex(result) + " \"" + text.Bytes() + "\"" + FoundText(found, isFound));
 }
 
-template <auto Library::* function>
+template <auto Library::*function>
 void GetList(Text basePath, Text subPath, Text options, Wanted names, Wanted found) {
     ZkStringArrayHandle array = nullptr;
     unsigned char isFound = 9;
@@ -44,8 +43,7 @@ void GetList(Text basePath, Text subPath, Text options, Wanted names, Wanted fou
 
 void Dump(Text basePath, Text subPath, Text options, Wanted text) {
     const HostString xml(untouched);
-    const HRESULT result =
-        library.FPGAResTree_Dump(basePath, subPath, options, text == nullptr ? nullptr : xml.Get());
+    const HRESULT result = library.FPGAResTree_Dump(basePath, subPath, options, text == nullptr ? nullptr : xml.Get());
     std::string shown = xml.Bytes();
     for (char& each : shown) {
         each = each == '\n' ? '|' : each;
@@ -53,12 +51,12 @@ void Dump(Text basePath, Text subPath, Text options, Wanted text) {
     Say(Hex(result) + " " + shown);
 }
 
-template <auto Library::* function>
+template <auto Library::*function>
 void Convert(Wanted source, Wanted destination) {
     const HostString from("ab");
     const HostString to(untouched);
-    const int32_t result = (library.*function)(source == nullptr ? nullptr : from.Get(),
-                                               destination == nullptr ? nullptr : to.Get());
+    const int32_t result =
+        (library.*function)(source == nullptr ? nullptr : from.Get(), destination == nullptr ? nullptr : to.Get());
     Say(Hex(HRESULT{result}) + " \"" + to.Bytes() + "\"");
 }
 
@@ -91,8 +89,7 @@ void AddConversions(Cases& cases) {
 
 void QueryInterface(const IID* id, IzkHostContext* context, IzkProjectItem* item, Wanted result) {
     void* object = &wanted;
-    const HRESULT given =
-        library.QueryResourceTreeInterface(id, context, item, result == nullptr ? nullptr : &object);
+    const HRESULT given = library.QueryResourceTreeInterface(id, context, item, result == nullptr ? nullptr : &object);
     Say(Hex(given) + (object == nullptr ? " null" : object == &wanted ? " untouched" : " object"));
     if (object != nullptr && object != &wanted) {
         static_cast<IUnknown*>(object)->Release();
@@ -111,59 +108,68 @@ void AddInterfaces(Cases& cases) {
         [] { QueryInterface(&IID_IzkhwResourceTreeOwner, nullptr, nullptr, &wanted); }};
     cases["QueryResourceTreeInterface context and item of a tree"] = {
         [] { QueryInterface(&IID_IzkEIOGResourceTree2, nullptr, nullptr, &wanted); }};
-    AddExport(cases, "ZkhwResTree_GetNode", {"refNum", "accessor"},
-              [](uint32_t refNum, Wanted accessor) {
-                  int32_t node = 55;
-                  const int32_t result = library.ZkhwResTree_GetNode(refNum, accessor == nullptr ? nullptr : &node);
-                  Say(Hex(HRESULT{result}) + " " + std::to_string(node));
-              },
-              uint32_t{5}, Wanted{&wanted});
-    AddExport(cases, "SetZKRTModule", {"module"},
-              [](void* module) {
-                  library.SetZKRTModule(module);
-                  SayProperty();
-              },
-              static_cast<void*>(&wanted));
-    AddExport(cases, "SetZKRTModuleHook", {"module"},
-              [](void* module) {
-                  library.SetZKRTModuleHook(module);
-                  SayProperty();
-              },
-              static_cast<void*>(&wanted));
+    AddExport(
+        cases, "ZkhwResTree_GetNode", {"refNum", "accessor"},
+        [](uint32_t refNum, Wanted accessor) {
+            int32_t node = 55;
+            const int32_t result = library.ZkhwResTree_GetNode(refNum, accessor == nullptr ? nullptr : &node);
+            Say(Hex(HRESULT{result}) + " " + std::to_string(node));
+        },
+        uint32_t{5}, Wanted{&wanted});
+    AddExport(
+        cases, "SetZKRTModule", {"module"},
+        [](void* module) {
+            library.SetZKRTModule(module);
+            SayProperty();
+        },
+        static_cast<void*>(&wanted));
+    AddExport(
+        cases, "SetZKRTModuleHook", {"module"},
+        [](void* module) {
+            library.SetZKRTModuleHook(module);
+            SayProperty();
+        },
+        static_cast<void*>(&wanted));
 }
 
 void AddMemory(Cases& cases) {
-    AddExport(cases, "CoTaskMemRealloc", {"block", "size"},
-              [](void* block, size_t size) {
-                  void* const made = library.CoTaskMemRealloc(block, size);
-                  Say(made == nullptr ? "null" : "block");
-                  library.CoTaskMemFree(made);
-              },
-              static_cast<void*>(&wanted), size_t{16});
-    AddExport(cases, "CoTaskMemFree", {"block"},
-              [](void* block) {
-                  library.CoTaskMemFree(block);
-                  Say("freed");
-              },
-              static_cast<void*>(&wanted));
-    AddExport(cases, "SysAllocString", {"text"},
-              [](const OLECHAR* text) { Say(library.SysAllocString(text) == nullptr ? "null" : "string"); },
-              static_cast<const OLECHAR*>(u"ab"));
-    AddExport(cases, "SysAllocStringLen", {"text", "length"},
-              [](const OLECHAR* text, unsigned length) {
-                  BSTR const string = library.SysAllocStringLen(text, length);
-                  Say(string == nullptr ? "null" : "length " + std::to_string(library.SysStringLen(string)));
-                  library.SysFreeString(string);
-              },
-              static_cast<const OLECHAR*>(u"ab"), 2U);
-    AddExport(cases, "SysStringLen", {"string"},
-              [](BSTR string) { Say("length " + std::to_string(library.SysStringLen(string))); }, BSTR{nullptr});
-    AddExport(cases, "SysFreeString", {"string"},
-              [](BSTR string) {
-                  library.SysFreeString(string);
-                  Say("freed");
-              },
-              BSTR{nullptr});
+    AddExport(
+        cases, "CoTaskMemRealloc", {"block", "size"},
+        [](void* block, size_t size) {
+            void* const made = library.CoTaskMemRealloc(block, size);
+            Say(made == nullptr ? "null" : "block");
+            library.CoTaskMemFree(made);
+        },
+        static_cast<void*>(&wanted), size_t{16});
+    AddExport(
+        cases, "CoTaskMemFree", {"block"},
+        [](void* block) {
+            library.CoTaskMemFree(block);
+            Say("freed");
+        },
+        static_cast<void*>(&wanted));
+    AddExport(
+        cases, "SysAllocString", {"text"},
+        [](const OLECHAR* text) { Say(library.SysAllocString(text) == nullptr ? "null" : "string"); },
+        static_cast<const OLECHAR*>(u"ab"));
+    AddExport(
+        cases, "SysAllocStringLen", {"text", "length"},
+        [](const OLECHAR* text, unsigned length) {
+            BSTR const string = library.SysAllocStringLen(text, length);
+            Say(string == nullptr ? "null" : "length " + std::to_string(library.SysStringLen(string)));
+            library.SysFreeString(string);
+        },
+        static_cast<const OLECHAR*>(u"ab"), 2U);
+    AddExport(
+        cases, "SysStringLen", {"string"},
+        [](BSTR string) { Say("length " + std::to_string(library.SysStringLen(string))); }, BSTR{nullptr});
+    AddExport(
+        cases, "SysFreeString", {"string"},
+        [](BSTR string) {
+            library.SysFreeString(string);
+            Say("freed");
+        },
+        BSTR{nullptr});
 }
 
 }  // namespace

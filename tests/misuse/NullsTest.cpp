@@ -47,8 +47,8 @@ void AppendProperties(Expectations& all) {
     all.push_back(Answers(node + "GetProperty name", "00000001"));
     all.push_back(Answers(node + "SetProperty name",
                           "00000000" + Now("S{=8,Height=7,Label=Name;" + slotA + slotB + "}" + shelfT)));
-    all.push_back(Answers(node + "SetProperty value",
-                          "00000000" + Now("S{Height=,Label=Name;" + slotA + slotB + "}" + shelfT)));
+    all.push_back(
+        Answers(node + "SetProperty value", "00000000" + Now("S{Height=,Label=Name;" + slotA + slotB + "}" + shelfT)));
     all.push_back(Answers(node + "SetPropertyAt value",
                           "00000000" + Now("S{Height=,Label=Name;" + slotA + slotB + "}" + shelfT)));
     all.push_back(Answers("IzkhwResourceTreeNode5::IsLocalizedProperty name", "00000001"));
@@ -61,8 +61,7 @@ void AppendReservations(Expectations& all) {
     all.push_back(Answers(node + "Reserve owner", "00000000 number=00000001" + Shelves(Held(":=r"), "", "", "")));
     all.push_back(Answers(node + "Reserve granted", "00000000" + Shelves(Held("me:=r"), "", "", "")));
     all.push_back(Answers(node + "Unreserve owner", "00000001"));
-    all.push_back(
-        Answers(node + "ReserveDescendants owner", "00000000" + Shelves("", Held(":=r"), "", Held(":=r"))));
+    all.push_back(Answers(node + "ReserveDescendants owner", "00000000" + Shelves("", Held(":=r"), "", Held(":=r"))));
     all.push_back(Answers(node + "ReserveDescendants type",
                           "00000000" + Shelves("", Held("me:=r"), Held("me:=r"), Held("me:=r"))));
     all.push_back(Answers(node + "UnreserveDescendants owner", "00000001"));
@@ -105,10 +104,9 @@ void AppendNames(Expectations& all) {
     const std::string own = "[/Rack/S/A,/Rack/S/B]";
     const std::string given = "[/at/A,/at/B]";
     const std::string displays = " </Rack/S/A,/Rack/S/B>";
-    for (const char* const operation : {"IzkhwResourceTreeNode::GetChildNames",
-                                        "IzkhwResourceTreeNode::GetChildNamesOfType",
-                                        "IzkhwResourceTreeNode::GetDescendantNames",
-                                        "IzkhwResourceTreeNode4::GetDescendantNamesEx"}) {
+    for (const char* const operation :
+         {"IzkhwResourceTreeNode::GetChildNames", "IzkhwResourceTreeNode::GetChildNamesOfType",
+          "IzkhwResourceTreeNode::GetDescendantNames", "IzkhwResourceTreeNode4::GetDescendantNamesEx"}) {
         AppendPointers(all, operation, {"count", "names"});
         all.push_back(Answers(std::string(operation) + " path", "00000000 2 " + own + displays));
     }
@@ -165,9 +163,8 @@ void AppendTree(Expectations& all) {
                           "<Val>Width</Val></String><String><Name>value</Name><Val>2</Val></String></Cluster>]"));
     all.push_back(Answers(tree + "GetProperty path", "00000001"));
     all.push_back(Answers(tree + "GetProperty options", "00000000 \"7\""));
-    all.push_back(
-        Answers("IzkEIOGResourceTree2::GetFilteredXml path",
-                "00000000 \"|<ProviderResourceTreeRoot name=\"\">|</ProviderResourceTreeRoot>\""));
+    all.push_back(Answers("IzkEIOGResourceTree2::GetFilteredXml path",
+                          "00000000 \"|<ProviderResourceTreeRoot name=\"\">|</ProviderResourceTreeRoot>\""));
 }
 
 }  // namespace

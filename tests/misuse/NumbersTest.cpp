@@ -62,8 +62,7 @@ void AppendChanges(Expectations& all) {
     const std::string heard = ok + Notice("00000004", "00000005") + ok + gone;
     AppendEach(all, "IzkhwResourceTreeNode::Advise mask", {ok + ok + gone, ok + ok + gone, heard, heard});
     for (const std::string& id : values) {
-        all.push_back(
-            Answers("IzkhwResourceTreeNode::Advise id=" + id, ok + Notice("00000004", id) + ok + gone));
+        all.push_back(Answers("IzkhwResourceTreeNode::Advise id=" + id, ok + Notice("00000004", id) + ok + gone));
     }
     // The registration has the id 5.
     const std::string stillHeard = ok + Notice("00000004", "00000005") + gone;

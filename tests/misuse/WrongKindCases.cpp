@@ -27,9 +27,8 @@ void AddNodes(Cases& cases) {
         [] { SayResult(fixture.shelf->IsLocalizedProperty(u"Height")); }};
     cases["FindNode of a property"] = {
         [] { SayResult(fixture.shelf->FindNode(u"Height", nullptr, nullptr, &outputs.node)); }};
-    cases["FindNode through a property"] = {[] {
-        SayResult(fixture.shelf->FindNode(u"Height/A", &outputs.number, &outputs.flag, &outputs.node));
-    }};
+    cases["FindNode through a property"] = {
+        [] { SayResult(fixture.shelf->FindNode(u"Height/A", &outputs.number, &outputs.flag, &outputs.node)); }};
     cases["RemoveEntry of a link"] = {
         [] { OnOtherShelf([](IzkhwResourceTreeNode5& shelf) { return shelf.RemoveEntry(u"L"); }); }};
     cases["SetName to the name of a sibling"] = {[] {
