@@ -147,12 +147,12 @@ void AddSurplus(Cases& cases) {
         fixture.tree->GetDescendantNames(u"Kept", u"includeAliases=true", &count, &names);
     }};
     cases["SysFreeString twice"] = {[] {
-        BSTR const string = library.SysAllocString(u"ab");
+        OLECHAR* const string = library.SysAllocString(u"ab");
         library.SysFreeString(string);
         library.SysFreeString(string);
     }};
     cases["SysStringLen of a freed string"] = {[] {
-        BSTR const string = library.SysAllocString(u"ab");
+        OLECHAR* const string = library.SysAllocString(u"ab");
         library.SysFreeString(string);
         library.SysStringLen(string);
     }};

@@ -23,7 +23,8 @@ namespace misuse {
 
 // --- The library ---
 
-// Its functions, all found by their names.
+// Its functions, all found by their names, which they bear here too.
+// NOLINTBEGIN(readability-identifier-naming)
 struct Library {
     decltype(&::gFPGAResTree) gFPGAResTree;
     decltype(&::QueryResourceTreeInterface) QueryResourceTreeInterface;
@@ -48,6 +49,7 @@ struct Library {
     decltype(&::SysStringLen) SysStringLen;
     decltype(&::SysFreeString) SysFreeString;
 };
+// NOLINTEND(readability-identifier-naming)
 
 extern Library library;
 

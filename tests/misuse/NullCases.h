@@ -41,20 +41,20 @@ template <typename Type>
 concept Pointer = std::is_pointer_v<Type>;
 
 // `Call` takes the operation's arguments and says what came of it. `names` are those of the arguments, all of them.
-template <size_t index, typename Call, typename... Arguments>
+template <size_t Index, typename Call, typename... Arguments>
 void AddNullAt(Cases& cases, const std::string& operation, const char* const* names, bool needsRuntime, Call call,
                const std::tuple<Arguments...>& good) {
-    if constexpr (index < sizeof...(Arguments)) {
-        using Argument = std::tuple_element_t<index, std::tuple<Arguments...>>;
+    if constexpr (Index < sizeof...(Arguments)) {
+        using Argument = std::tuple_element_t<Index, std::tuple<Arguments...>>;
         if constexpr (Pointer<Argument>) {
-            cases[operation + " " + names[index]] = {[call, good] {
+            cases[operation + " " + names[Index]] = {[call, good] {
                                                          auto arguments = good;
-                                                         std::get<index>(arguments) = nullptr;
+                                                         std::get<Index>(arguments) = nullptr;
                                                          std::apply(call, arguments);
                                                      },
                                                      needsRuntime};
         }
-        AddNullAt<index + 1>(cases, operation, names, needsRuntime, call, good);
+        AddNullAt<Index + 1>(cases, operation, names, needsRuntime, call, good);
     }
 }
 

@@ -32,11 +32,11 @@ void GetProperty(Text basePath, Text subPath, Text options, Wanted value, Wanted
     Say(Hex(result) + " \"" + text.Bytes() + "\"" + FoundText(found, isFound));
 }
 
-template <auto Library::*function>
+template <auto Library::*Function>
 void GetList(Text basePath, Text subPath, Text options, Wanted names, Wanted found) {
     ZkStringArrayHandle array = nullptr;
     unsigned char isFound = 9;
-    const HRESULT result = (library.*function)(basePath, subPath, options, names == nullptr ? nullptr : &array,
+    const HRESULT result = (library.*Function)(basePath, subPath, options, names == nullptr ? nullptr : &array,
                                                found == nullptr ? nullptr : &isFound);
     Say(Hex(result) + " " + TakeArray(array) + FoundText(found, isFound));
 }
@@ -51,12 +51,12 @@ void Dump(Text basePath, Text subPath, Text options, Wanted text) {
     Say(Hex(result) + " " + shown);
 }
 
-template <auto Library::*function>
+template <auto Library::*Function>
 void Convert(Wanted source, Wanted destination) {
     const HostString from("ab");
     const HostString to(untouched);
     const int32_t result =
-        (library.*function)(source == nullptr ? nullptr : from.Get(), destination == nullptr ? nullptr : to.Get());
+        (library.*Function)(source == nullptr ? nullptr : from.Get(), destination == nullptr ? nullptr : to.Get());
     Say(Hex(HRESULT{result}) + " \"" + to.Bytes() + "\"");
 }
 
@@ -155,7 +155,7 @@ void AddMemory(Cases& cases) {
     AddExport(
         cases, "SysAllocStringLen", {"text", "length"},
         [](const OLECHAR* text, unsigned length) {
-            BSTR const string = library.SysAllocStringLen(text, length);
+            OLECHAR* const string = library.SysAllocStringLen(text, length);
             Say(string == nullptr ? "null" : "length " + std::to_string(library.SysStringLen(string)));
             library.SysFreeString(string);
         },

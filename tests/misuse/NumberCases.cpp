@@ -123,7 +123,7 @@ void SayBlock(void* block) {
 }
 
 void SayString(unsigned length) {
-    BSTR const string = library.SysAllocStringLen(nullptr, length);
+    OLECHAR* const string = library.SysAllocStringLen(nullptr, length);
     Say(string == nullptr ? "null" : "length " + std::to_string(library.SysStringLen(string)));
     library.SysFreeString(string);
 }
@@ -144,9 +144,14 @@ void Reallocate(size_t size) {
 }
 
 void AddMemory(Cases& cases) {
-    for (const auto& [name, size] : {std::pair{"00000000", size_t{0}}, {"00000001", size_t{1}}, {"max", SIZE_MAX}}) {
-        cases[std::string("CoTaskMemAlloc size=") + name] = {[size] { SayBlock(library.CoTaskMemAlloc(size)); }};
-        cases[std::string("CoTaskMemRealloc size=") + name] = {[size] { Reallocate(size); }};
+    struct Size {
+        const char* name;
+        size_t value;
+    };
+    for (const Size& size : {Size{"00000000", 0}, Size{"00000001", 1}, Size{"max", SIZE_MAX}}) {
+        cases[std::string("CoTaskMemAlloc size=") + size.name] = {
+            [value = size.value] { SayBlock(library.CoTaskMemAlloc(value)); }};
+        cases[std::string("CoTaskMemRealloc size=") + size.name] = {[value = size.value] { Reallocate(value); }};
     }
     for (const ULONG length : {0U, 1U, 0x80000000U, 0xFFFFFFFFU}) {
         cases["SysAllocStringLen length=" + Hex(ULONG{length})] = {[length] { SayString(unsigned{length}); }};
