@@ -60,7 +60,7 @@ bool ChangeDispatch::EndPass(Step& step) const {
             node.attachments->observers.Sweep();
         }
     }
-    node.pendingChanges = static_cast<uint16_t>(node.pendingChanges | step.saved);
+    node.pendingChanges |= step.saved;
     node.suspendCount = step.wasSuspended ? 1 : 0;
     if (node.attachments) {
         node.attachments->observers.SetNotifying(step.outer != nullptr);
@@ -82,7 +82,7 @@ void ChangeDispatch::RaiseInTurn(ResTreeNode& node, uint32_t changes) {
     if (node.attachments && node.attachments->dispatch == this) {
         return;
     }
-    node.pendingChanges = static_cast<uint16_t>(node.pendingChanges | changes);
+    node.pendingChanges |= changes;
     if (node.suspendCount == 0) {
         Open(node, allChanges);
     }

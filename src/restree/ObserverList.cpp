@@ -119,8 +119,16 @@ ObserverRecord* ObserverList::FindPresent(const ResTreeNodeChangeObserver* obser
     return Find(observer, context, false);
 }
 
+// The ChangeFlags of `mask`, and one more bit for all others: a host may raise and ask for what nobody else does.
+constexpr uint32_t ObserverList::Counted(uint32_t mask) noexcept {
+    static_assert(NodeDeleting == 1U << (flagCount - 1), "the last flag");
+    constexpr uint32_t others = 1U << flagCount;
+    return mask < others ? mask : (mask & (others - 1)) | others;
+}
+
 bool ObserverList::HasActive(uint32_t mask) const noexcept {
-    for (size_t flag = 0; flag < flagCount; ++flag) {
+    mask = Counted(mask);
+    for (size_t flag = 0; flag < active.size(); ++flag) {
         if ((mask >> flag & 1) != 0 && active[flag] != 0) {
             return true;
         }
@@ -148,8 +156,8 @@ const ObserverRecord* ObserverList::NextActive(size_t& place, uint32_t mask) con
 // --- Changes ---
 
 void ObserverList::CountFlags(uint32_t mask, bool isMore) noexcept {
-    static_assert(NodeDeleting == 1U << (flagCount - 1), "the last flag");
-    for (size_t flag = 0; flag < flagCount; ++flag) {
+    mask = Counted(mask);
+    for (size_t flag = 0; flag < active.size(); ++flag) {
         if ((mask >> flag & 1) != 0) {
             active[flag] = isMore ? active[flag] + 1 : active[flag] - 1;
         }

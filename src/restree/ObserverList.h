@@ -65,7 +65,8 @@ class ObserverList {
     ObserverRecord* FindActive(const ResTreeNodeChangeObserver* observer, int32_t context);
     ObserverRecord* FindPresent(const ResTreeNodeChangeObserver* observer, int32_t context);
 
-    // True if an active record holds one of `mask`, which are ChangeFlags. Takes the same time for any number.
+    // True if an active record holds one of `mask`. Bits that are no ChangeFlags are looked at as one: then true also
+    // if a record holds another of those. Takes the same time for any number.
     bool HasActive(uint32_t mask) const noexcept;
 
     // The next active record at `place` or behind it that holds one of `mask`; `place` is then behind it. Null if there
@@ -92,6 +93,7 @@ class ObserverList {
     // Up to so many records the list is searched from the front.
     static constexpr size_t shortLimit = 16;
     static constexpr size_t flagCount = 11;
+    static constexpr uint32_t Counted(uint32_t mask) noexcept;
 
     size_t PlaceOf(uint64_t serial) const noexcept;
     ObserverRecord* Find(const ResTreeNodeChangeObserver* observer, int32_t context, bool onlyActive);
@@ -103,10 +105,11 @@ class ObserverList {
     std::vector<ObserverRecord> records;
     std::unique_ptr<Index> index;  // Null while the list is short, and if there was no memory for one.
     uint64_t nextSerial = 0;
-    size_t firstAdded = 0;                        // No record in front of this place is in the state Added.
-    uint32_t markedCount = 0;                     // Removed during a dispatch that has not been swept.
-    uint32_t emptyCount = 0;                      // Removed otherwise, and the place is still to be closed up.
-    std::array<uint32_t, flagCount> active = {};  // How many active records hold each flag.
+    size_t firstAdded = 0;     // No record in front of this place is in the state Added.
+    uint32_t markedCount = 0;  // Removed during a dispatch that has not been swept.
+    uint32_t emptyCount = 0;   // Removed otherwise, and the place is still to be closed up.
+    // How many active records hold each flag, and how many a bit that is none.
+    std::array<uint32_t, flagCount + 1> active = {};
     bool notifying = false;
 };
 

@@ -422,8 +422,8 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     ResTreeNode* parent;  // Null for a root and a detached clone.
     EntryList entries;
     std::unique_ptr<Attachments> attachments;  // What few nodes have: a type table, observers.
-    uint32_t suspendCount = 0;                 // Nonzero while delivery is held back.
-    uint16_t pendingChanges = 0;               // ChangeFlags raised and not yet delivered.
+    uint32_t pendingChanges = 0;               // Raised and not yet delivered: ChangeFlags, and what a host adds.
+    uint32_t suspendCount : 29 = 0;            // Nonzero while delivery is held back. Shares a word with what follows.
     bool isDefunct : 1 = false;                // Torn down; only the memory is left (ReleaseScope).
     bool isKept : 1 = false;                   // Has left its tree, whole or torn down, and is kept by a ReleaseScope.
     bool mayBeDeferred : 1 = false;            // Here or below there is, or has been, an entry ":DeferredLoadPath".

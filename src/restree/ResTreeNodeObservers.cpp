@@ -38,7 +38,7 @@ uint32_t ResTreeNode::BeginChanges() {
 }
 
 void ResTreeNode::EndChanges(uint32_t saved, bool replace) {
-    pendingChanges = static_cast<uint16_t>(replace ? saved : pendingChanges | saved);
+    pendingChanges = replace ? saved : pendingChanges | saved;
     if (--suspendCount == 0) {
         DispatchChanges(allChanges);
     }
@@ -46,7 +46,7 @@ void ResTreeNode::EndChanges(uint32_t saved, bool replace) {
 
 void ResTreeNode::DispatchChanges(uint32_t mask) {
     if (suspendCount == 0 && (!attachments || attachments->observers.IsEmpty())) {
-        pendingChanges = static_cast<uint16_t>(pendingChanges & ~mask);
+        pendingChanges &= ~mask;
         return;
     }
     ChangeDispatch::Run(*this, mask);
@@ -56,7 +56,7 @@ void ResTreeNode::RaiseObserved(uint32_t changes) {
     if (isDefunct) {
         return;
     }
-    pendingChanges = static_cast<uint16_t>(pendingChanges | changes);
+    pendingChanges |= changes;
     if (suspendCount == 0) {
         DispatchChanges(allChanges);
     }

@@ -1,5 +1,7 @@
 // Fragments read into a node, entries removed, and notices held back.
 
+#include <vector>
+
 #include <gtest/gtest.h>
 
 #include "interfaces/support/NodeViewTest.h"
@@ -200,6 +202,39 @@ TEST_F(NodeNotices, EndChangeAddsItsFlags) {
     view->SetProperty(In(u"k"), In(u"1"));
     view->EndChange(ChildAdded, 0);
     EXPECT_EQ(log.Take(), "host: N PropertyChanged|ChildAdded #7\n");
+}
+
+// All 32 bits travel, also those that say nothing yet.
+TEST_F(NodeNotices, FlagsWithoutANameWaitAndAreHandedOut) {
+    Begin();
+    Begin();
+    view->EndChange(0x80010000, 1);
+    EXPECT_EQ(view->HasPendingChanges(), S_OK);
+    EXPECT_EQ(Begin(), "S_OK 2147549184");
+    EXPECT_EQ(view->HasPendingChanges(), S_FALSE);
+    view->EndChange(0, 0);
+    view->EndChange(0, 0);
+    EXPECT_EQ(log.Take(), "");
+}
+
+TEST_F(NodeNotices, FlagsWithoutANameReachThoseWhoAskForThem) {
+    struct Listener : ResTreeNodeChangeObserver {
+        void OnNodeChanged(ResTreeNode*, uint32_t changes, int32_t) override { heard.push_back(changes); }
+        std::vector<uint32_t> heard;
+    };
+    Listener high;
+    Listener other;
+    node->AddObserver(&high, 0x80000000, 8);
+    node->AddObserver(&other, 0x10000, 9);
+    Begin();
+    view->EndChange(0x80000000, 0);
+    EXPECT_EQ(high.heard, std::vector<uint32_t>{0x80000000});
+    EXPECT_EQ(other.heard, std::vector<uint32_t>{});
+    node->RemoveObserver(&high, 8, false);
+    Begin();
+    view->EndChange(0x80000000, 0);
+    EXPECT_EQ(high.heard, std::vector<uint32_t>{0x80000000});
+    node->RemoveObserver(&other, 9, false);
 }
 
 TEST_F(NodeNotices, EndChangeWithReplaceForgetsWhatWasRaised) {
