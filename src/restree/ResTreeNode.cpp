@@ -50,6 +50,9 @@ ResTreeNode::ResTreeNode(std::u16string_view name, std::u16string_view type, boo
     }
 }
 
+// Any further field costs a tree 8 bytes a node.
+static_assert(sizeof(void*) != 8 || sizeof(ResTreeNode) == 96);
+
 void* ResTreeNode::operator new(size_t size) {
     if (void* memory = qn::dsc::osdep::TaskMemAlloc(size)) {
         return memory;
