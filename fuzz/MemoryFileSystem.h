@@ -134,6 +134,8 @@ class MemoryFileSystem : public qn::dsc::osdep::FileSystem {
         return 0;
     }
 
+    int CutFile(qn::dsc::osdep::FileHandle, uint64_t) override { return EACCES; }
+
     int CloseFile(qn::dsc::osdep::FileHandle) override { return 0; }
 
     int ReadWorkingFolder(String& path) override {

@@ -14,6 +14,8 @@ ERRORS = {
     "read": ["EIO", "EINTR", "ENOMEM", "ESTALE"],
     "pread64": ["EIO"],
     "write": ["EIO", "ENOSPC", "EDQUOT", "EFBIG", "EINTR", "ENOMEM"],
+    "ftruncate": ["EIO", "EINTR", "EPERM", "ENOSPC"],
+    "lseek": ["ESPIPE"],
     "close": ["EIO", "EINTR", "ENOSPC"],
     "getdents64": ["EIO", "ENOENT", "EINTR", "ENOMEM"],
     "newfstatat": ["EACCES", "EIO", "ENOENT", "ELOOP", "ENOMEM"],

@@ -67,6 +67,11 @@ def Contents(copy):
     return FILES[COPIES[copy]]
 
 
+def OldCopy(copy):
+    """What an earlier run has left: of one menu the beginning is as it should be, of one nothing, of one all."""
+    return {"a.menu": Contents(copy)[:BLOCK] + OLD, "b.menu": OLD, "c.menu": Contents(copy)}[copy.rpartition("/")[2]]
+
+
 def TargetBlock(name, path, ids, subtype):
     lines = [("DeviceCategory", ""), ("EIOItemIconName", "fpga\\IO.png"), ("EIOItemTypeName", "FPGA I/O"),
              ("FPGAItemSubType", subtype), ("SupportedFPGAHostList", ""), ("TargetClass", f"COM.QN.FPGA.{name}"),
@@ -102,7 +107,7 @@ def ExpectedCache(missing=(), pathsFrom="", ids="1,2", subtype="Board"):
 
 class Installation:
     """The files above in a new folder that goes when this does. With `used`, an earlier run has left old bytes in the
-    places of the cache and of the copies."""
+    places of the cache and of the copies (OldCopy)."""
 
     def __init__(self, used=False, parent=None, oldCache=OLD):
         self.oldCache = oldCache
@@ -128,7 +133,7 @@ class Installation:
 
     def Prior(self):
         """Output file -> the bytes that stand there before a run; None where nothing does."""
-        olds = {CACHE: self.oldCache, **dict.fromkeys(COPIES, OLD)}
+        olds = {CACHE: self.oldCache, **{copy: OldCopy(copy) for copy in COPIES}}
         return olds if self.used else dict.fromkeys(olds)
 
     def Reset(self):

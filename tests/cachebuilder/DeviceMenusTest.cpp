@@ -370,6 +370,16 @@ TEST_F(DeviceMenus, FullDiskThrows) {
     EXPECT_EQ(scope.Files().OpenFiles(), 0);
 }
 
+TEST_F(DeviceMenus, OldMenuThatCannotBeOverwrittenThrows) {
+    Load(deviceSpecs);
+    AddTarget("A", "virtex5");
+    installation.Root().WriteFile(Installation::Below("A/menu.txt"), "an old menu");
+    ExecutableScope scope(installation, toolPath);
+    scope.Files().Fail(FileCall::CutFile, 1, EIO);
+    EXPECT_THROW(InstallDeviceMenus(*root), qn::dsc::exception::FileWriteFailed);
+    EXPECT_EQ(scope.Files().OpenFiles(), 0);
+}
+
 TEST_F(DeviceMenus, UnreadableMenuThrows) {
     Load(deviceSpecs);
     AddTarget("A", "virtex5");

@@ -198,10 +198,11 @@ TEST(ToolFileFailures, NoSingleFailureEndsInAnythingElse) {
     const uint64_t total = installation.files.Count(FileCall::Any);
     const uint64_t readsBefore = installation.files.Count(FileCall::ReadBytes);
     ASSERT_GT(readsBefore, 0U);
-    for (const FileCall call : {FileCall::ReadAttributes, FileCall::ReadIdentity, FileCall::BeginSearch,
-                                FileCall::NextName, FileCall::BeginWalk, FileCall::ListFolder, FileCall::EnterFolder,
-                                FileCall::MakeFolder, FileCall::OpenBinary, FileCall::OpenText, FileCall::WriteBytes,
-                                FileCall::CloseFile, FileCall::ReadWorkingFolder, FileCall::ReadExecutablePath}) {
+    for (const FileCall call :
+         {FileCall::ReadAttributes, FileCall::ReadIdentity, FileCall::BeginSearch, FileCall::NextName,
+          FileCall::BeginWalk, FileCall::ListFolder, FileCall::EnterFolder, FileCall::MakeFolder, FileCall::OpenBinary,
+          FileCall::OpenText, FileCall::WriteBytes, FileCall::CutFile, FileCall::CloseFile, FileCall::ReadWorkingFolder,
+          FileCall::ReadExecutablePath}) {
         for (const int error : {EACCES, EIO, EMFILE, ENOENT, ENOMEM}) {
             for (uint64_t nth = 1; nth <= total; ++nth) {
                 installation.RemoveOutput();

@@ -183,6 +183,11 @@ int FaultyFileSystem::WriteBytes(FileHandle file, const void* buffer, size_t cou
     return error != 0 ? error : inner.WriteBytes(file, buffer, std::min(count, transferLimit), put);
 }
 
+int FaultyFileSystem::CutFile(FileHandle file, uint64_t length) {
+    const int error = Enter(FileCall::CutFile, nullptr);
+    return error != 0 ? error : inner.CutFile(file, length);
+}
+
 int FaultyFileSystem::CloseFile(FileHandle file) {
     const int error = Enter(FileCall::CloseFile, nullptr);
     --openFiles;

@@ -40,6 +40,7 @@ enum class FileCall {
     OpenText,
     ReadBytes,
     WriteBytes,
+    CutFile,
     CloseFile,
     ReadWorkingFolder,
     ReadExecutablePath,
@@ -83,6 +84,7 @@ class FaultyFileSystem : public FileSystem {
     int OpenText(const String& path, TextMode mode, FileHandle& file) override;
     int ReadBytes(FileHandle file, void* buffer, size_t count, size_t& got) override;
     int WriteBytes(FileHandle file, const void* buffer, size_t count, size_t& put) override;
+    int CutFile(FileHandle file, uint64_t length) override;
     int CloseFile(FileHandle file) override;
     int ReadWorkingFolder(String& path) override;
     int ReadExecutablePath(String& path) override;

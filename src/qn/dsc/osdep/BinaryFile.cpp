@@ -54,6 +54,10 @@ int32_t BinaryFile::Write(const void* buffer, uint32_t count) {
     return static_cast<int32_t>(put);
 }
 
+bool BinaryFile::CutAt(uint64_t length) {
+    return IsOpen() && GetFileSystem().CutFile(file, length) == 0;
+}
+
 void BinaryFile::Close() {
     if (IsOpen()) {
         GetFileSystem().CloseFile(std::exchange(file, noFile));

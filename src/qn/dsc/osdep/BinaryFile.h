@@ -35,6 +35,10 @@ class BinaryFile {
     // is open. `count` above 2147483647 counts as that.
     int32_t Write(const void* buffer, uint32_t count);
 
+    // Makes the file `length` bytes long, and its write time the present; the next Read or Write is behind those bytes.
+    // False if that fails, as it does for a file that isn't open for writing.
+    bool CutAt(uint64_t length);
+
     // Does nothing if no file is open.
     void Close();
 

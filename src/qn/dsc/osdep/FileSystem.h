@@ -140,6 +140,9 @@ class FileSystem {
     virtual int ReadBytes(FileHandle file, void* buffer, size_t count, size_t& got) = 0;
     // `put` may be less than `count`.
     virtual int WriteBytes(FileHandle file, const void* buffer, size_t count, size_t& put) = 0;
+    // Makes a file that was opened for writing `length` bytes long, and its write time the present. The next byte is
+    // read or written behind those.
+    virtual int CutFile(FileHandle file, uint64_t length) = 0;
     // The handle is gone, whatever the result.
     virtual int CloseFile(FileHandle file) = 0;
 

@@ -139,6 +139,7 @@ class NativeFileSystem final : public FileSystem {
     int OpenText(const String& path, TextMode mode, FileHandle& file) override;
     int ReadBytes(FileHandle file, void* buffer, size_t count, size_t& got) override;
     int WriteBytes(FileHandle file, const void* buffer, size_t count, size_t& put) override;
+    int CutFile(FileHandle file, uint64_t length) override;
     int CloseFile(FileHandle file) override;
     int ReadWorkingFolder(String& path) override;
     int ReadExecutablePath(String& path) override;
@@ -267,6 +268,16 @@ int NativeFileSystem::WriteBytes(FileHandle file, const void* buffer, size_t cou
     }
     put = static_cast<size_t>(result);
     return 0;
+}
+
+int NativeFileSystem::CutFile(FileHandle file, uint64_t length) {
+    const auto end = static_cast<off_t>(length);
+    int result = 0;
+    do {
+        // Sets the write time also where the length stays as it is.
+        result = ftruncate(DescriptorOf(file), end);
+    } while (result != 0 && errno == EINTR);
+    return result != 0 || lseek(DescriptorOf(file), end, SEEK_SET) < 0 ? errno : 0;
 }
 
 int NativeFileSystem::CloseFile(FileHandle file) {

@@ -78,6 +78,7 @@ class NativeFileSystem final : public FileSystem {
     int OpenText(const String& path, TextMode mode, FileHandle& file) override;
     int ReadBytes(FileHandle file, void* buffer, size_t count, size_t& got) override;
     int WriteBytes(FileHandle file, const void* buffer, size_t count, size_t& put) override;
+    int CutFile(FileHandle file, uint64_t length) override;
     int CloseFile(FileHandle file) override;
     int ReadWorkingFolder(String& path) override;
     int ReadExecutablePath(String& path) override;
@@ -191,6 +192,19 @@ int NativeFileSystem::WriteBytes(FileHandle file, const void* buffer, size_t cou
     }
     put = static_cast<size_t>(result);
     return 0;
+}
+
+int NativeFileSystem::CutFile(FileHandle file, uint64_t length) {
+    const int descriptor = DescriptorOf(file);
+    const auto end = static_cast<int64_t>(length);
+    if (_chsize_s(descriptor, end) != 0 || _lseeki64(descriptor, end, SEEK_SET) < 0) {
+        return errno;
+    }
+    // A length that stays as it is doesn't count as a write.
+    FILETIME now;
+    GetSystemTimeAsFileTime(&now);
+    const auto handle = reinterpret_cast<HANDLE>(_get_osfhandle(descriptor));
+    return SetFileTime(handle, nullptr, nullptr, &now) != 0 ? 0 : LastErrno();
 }
 
 int NativeFileSystem::CloseFile(FileHandle file) {

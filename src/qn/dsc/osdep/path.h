@@ -53,9 +53,11 @@ bool IsExistingFile(const String& path);
 TimeStamp GetFileModificationTime(const String& path);
 
 // Copies the bytes of one file, in blocks of 4096. A file that stands at `destination` is overwritten or, if
-// `overwrite` is false, refused. Equal paths (by Compare): nothing is done. InvalidArgument: a path isn't absolute.
-// FileAlreadyExists: refused. PosixError: one of the two can't be opened. FileReadFailed, FileWriteFailed: the copy
-// broke off; what was written stays.
+// `overwrite` is false, refused. Overwriting begins at the first block that differs, so that a copy which is there
+// already is only read, and gets the present as its write time. At any moment `destination` holds its old bytes or a
+// beginning of the new ones. Equal paths (by Compare), and two names of one file: the bytes stay. InvalidArgument: a
+// path isn't absolute. FileAlreadyExists: refused. PosixError: one of the two can't be opened. FileReadFailed,
+// FileWriteFailed: the copy broke off, at the end of what `destination` then holds.
 void CopyFileTo(const String& source, const String& destination, bool overwrite);
 
 // Creates the folders of `path` that are missing, from the top. What stands behind the last backslash is not created.

@@ -227,6 +227,44 @@ TEST(BinaryFile, AShortWriteTellsWhatWasTaken) {
     EXPECT_EQ(folder.ReadFile("file"), "ab");
 }
 
+TEST(BinaryFile, IsCutToALength) {
+    const TemporaryFolder folder;
+    folder.WriteFile("file", "abcdef");
+    BinaryFile file(folder.System(u"file"), BinaryMode::ReadWrite);
+    EXPECT_TRUE(file.CutAt(2));
+    EXPECT_EQ(folder.ReadFile("file"), "ab");
+}
+
+TEST(BinaryFile, GoesOnBehindWhatACutLeaves) {
+    const TemporaryFolder folder;
+    folder.WriteFile("file", "abcdef");
+    BinaryFile file(folder.System(u"file"), BinaryMode::ReadWrite);
+    char bytes[5];
+    EXPECT_EQ(file.Read(bytes, 5), 5);
+    EXPECT_TRUE(file.CutAt(2));
+    EXPECT_EQ(file.Read(bytes, 5), 0);
+    EXPECT_EQ(file.Write("x", 1), 1);
+    EXPECT_EQ(folder.ReadFile("file"), "abx");
+}
+
+TEST(BinaryFile, ACutBehindTheEndFillsUpWithZeroes) {
+    const TemporaryFolder folder;
+    folder.WriteFile("file", "ab");
+    BinaryFile file(folder.System(u"file"), BinaryMode::ReadWrite);
+    EXPECT_TRUE(file.CutAt(4));
+    EXPECT_EQ(folder.ReadFile("file"), std::string("ab\0\0", 4));
+}
+
+TEST(BinaryFile, OnlyWhatIsOpenForWritingIsCut) {
+    const TemporaryFolder folder;
+    folder.WriteFile("file", "abc");
+    BinaryFile file(folder.System(u"file"), BinaryMode::Read);
+    EXPECT_FALSE(file.CutAt(1));
+    file.Close();
+    EXPECT_FALSE(file.CutAt(1));
+    EXPECT_EQ(folder.ReadFile("file"), "abc");
+}
+
 TEST(BinaryFile, AFolderIsNotOpened) {
     const TemporaryFolder folder;
     folder.MakeFolder("folder");

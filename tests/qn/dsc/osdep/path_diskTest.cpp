@@ -315,7 +315,8 @@ TEST(CopyFileTo, AFailedReadIsReported) {
     folder.WriteFile("from", std::string(10000, 'x'));
     FaultyFileSystem files;
     const FileSystemScope scope(files);
-    files.Fail(FileCall::ReadBytes, 2, EIO);
+    // The second read is that of the destination, which has nothing.
+    files.Fail(FileCall::ReadBytes, 3, EIO);
     EXPECT_THROW(CopyFileTo(folder.System(u"from"), folder.System(u"to"), true), exception::FileReadFailed);
     EXPECT_EQ(folder.ReadFile("to").size(), 4096u);
     EXPECT_EQ(files.OpenFiles(), 0);
@@ -355,9 +356,127 @@ TEST(CopyFileTo, ReadsBlocksOf4096AndWritesEachAtOnce) {
     FaultyFileSystem files;
     const FileSystemScope scope(files);
     CopyFileTo(folder.System(u"from"), folder.System(u"to"), true);
-    EXPECT_EQ(files.Count(FileCall::ReadBytes), 4u);
+    // Four of the source, and one of the destination.
+    EXPECT_EQ(files.Count(FileCall::ReadBytes), 5u);
     EXPECT_EQ(files.Count(FileCall::WriteBytes), 3u);
+    EXPECT_EQ(files.Count(FileCall::CutFile), 0u);
     EXPECT_EQ(files.Count(FileCall::CloseFile), 2u);
+}
+
+TEST(CopyFileTo, ACopyThatIsThereIsOnlyRead) {
+    const TemporaryFolder folder;
+    const std::string bytes = std::string(4096, 'a') + std::string(100, 'b');
+    folder.WriteFile("from", bytes);
+    folder.WriteFile("to", bytes);
+    FaultyFileSystem files;
+    const FileSystemScope scope(files);
+    CopyFileTo(folder.System(u"from"), folder.System(u"to"), true);
+    EXPECT_EQ(files.Count(FileCall::WriteBytes), 0u);
+    EXPECT_EQ(folder.ReadFile("to"), bytes);
+}
+
+TEST(CopyFileTo, ACopyThatIsThereIsWrittenAtPresent) {
+    const TemporaryFolder folder;
+    folder.WriteFile("from", "same");
+    folder.WriteFile("to", "same");
+    folder.WriteFile("clock", "");
+    folder.SetFileTime("from", 1000000000, 0);
+    folder.SetFileTime("to", 1000000000, 0);
+    CopyFileTo(folder.System(u"from"), folder.System(u"to"), true);
+    // A file system may keep only every second one.
+    const int64_t present = GetFileModificationTime(folder.System(u"clock")).seconds;
+    EXPECT_GE(GetFileModificationTime(folder.System(u"to")).seconds, present - 2);
+    EXPECT_LT(GetFileModificationTime(folder.System(u"from")).seconds, present - 2);
+}
+
+TEST(CopyFileTo, OverwritesFromTheFirstBlockThatDiffers) {
+    const TemporaryFolder folder;
+    const std::string same(4096, 'a');
+    folder.WriteFile("from", same + std::string(4096, 'b') + std::string(10, 'c'));
+    folder.WriteFile("to", same + std::string(4095, 'b') + std::string(5000, 'x'));
+    FaultyFileSystem files;
+    const FileSystemScope scope(files);
+    CopyFileTo(folder.System(u"from"), folder.System(u"to"), true);
+    EXPECT_EQ(files.Count(FileCall::WriteBytes), 2u);
+    EXPECT_EQ(folder.ReadFile("to"), folder.ReadFile("from"));
+}
+
+TEST(CopyFileTo, ABeginningOfTheFileIsContinued) {
+    const TemporaryFolder folder;
+    const std::string bytes = std::string(4096, 'a') + std::string(4096, 'b') + "c";
+    folder.WriteFile("from", bytes);
+    for (const size_t size : {size_t{0}, size_t{1}, size_t{4095}, size_t{4096}, size_t{4097}, size_t{8192}}) {
+        folder.WriteFile("to", bytes.substr(0, size));
+        CopyFileTo(folder.System(u"from"), folder.System(u"to"), true);
+        EXPECT_EQ(folder.ReadFile("to"), bytes) << size;
+    }
+}
+
+TEST(CopyFileTo, WhatTheFileIsABeginningOfIsCut) {
+    const TemporaryFolder folder;
+    const std::string bytes = std::string(4096, 'a') + std::string(4096, 'b') + "c";
+    folder.WriteFile("to", bytes);
+    for (const size_t size : {size_t{8192}, size_t{4097}, size_t{4096}, size_t{4095}, size_t{1}, size_t{0}}) {
+        folder.WriteFile("from", bytes.substr(0, size));
+        CopyFileTo(folder.System(u"from"), folder.System(u"to"), true);
+        EXPECT_EQ(folder.ReadFile("to"), bytes.substr(0, size));
+    }
+}
+
+TEST(CopyFileTo, ShortReadsOfWhatStandsAreNoDifference) {
+    const TemporaryFolder folder;
+    folder.WriteFile("from", std::string(10000, 'x'));
+    folder.WriteFile("to", std::string(10000, 'x'));
+    FaultyFileSystem files;
+    const FileSystemScope scope(files);
+    files.LimitTransfer(999);
+    CopyFileTo(folder.System(u"from"), folder.System(u"to"), true);
+    EXPECT_EQ(files.Count(FileCall::WriteBytes), 0u);
+    EXPECT_EQ(folder.ReadFile("to").size(), 10000u);
+}
+
+TEST(CopyFileTo, AFileIsNotLostToAnotherNameOfIt) {
+    const TemporaryFolder folder;
+    folder.WriteFile("file", "abc");
+    folder.MakeLink("file", "other");
+    CopyFileTo(folder.System(u"file"), folder.System(u"other"), true);
+    CopyFileTo(folder.System(u"other"), folder.System(u"file"), true);
+    EXPECT_EQ(folder.ReadFile("file"), "abc");
+}
+
+TEST(CopyFileTo, WhatStandsAndCannotBeReadIsWrittenAnew) {
+    const TemporaryFolder folder;
+    folder.WriteFile("from", "abc");
+    folder.WriteFile("to", "abc");
+    FaultyFileSystem files;
+    const FileSystemScope scope(files);
+    files.Fail(FileCall::ReadBytes, 2, EIO);
+    CopyFileTo(folder.System(u"from"), folder.System(u"to"), true);
+    EXPECT_EQ(files.Count(FileCall::WriteBytes), 1u);
+    EXPECT_EQ(folder.ReadFile("to"), "abc");
+}
+
+TEST(CopyFileTo, WhatCannotBeCutIsReportedAndStays) {
+    const TemporaryFolder folder;
+    folder.WriteFile("from", "new");
+    folder.WriteFile("to", "old and longer");
+    FaultyFileSystem files;
+    const FileSystemScope scope(files);
+    files.Fail(FileCall::CutFile, 1, EIO);
+    EXPECT_THROW(CopyFileTo(folder.System(u"from"), folder.System(u"to"), true), exception::FileWriteFailed);
+    EXPECT_EQ(folder.ReadFile("to"), "old and longer");
+    EXPECT_EQ(files.OpenFiles(), 0);
+}
+
+TEST(CopyFileTo, AReadThatFailsAmongWhatIsAlikeEndsTheCopyThere) {
+    const TemporaryFolder folder;
+    folder.WriteFile("from", std::string(10000, 'x'));
+    folder.WriteFile("to", std::string(10000, 'x'));
+    FaultyFileSystem files;
+    const FileSystemScope scope(files);
+    files.Fail(FileCall::ReadBytes, 3, EIO);
+    EXPECT_THROW(CopyFileTo(folder.System(u"from"), folder.System(u"to"), true), exception::FileReadFailed);
+    EXPECT_EQ(folder.ReadFile("to").size(), 4096u);
 }
 
 TEST(CopyFileTo, ShortReadsAreNoEnd) {
