@@ -2,11 +2,9 @@
 
 namespace qn::dsc::osdep {
 
-namespace detail {
-std::atomic<bool> allocationFaultSet = false;
-}
-
 namespace {
+
+constexpr size_t usualLimit = maximumFineSize + 1;
 
 std::atomic<uint64_t> allocationCount = 0;
 uint64_t failingAllocation = 0;
@@ -14,15 +12,19 @@ bool failsFromThenOn = false;
 
 }  // namespace
 
+namespace detail {
+std::atomic<size_t> quickSizeLimit = usualLimit;
+}
+
 void FailAllocation(uint64_t nth, bool fromThenOn) {
     allocationCount = 0;
     failingAllocation = nth;
     failsFromThenOn = fromThenOn;
-    detail::allocationFaultSet = true;
+    detail::quickSizeLimit = 0;
 }
 
 void ClearAllocationFault() {
-    detail::allocationFaultSet = false;
+    detail::quickSizeLimit = usualLimit;
 }
 
 uint64_t AllocationCount() {

@@ -10,7 +10,8 @@
 
 namespace qn::dsc::osdep {
 
-constinit thread_local PoolAllocator::ThreadCache* PoolAllocator::currentCache = nullptr;
+constinit PoolAllocator::ThreadCache PoolAllocator::emptyCache;
+constinit thread_local PoolAllocator::ThreadCache* PoolAllocator::currentCache = &emptyCache;
 PoolAllocator::RegionBits PoolAllocator::regionBits;
 
 namespace {
@@ -189,7 +190,7 @@ struct PoolAllocator::ThreadEnd {
 
     ~ThreadEnd() {
         ThreadCache* cache = currentCache;
-        currentCache = nullptr;
+        currentCache = &emptyCache;
         isThreadEnding = true;
         Store& store = Store::store;
         const std::lock_guard lock(store.mutex);
@@ -202,18 +203,23 @@ struct PoolAllocator::ThreadEnd {
 };
 
 PoolAllocator::ThreadCache* PoolAllocator::Store::CacheOfThread() {
-    if (currentCache != nullptr || isThreadEnding) {
+    if (currentCache != &emptyCache) {
         return currentCache;
     }
+    if (isThreadEnding) {
+        return nullptr;
+    }
+    ThreadCache* cache = nullptr;
     {
         const std::lock_guard lock(mutex);
-        currentCache = NewCache();
+        cache = NewCache();
     }
-    if (currentCache != nullptr) {
+    if (cache != nullptr) {
+        currentCache = cache;
         static thread_local const ThreadEnd threadEnd;
         static_cast<void>(threadEnd);
     }
-    return currentCache;
+    return cache;
 }
 
 void* PoolAllocator::AllocateSlowly(size_t size) {

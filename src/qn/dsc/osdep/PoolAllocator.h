@@ -84,8 +84,9 @@ class PoolAllocator {
         return RegionOf(block)->spanClasses[(reinterpret_cast<uintptr_t>(block) >> spanShift) % spansPerRegion];
     }
 
-    // A block that `cache` has; null if it has none.
-    static void* TakeBlock(ClassCache& cache) {
+    // A block that `cache` has; what `getMore` gives if it has none.
+    template <typename GetMore>
+    static void* TakeBlock(ClassCache& cache, GetMore getMore) {
         if (FreeBlock* block = cache.freeBlocks; block != nullptr) {
             cache.freeBlocks = block->next;
             ++cache.room;
@@ -96,7 +97,10 @@ class PoolAllocator {
             cache.fresh += cache.blockSize;
             return block;
         }
-        return nullptr;
+        return getMore();
+    }
+    static void* TakeBlock(ClassCache& cache) {
+        return TakeBlock(cache, [] { return nullptr; });
     }
 
     static void PutBlock(ClassCache& cache, void* memory) {
@@ -106,14 +110,18 @@ class PoolAllocator {
         --cache.room;
     }
 
+    static void* AllocateFine(size_t size);
     static void* AllocateUncounted(size_t size);
     static void* AllocateCounted(size_t size);
     static void* AllocateSlowly(size_t size);
     static void FreeSlowly(void* block);
 
-    // The calling thread's cache; null before its first use and after its end. Read on every call, so it must not cost
-    // a call itself: hence the model, which suits a library that is loaded late too, since it is one pointer.
+    // The calling thread's cache; emptyCache before its first use and after its end. Read on every call, so it must not
+    // cost a call itself: hence the model, which suits a library that is loaded late too, since it is one pointer.
     [[gnu::tls_model("initial-exec")]] static constinit thread_local ThreadCache* currentCache;
+
+    // Has no blocks and no room for any, and so sends every call the slow way. Never written.
+    static ThreadCache emptyCache;
 
     // One bit for each place where a region can be: set if there is one. 4 MB, but only the pages that stand for
     // addresses in use are ever touched. Accessed atomically.
@@ -121,31 +129,29 @@ class PoolAllocator {
     static RegionBits regionBits;
 };
 
+// `size` is one of the fine classes.
+inline void* PoolAllocator::AllocateFine(size_t size) {
+    return TakeBlock(currentCache->classes[detail::fineClasses[(size + 7) / 8]], [size] { return AllocateSlowly(size); });
+}
+
 inline void* PoolAllocator::AllocateUncounted(size_t size) {
-    ThreadCache* cache = currentCache;
-    if (cache == nullptr || size > maximumFineSize) [[unlikely]] {
-        return AllocateSlowly(size);
-    }
-    const uint32_t sizeClass = SizeClassOf(size);
-    void* block = TakeBlock(cache->classes[sizeClass]);
-    return block != nullptr ? block : AllocateSlowly(size);
+    return size <= maximumFineSize ? AllocateFine(size) : AllocateSlowly(size);
 }
 
 inline void* PoolAllocator::Allocate(size_t size) {
-    if (IsAllocationFaultSet()) [[unlikely]] {
+    if (!IsQuickAllocation(size)) [[unlikely]] {
         return AllocateCounted(size);
     }
-    return AllocateUncounted(size);
+    return AllocateFine(size);
 }
 
 inline void PoolAllocator::Free(void* block) {
     // Null belongs to no region.
-    ThreadCache* cache = currentCache;
-    if (cache == nullptr || !IsPooled(block)) [[unlikely]] {
+    if (!IsPooled(block)) [[unlikely]] {
         FreeSlowly(block);
         return;
     }
-    ClassCache& classCache = cache->classes[ClassOfBlock(block)];
+    ClassCache& classCache = currentCache->classes[ClassOfBlock(block)];
     if (classCache.room <= 0) [[unlikely]] {
         FreeSlowly(block);
         return;
