@@ -46,7 +46,8 @@ size_t FindKnownName(std::string_view name, bool isPlain) {
     if (isPlain) {
         const size_t length = std::min(name.size(), longestKnownName + 1);
         for (size_t i = firstOfLength[length]; i < knownNames.size() && knownNames[i].lowerCase.size() == length; ++i) {
-            if (EqualsWord(name, knownNames[i].lowerCase)) {
+            // Nearly all are spelled so.
+            if (name == knownNames[i].lowerCase || EqualsWord(name, knownNames[i].lowerCase)) {
                 return i;
             }
         }

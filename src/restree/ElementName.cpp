@@ -6,63 +6,41 @@
 namespace zkhw {
 
 void ElementName::Assign(std::string_view name) {
-    // Not assigned at a stroke: std::string allows for a part of itself there, which took a third of the time.
-    text.clear();
-    if (IsAscii(name)) {
-        text.append(name);
-        ClassifyAscii();
-    } else {
-        if (IsWidenable(name)) {
-            text.append(name);
-        }
-        ClassifyByCompare();
-    }
-}
-
-qn::dsc::String ElementName::Wide() const {
-    return Widen(text);
+    WidenInto(name, text);
+    // Only a text of ASCII has a unit for each byte.
+    const bool isAscii = text.Length() == name.size();
+    meanings = isAscii ? uint8_t{MeaningOfAscii(name)} : MeaningsByCompare();
 }
 
 // Hyphens and apostrophes count in an equality of ASCII texts, so letter by letter is enough here. The last letter
 // leaves one word at most.
-void ElementName::ClassifyAscii() {
-    isLink = false;
-    isInclude = false;
-    isReserves = false;
-    endsInPathOrDir = false;
-    endsInList = false;
-    switch (text.empty() ? '\0' : LowerAscii(text.back())) {
+ElementName::Meaning ElementName::MeaningOfAscii(std::string_view name) {
+    switch (name.empty() ? '\0' : LowerAscii(name.back())) {
         case 'k':
-            isLink = EqualsWord(text, ":link");
-            break;
+            return EqualsWord(name, ":link") ? Link : None;
         case 'e':
-            isInclude = EqualsWord(text, ":include");
-            break;
+            return EqualsWord(name, ":include") ? Include : None;
         case 's':
-            isReserves = EqualsWord(text, "reserves");
-            break;
+            return EqualsWord(name, "reserves") ? Reserves : None;
         case 'h':
-            endsInPathOrDir = EndsWithWord(text, "path");
-            break;
+            return EndsWithWord(name, "path") ? PathOrDir : None;
         case 'r':
-            endsInPathOrDir = EndsWithWord(text, "dir");
-            break;
+            return EndsWithWord(name, "dir") ? PathOrDir : None;
         case 't':
-            endsInList = EndsWithWord(text, "list");
-            break;
+            return EndsWithWord(name, "list") ? List : None;
         default:
-            break;
+            return None;
     }
 }
 
 // Other scripts have letters that equal ASCII ones but for their width, and signs that count for nothing.
-void ElementName::ClassifyByCompare() {
-    const qn::dsc::String wide = Wide();
-    isLink = wide == u":Link";
-    isInclude = wide == u":Include";
-    isReserves = wide == u"Reserves";
-    endsInPathOrDir = EndsWith(wide.View(), u"Path") || EndsWith(wide.View(), u"Dir");
-    endsInList = EndsWith(wide.View(), u"List");
+uint8_t ElementName::MeaningsByCompare() const {
+    uint32_t found = text == u":Link" ? Link : None;
+    found |= text == u":Include" ? Include : None;
+    found |= text == u"Reserves" ? Reserves : None;
+    found |= EndsWith(text.View(), u"Path") || EndsWith(text.View(), u"Dir") ? PathOrDir : None;
+    found |= EndsWith(text.View(), u"List") ? List : None;
+    return static_cast<uint8_t>(found);
 }
 
 }  // namespace zkhw

@@ -65,17 +65,16 @@ void ElementReader::FlushPendingElement(ElementMode mode, std::string_view nextN
     } else if (Attributes().Is(AttributeName::Type, u"xml")) {
         BeginXmlValue(std::move(entryName), nextName, nextAttributes);
     } else {
-        String elementName = frame.pendingName.Wide();
-        const bool isOrdered = IsNodeOrdered(elementName);
+        const bool isOrdered = IsNodeOrdered(frame.pendingName.Text());
         if (Attributes().Has(AttributeName::Replace)) {
             frame.mergeExisting = !Attributes().IsTrue(AttributeName::Replace);
         }
         if (!frame.rootTypeKnown) {
             // Its name stays pending in the frame, which sees no further start tag.
-            BindDocumentElement(std::move(entryName), std::move(elementName), isOrdered);
+            BindDocumentElement(std::move(entryName), String(frame.pendingName.Text()), isOrdered);
             stack.PushFrame(node, nextName, nextAttributes);
         } else {
-            ResTreeNode& child = MakeChild(std::move(entryName), std::move(elementName), isOrdered);
+            ResTreeNode& child = MakeChild(std::move(entryName), frame.pendingName.TakeText(), isOrdered);
             stack.NoteNode(child);
             frame.pendingName.Clear();
             if (mode == ElementMode::Container) {
@@ -97,7 +96,7 @@ void ElementReader::AppendTagToXmlValue() {
     }
     ++frame.xmlDepth;
     value->Append(u"<");
-    value->Append(frame.pendingName.Wide());
+    value->Append(frame.pendingName.Text());
     for (const auto& [key, text] : Attributes().InOrder()) {
         value->Append(u" ");
         value->Append(key);
@@ -134,7 +133,7 @@ String ElementReader::ChooseEntryName(ElementMode mode, bool& isNode) {
         return Attributes().Value(AttributeName::Name);
     }
     isNode = mode == ElementMode::Container || Attributes().Has(AttributeName::Prototype);
-    return isNode || frame.pendingName.IsLink() ? frame.pendingName.Wide() : String::WithoutBuffer();
+    return isNode || frame.pendingName.IsLink() ? frame.pendingName.Text() : String::WithoutBuffer();
 }
 
 const String* ElementReader::Before() {
@@ -254,7 +253,7 @@ void ElementReader::MakeOrdinaryValue(String&& text, bool isReferenceList) {
 }
 
 void ElementReader::StoreText(String&& text, EntryKind kind) {
-    const ResTreeNode::Added added = node.AddTextEntry(frame.pendingName.Wide(), std::move(text), kind, Before());
+    const ResTreeNode::Added added = node.AddTextEntry(frame.pendingName.TakeText(), std::move(text), kind, Before());
     frame.position = added.entry;
     // NOLINTNEXTLINE(bugprone-use-after-move): the text was taken only if an entry was made.
     if (!added.isNew && frame.mergeExisting && node.SetEntryText(added.entry, std::move(text)) &&
@@ -269,7 +268,7 @@ void ElementReader::MakeLink(String&& entryName, const String& text) {
         // It stays a dead text, even when the target is read later. The first one of a node stays.
         String dead(u"UNRESOLVED LINK: ");
         dead.Append(text);
-        frame.position = node.AddTextEntry(frame.pendingName.Wide(), std::move(dead), TextEntry, Before()).entry;
+        frame.position = node.AddTextEntry(frame.pendingName.TakeText(), std::move(dead), TextEntry, Before()).entry;
         return;
     }
     if (entryName == u":Link") {

@@ -22,12 +22,16 @@ inline bool IsWidenable(std::string_view text) {
            std::none_of(text.begin(), text.end(), [](char byte) { return static_cast<unsigned char>(byte) >= 0xF0; });
 }
 
-// The wide form; empty if the text is refused.
-inline qn::dsc::String Widen(std::string_view text) {
-    qn::dsc::String wide = qn::dsc::String::WithoutBuffer();
+// Makes `wide` the wide form; empty if the text is refused.
+inline void WidenInto(std::string_view text, qn::dsc::String& wide) {
     if (!qn::dsc::String::TryFromUtf8(text.data(), static_cast<uint32_t>(text.size()), wide)) {
         wide = qn::dsc::String();
     }
+}
+
+inline qn::dsc::String Widen(std::string_view text) {
+    qn::dsc::String wide = qn::dsc::String::WithoutBuffer();
+    WidenInto(text, wide);
     return wide;
 }
 

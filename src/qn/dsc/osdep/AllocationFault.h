@@ -1,7 +1,7 @@
 #pragma once
 
-// Lets a test make chosen task allocations fail. One switch for the process; off, it costs at most one predictable branch
-// for each allocation. Not for use while other threads allocate.
+// Lets a test make chosen task allocations fail. One switch for the process; off, it costs at most one predictable
+// branch for each allocation. Not for use while other threads allocate.
 
 #include <atomic>
 #include <cstddef>

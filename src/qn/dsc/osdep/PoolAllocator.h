@@ -131,7 +131,8 @@ class PoolAllocator {
 
 // `size` is one of the fine classes.
 inline void* PoolAllocator::AllocateFine(size_t size) {
-    return TakeBlock(currentCache->classes[detail::fineClasses[(size + 7) / 8]], [size] { return AllocateSlowly(size); });
+    return TakeBlock(currentCache->classes[detail::fineClasses[(size + 7) / 8]],
+                     [size] { return AllocateSlowly(size); });
 }
 
 inline void* PoolAllocator::AllocateUncounted(size_t size) {
