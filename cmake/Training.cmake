@@ -1,13 +1,15 @@
-# With ZKFPGA_TRAIN the compiler lays the code of the library out by what a run of the tool on the example installation
-# did: which branches are usual, what is called most and belongs together. For that the same sources are compiled twice,
-# first with counters in a build of their own, whose counts are then put beside the objects here. The two have to be
-# called alike within their builds, since GCC knows a function by the name of its object.
+# With ZKFPGA_TRAIN the compiler lays the code of the library out by what two runs of the tool did, on the example
+# installation and on a generated one of larger descriptions: which branches are usual, what is called most and belongs
+# together. For that the same sources are compiled twice, first with counters in a build of their own, whose counts are
+# then put beside the objects here. The two have to be called alike within their builds, since GCC knows a function by
+# the name of its object.
 include_guard()
 
 if(NOT CMAKE_CXX_COMPILER_ID STREQUAL "GNU" OR CMAKE_CROSSCOMPILING)
   message(FATAL_ERROR "ZKFPGA_TRAIN needs GCC and a tool that runs where it is built.")
 endif()
 
+find_package(Python3 REQUIRED COMPONENTS Interpreter)
 include(ExternalProject)
 set(training_folder ${CMAKE_BINARY_DIR}/training)
 set(training_stamp ${training_folder}/counts.txt)
@@ -30,19 +32,22 @@ ExternalProject_Add(zkfpga_counting
   INSTALL_COMMAND ""
   EXCLUDE_FROM_ALL ON)
 
+set(generator ${PROJECT_SOURCE_DIR}/bench/MakeInstallation.py)
 file(GLOB_RECURSE example_files CONFIGURE_DEPENDS ${PROJECT_SOURCE_DIR}/examples/installation/*)
 add_custom_command(
   OUTPUT ${training_stamp}
   COMMAND ${CMAKE_COMMAND}
     -D TOOL=${counting_tool}
     -D EXAMPLE=${PROJECT_SOURCE_DIR}/examples/installation
-    -D WORK=${training_folder}/installation
+    -D PYTHON=${Python3_EXECUTABLE}
+    -D GENERATOR=${generator}
+    -D WORK=${training_folder}/installations
     -D COUNTERS=${training_folder}/build/CMakeFiles/zkfpga.dir
     -D OBJECTS=${CMAKE_BINARY_DIR}/CMakeFiles/zkfpga.dir
     -D STAMP=${training_stamp}
     -P ${PROJECT_SOURCE_DIR}/cmake/Train.cmake
-  DEPENDS ${counting_tool} zkfpga_counting ${PROJECT_SOURCE_DIR}/cmake/Train.cmake ${example_files}
-  COMMENT "Running the tool on the example installation for its counts"
+  DEPENDS ${counting_tool} zkfpga_counting ${PROJECT_SOURCE_DIR}/cmake/Train.cmake ${generator} ${example_files}
+  COMMENT "Running the tool on two installations for its counts"
   VERBATIM)
 add_custom_target(zkfpga_train DEPENDS ${training_stamp})
 
