@@ -112,12 +112,9 @@ NodeEntry* EntryList::Find(HashedKey key) const {
     return ordered ? FindInIndex(key.text) : SearchSorted(key.text).entry;
 }
 
-// Keys that aren't plain have the hash 0 and may equal one of any hash.
 NodeEntry* EntryList::FindInArray(HashedKey key) const {
     for (uint32_t i = 0; i < count; ++i) {
-        const uint8_t hash = items[i]->KeyHash();
-        const bool mayBeEqual = hash == key.hash || hash == 0 || key.hash == 0;
-        if (mayBeEqual && Compare(items[i]->Key().View(), key.text) == 0) {
+        if (key.MayEqual(items[i]->KeyHash()) && Compare(items[i]->Key().View(), key.text) == 0) {
             return items[i];
         }
     }

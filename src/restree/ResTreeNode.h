@@ -408,7 +408,7 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     // Have to hear of each entry that comes in, and of each new key. A node above one with deferred contents knows of
     // them, so that who copies need not look for them.
     void NoteKey(const NodeEntry& entry) {
-        if (entry.KeyHash() == deferredPathKey.hash || entry.KeyHash() == 0) {
+        if (deferredPathKey.MayEqual(entry.KeyHash())) {
             NoteUnusualKey(entry);
         }
     }
