@@ -89,8 +89,9 @@ struct IUnknown {
     /* One reference more; gives the new count, for diagnosis only. */
     virtual ULONG STDMETHODCALLTYPE AddRef() = 0;
 
-    /* One reference less; gives the new count. At 0 the object is gone. More releases than references end the process
-     * (objects of this library trap). */
+    /* One reference less; gives the new count. At 0 the object is gone. More releases than references break the
+     * contract: an object of this library traps if it still stands; the memory of one that is gone may hold anything,
+     * and then nothing is certain. */
     virtual ULONG STDMETHODCALLTYPE Release() = 0;
 
   protected:

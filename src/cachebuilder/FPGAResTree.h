@@ -1,11 +1,11 @@
 #pragma once
 
-// The process-wide tree of FPGA targets: made from an installation's resource files, or from their cache.
+// The process-wide tree of FPGA targets: made from an installation's resource files, or from their cache. The one of
+// the process is that of gFPGAResTree (zkfpga/exports.h).
 
 #include <cstdint>
 
 #include "qn/dsc/StringBase.h"
-#include "qn/dsc/osdep/Export.h"
 #include "restree/ResTreeOwner.h"
 
 namespace zkhw {
@@ -41,7 +41,3 @@ class FPGAResTree : public ResTreeOwner {
 };
 
 }  // namespace zkhw
-
-// The one tree of the process, made at the first call; null if there is no memory for it. It is deleted at exit.
-// Not guarded against two threads.
-extern "C" ZKFPGA_EXPORT zkhw::FPGAResTree* gFPGAResTree();

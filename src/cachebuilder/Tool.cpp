@@ -7,6 +7,7 @@
 #include "qn/dsc/osdep/path.h"
 #include "restree/ResTreeNode.h"
 #include "restree/ResultCode.h"
+#include "zkfpga/exports.h"
 
 namespace zkhw {
 

@@ -75,13 +75,6 @@ void StoreFound(bool isFound, unsigned char* found) {
     }
 }
 
-// A handle that comes by value can't be given back: without one there is nowhere to store.
-void StoreText(const String& text, HostHandle handle) {
-    if (handle != nullptr) {
-        StoreInHostString(text, handle);
-    }
-}
-
 // Strings that are the caller's of this to free.
 class OwnedTexts {
   public:
@@ -166,7 +159,7 @@ HRESULT FPGAResTree_GetProperty(const char* basePath, const char* subPath, const
         return read;
     }
     StoreFound(read != S_FALSE, found);
-    StoreText(read != S_FALSE ? String(text.View()) : String(), value);
+    StoreInGivenHostString(read != S_FALSE ? String(text.View()) : String(), value);
     return S_OK;
 }
 
@@ -199,6 +192,6 @@ HRESULT FPGAResTree_Dump(const char* basePath, const char* subPath, const char* 
     if (FAILED(rendered)) {
         return rendered;
     }
-    StoreText(String(xml.View()), text);
+    StoreInGivenHostString(String(xml.View()), text);
     return S_OK;
 }

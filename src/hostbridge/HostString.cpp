@@ -53,6 +53,18 @@ void StoreInHostString(const char* bytes, uint32_t length, HostHandle& handle) {
     }
 }
 
+void StoreInGivenHostString(const String& text, HostHandle handle) {
+    if (handle != nullptr) {
+        StoreInHostString(text, handle);
+    }
+}
+
+void StoreInGivenHostString(const char* bytes, uint32_t length, HostHandle handle) {
+    if (handle != nullptr) {
+        StoreInHostString(bytes, length, handle);
+    }
+}
+
 void ClearHostString(HostHandle& handle) {
     StoreInHostString(nullptr, 0, handle);
 }

@@ -25,6 +25,11 @@ void StoreInHostString(const qn::dsc::NarrowString& text, HostHandle& handle);
 void StoreInHostString(const qn::dsc::String& text, HostHandle& handle);
 void StoreInHostString(const char* bytes, uint32_t length, HostHandle& handle);
 
+// The same for a handle that was handed over by value: a new string couldn't be given back, so that without one nothing
+// is stored, nor asked of the host.
+void StoreInGivenHostString(const qn::dsc::String& text, HostHandle handle);
+void StoreInGivenHostString(const char* bytes, uint32_t length, HostHandle handle);
+
 // Stores the empty string: a null handle becomes a string of length 0.
 void ClearHostString(HostHandle& handle);
 

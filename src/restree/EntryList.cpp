@@ -25,7 +25,7 @@ EntryList::~EntryList() {
 }
 
 void EntryList::ReleaseContainer() noexcept {
-    if (isLong) {
+    if (IsLong()) {
         delete longForm;
     } else {
         TaskMemFree(items);
@@ -33,12 +33,11 @@ void EntryList::ReleaseContainer() noexcept {
     items = nullptr;
     count = 0;
     capacity = 0;
-    isLong = false;
-    isSettled = true;
+    form = Form::Array;
 }
 
 void EntryList::Reset(bool newOrdered) noexcept {
-    if (isLong) {
+    if (IsLong()) {
         for (EntryPosition position = Begin(); !position.IsEnd(); position = Next(position)) {
             At(position)->pieceNumber = 0;
         }
@@ -48,7 +47,7 @@ void EntryList::Reset(bool newOrdered) noexcept {
 }
 
 EntryPosition EntryList::Last() const {
-    if (isLong) {
+    if (IsLong()) {
         return longForm->pieces.Last();
     }
     Settle();
@@ -67,11 +66,11 @@ uint32_t EntryList::IndexOf(EntryPosition position) const {
     if (position.IsEnd()) {
         return count;
     }
-    return isLong ? longForm->pieces.IndexOf(position) : position.slot;
+    return IsLong() ? longForm->pieces.IndexOf(position) : position.slot;
 }
 
 EntryPosition EntryList::AtIndex(uint32_t index) const {
-    if (isLong) {
+    if (IsLong()) {
         return longForm->pieces.AtIndex(index);
     }
     Settle();
@@ -79,7 +78,7 @@ EntryPosition EntryList::AtIndex(uint32_t index) const {
 }
 
 EntryPosition EntryList::Locate(const NodeEntry* entry) const {
-    if (isLong) {
+    if (IsLong()) {
         return longForm->pieces.Locate(entry);
     }
     Settle();
@@ -87,7 +86,7 @@ EntryPosition EntryList::Locate(const NodeEntry* entry) const {
 }
 
 bool EntryList::IsValid(EntryPosition position) const {
-    return isLong ? longForm->pieces.IsValid(position) : !position.IsEnd() && position.slot < count;
+    return IsLong() ? longForm->pieces.IsValid(position) : !position.IsEnd() && position.slot < count;
 }
 
 EntryPosition EntryList::FollowingMoved(EntryPosition position, const NodeEntry* entry) const {
@@ -96,7 +95,7 @@ EntryPosition EntryList::FollowingMoved(EntryPosition position, const NodeEntry*
     if (isValid && At(position) == entry) {
         return Next(position);
     }
-    if (isLong) {
+    if (IsLong()) {
         if (EntryPieces::IsMarked(entry)) {
             return Next(Locate(entry));
         }
@@ -107,18 +106,15 @@ EntryPosition EntryList::FollowingMoved(EntryPosition position, const NodeEntry*
 }
 
 NodeEntry* EntryList::Find(HashedKey key) const {
-    if (!isLong) {
+    if (!IsLong()) {
         return FindInArray(key);
     }
     return ordered ? FindInIndex(key.text) : SearchSorted(key.text).entry;
 }
 
-// Keys that aren't plain have the hash 0 and may equal one of any hash.
 NodeEntry* EntryList::FindInArray(HashedKey key) const {
     for (uint32_t i = 0; i < count; ++i) {
-        const uint8_t hash = items[i]->KeyHash();
-        const bool mayBeEqual = hash == key.hash || hash == 0 || key.hash == 0;
-        if (mayBeEqual && Compare(items[i]->Key().View(), key.text) == 0) {
+        if (key.MayEqual(items[i]->KeyHash()) && Compare(items[i]->Key().View(), key.text) == 0) {
             return items[i];
         }
     }
@@ -150,7 +146,7 @@ void EntryList::SortArray() const noexcept {
         }
         items[slot] = entry;
     }
-    isSettled = true;
+    form = Form::Array;
 }
 
 NodeEntry* EntryList::FindInIndex(std::u16string_view key) const {
@@ -164,7 +160,7 @@ EntryList::Place EntryList::FindPlace(HashedKey key) const {
     if (count == 0) {
         return {{}, nullptr};
     }
-    if (NodeEntry* entry = nullptr; !isLong && FindPlain(key, entry)) {
+    if (NodeEntry* entry = nullptr; !IsLong() && FindPlain(key, entry)) {
         return {EntryPosition::Unsettled(), entry};
     }
     // Copies and caches come in order.
@@ -175,7 +171,7 @@ EntryList::Place EntryList::FindPlace(HashedKey key) const {
 }
 
 EntryList::Place EntryList::SearchSorted(std::u16string_view key) const {
-    if (isLong) {
+    if (IsLong()) {
         const EntryPieces& pieces = longForm->pieces;
         const EntryPosition position =
             pieces.PartitionPoint([&](const NodeEntry& entry) { return Compare(entry.Key().View(), key) < 0; });
@@ -201,7 +197,7 @@ EntryList::Place EntryList::SearchSorted(std::u16string_view key) const {
 }
 
 void EntryList::Reserve(uint32_t size) {
-    if (!isLong && size > capacity && size <= shortLimit) {
+    if (!IsLong() && size > capacity && size <= shortLimit) {
         GrowArray(size);
     }
 }
@@ -238,15 +234,15 @@ void EntryList::MakeLong() {
     TaskMemFree(static_cast<void*>(items));
     longForm = grown.release();
     capacity = 0;
-    isLong = true;
+    form = Form::Long;
 }
 
 EntryPosition EntryList::InsertAnywhere(EntryPosition position, NodeEntry* entry) {
-    if (!isLong) {
+    if (!IsLong()) {
         const uint32_t slot = position.IsEnd() ? count : position.slot;
         if (count < shortLimit) {
             InsertInArray(slot, entry);
-            isSettled = isSettled && (ordered || position != EntryPosition::Unsettled());
+            NoteInsertion(position);
             return {0, slot};
         }
         MakeLong();
@@ -266,7 +262,7 @@ EntryPosition EntryList::InsertAnywhere(EntryPosition position, NodeEntry* entry
 }
 
 EntryPosition EntryList::Detach(EntryPosition position) noexcept {
-    if (!isLong) {
+    if (!IsLong()) {
         std::copy(items + position.slot + 1, items + count, items + position.slot);
         --count;
         return position.slot < count ? position : EntryPosition{};
@@ -283,7 +279,7 @@ EntryPosition EntryList::Detach(EntryPosition position) noexcept {
 }
 
 void EntryList::AssignKey(NodeEntry* entry, String&& key) noexcept {
-    const bool isIndexed = isLong && longForm->index;
+    const bool isIndexed = IsLong() && longForm->index;
     if (isIndexed) {
         RemoveFromIndex(entry);
     }
@@ -311,7 +307,7 @@ void EntryList::RemoveFromIndex(const NodeEntry* entry) noexcept {
 }
 
 void EntryList::DropIndex() noexcept {
-    if (isLong) {
+    if (IsLong()) {
         longForm->index.reset();
     }
 }

@@ -43,12 +43,12 @@ class EntryList {
     static EntryPosition End() { return {}; }
     EntryPosition Last() const;
     EntryPosition Next(EntryPosition position) const {
-        if (!isLong) {
+        if (!IsLong()) {
             return ++position.slot < count ? position : EntryPosition{};
         }
         return NextInPieces(position);
     }
-    NodeEntry* At(EntryPosition position) const { return isLong ? AtInPieces(position) : items[position.slot]; }
+    NodeEntry* At(EntryPosition position) const { return IsLong() ? AtInPieces(position) : items[position.slot]; }
 
     // The entry's place counted from the front; the end counts as Size().
     uint32_t IndexOf(EntryPosition position) const;
@@ -61,7 +61,7 @@ class EntryList {
     // the list, what has moved up to its position; the end if there is nothing. Linear in the length of one piece
     // where the list did change.
     EntryPosition Following(EntryPosition position, const NodeEntry* entry) const {
-        const bool isUnmoved = !isLong && isSettled && position.slot < count && items[position.slot] == entry;
+        const bool isUnmoved = form == Form::Array && position.slot < count && items[position.slot] == entry;
         return isUnmoved ? Next(position) : FollowingMoved(position, entry);
     }
 
@@ -88,7 +88,7 @@ class EntryList {
     EntryPosition Insert(EntryPosition position, NodeEntry* entry) {
         // Nearly always: at the end of a short list with room. Long lists have no capacity.
         if (position.IsEnd() && count < capacity) {
-            isSettled = isSettled && (ordered || position != EntryPosition::Unsettled());
+            NoteInsertion(position);
             items[count] = entry;
             return {0, count++};
         }
@@ -107,6 +107,12 @@ class EntryList {
   private:
     struct LongForm;
 
+    enum class Form : uint8_t {
+        Array,     // In its order.
+        Unsorted,  // An array of plain keys, whose order nobody has asked for yet.
+        Long,
+    };
+
     // Up to this many entries the list is one array, searched in place.
     static constexpr uint32_t shortLimit = 32;
 
@@ -115,12 +121,19 @@ class EntryList {
     EntryPosition FollowingMoved(EntryPosition position, const NodeEntry* entry) const;
     bool IsValid(EntryPosition position) const;
     NodeEntry* FindInIndex(std::u16string_view key) const;
+    bool IsLong() const { return form == Form::Long; }
     void Settle() const {
-        if (!isSettled) {
+        if (form == Form::Unsorted) {
             SortArray();
         }
     }
     void SortArray() const noexcept;
+    // Has to hear of each entry that comes into an array.
+    void NoteInsertion(EntryPosition position) {
+        if (!ordered && position == EntryPosition::Unsettled()) {
+            form = Form::Unsorted;
+        }
+    }
     NodeEntry* FindInArray(HashedKey key) const;
     bool FindPlain(HashedKey key, NodeEntry*& entry) const;
     Place SearchSorted(std::u16string_view key) const;
@@ -138,14 +151,14 @@ class EntryList {
     };
     uint32_t count = 0;
     uint8_t capacity = 0;  // Of `items`; 0 in the long form.
-    bool isLong = false;
+    mutable Form form = Form::Array;
     bool ordered;
-    mutable bool isSettled = true;  // False if a short sorted list of plain keys isn't sorted yet.
+    // One byte is left, for what a node has to note (ResTreeNode.h).
 };
 
 template <typename Visit>
 void EntryList::VisitUnordered(Visit visit) const {
-    if (isLong) {
+    if (IsLong()) {
         for (EntryPosition position = Begin(); !position.IsEnd(); position = Next(position)) {
             visit(At(position));
         }

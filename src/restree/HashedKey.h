@@ -69,6 +69,9 @@ struct HashedKey {
 
     constexpr HashedKey(std::u16string_view text, uint8_t hash) : text(text), hash(hash) {}
 
+    // False if a key of the hash `other` can't be equal to this one. What isn't plain may equal anything.
+    constexpr bool MayEqual(uint8_t other) const { return other == hash || other == 0 || hash == 0; }
+
     std::u16string_view text;
     uint8_t hash;
 };

@@ -81,8 +81,8 @@ bool ReleaseScope::HoldsWholeNodes() noexcept {
 }
 
 void ReleaseScope::Keep(ResTreeNode* node) noexcept {
-    node->isKept = 1;
-    kept->hasWholeNodes |= node->isDefunct == 0;
+    node->isKept = true;
+    kept->hasWholeNodes |= !node->isDefunct;
     ++countOfNodes;
     kept->nodes.push_back(node);
 }

@@ -408,7 +408,7 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     // Have to hear of each entry that comes in, and of each new key. A node above one with deferred contents knows of
     // them, so that who copies need not look for them.
     void NoteKey(const NodeEntry& entry) {
-        if (entry.KeyHash() == deferredPathKey.hash || entry.KeyHash() == 0) {
+        if (deferredPathKey.MayEqual(entry.KeyHash())) {
             NoteUnusualKey(entry);
         }
     }
@@ -420,14 +420,14 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     String name;
     String type;
     ResTreeNode* parent;  // Null for a root and a detached clone.
-    EntryList entries;
+    [[no_unique_address]] EntryList entries;
+    // In the byte that the list leaves free at its end:
+    bool isDefunct : 1 = false;                // Torn down; only the memory is left (ReleaseScope).
+    bool isKept : 1 = false;                   // Has left its tree, whole or torn down, and is kept by a ReleaseScope.
+    bool mayBeDeferred : 1 = false;            // Here or below there is, or has been, an entry ":DeferredLoadPath".
     std::unique_ptr<Attachments> attachments;  // What few nodes have: a type table, observers.
     uint32_t pendingChanges = 0;               // Raised and not yet delivered: ChangeFlags, and what a host adds.
-    uint32_t suspendCount : 29 = 0;            // Nonzero while delivery is held back.
-    // True or false. In one word with the count, which takes one type on Windows.
-    uint32_t isDefunct : 1 = 0;      // Torn down; only the memory is left (ReleaseScope).
-    uint32_t isKept : 1 = 0;         // Has left its tree, whole or torn down, and is kept by a ReleaseScope.
-    uint32_t mayBeDeferred : 1 = 0;  // Here or below there is, or has been, an entry ":DeferredLoadPath".
+    uint32_t suspendCount = 0;                 // Nonzero while delivery is held back.
 };
 
 }  // namespace zkhw

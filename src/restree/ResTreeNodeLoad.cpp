@@ -222,7 +222,7 @@ void ResTreeNode::NoteUnusualKey(const NodeEntry& entry) {
 
 void ResTreeNode::NoteDeferredContents() {
     for (ResTreeNode* node = this; node != nullptr && !node->mayBeDeferred; node = node->parent) {
-        node->mayBeDeferred = 1;
+        node->mayBeDeferred = true;
     }
 }
 

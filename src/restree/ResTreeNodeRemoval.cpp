@@ -37,7 +37,7 @@ void ResTreeNode::TearDown() noexcept {
         }
         ForgetWatching();
     }
-    isDefunct = 1;
+    isDefunct = true;
     if (attachments) {
         ReleaseLostEntries();
         ReleaseObservers();
@@ -117,7 +117,7 @@ void ResTreeNode::DestroySubtree(ResTreeNode* top) noexcept {
 
 bool ResTreeNode::HasLeft() const {
     if (isDefunct || !ReleaseScope::HoldsWholeNodes()) {
-        return isDefunct != 0;
+        return isDefunct;
     }
     const ResTreeNode* node = this;
     while (node != nullptr && !node->isKept) {

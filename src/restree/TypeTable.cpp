@@ -24,9 +24,7 @@ bool TypeRecord::IsA(std::u16string_view typeName) const {
 
 TypeRecord* TypeTable::FindIn(const Records& records, HashedKey type) {
     for (const std::unique_ptr<TypeRecord>& record : records) {
-        // Keys that aren't plain have the hash 0 and may equal one of any hash.
-        const bool mayBeEqual = record->nameHash == type.hash || record->nameHash == 0 || type.hash == 0;
-        if (mayBeEqual && Compare(record->name.View(), type.text) == 0) {
+        if (type.MayEqual(record->nameHash) && Compare(record->name.View(), type.text) == 0) {
             return record.get();
         }
     }

@@ -11,6 +11,7 @@
 #include "support/AllocationFaultScope.h"
 #include "support/ExactText.h"
 #include "support/TreeDump.h"
+#include "zkfpga/exports.h"
 
 namespace zkhw {
 namespace {

@@ -1,8 +1,6 @@
 // The tool as a user runs it: a process, its end, and the files that it leaves.
 
 #include <algorithm>
-#include <array>
-#include <cstdio>
 #include <string>
 #include <vector>
 
@@ -10,6 +8,7 @@
 
 #include "cachebuilder/Installation.h"
 #include "support/ExactText.h"
+#include "support/PrintedLines.h"
 #include "support/ProcessEnd.h"
 
 namespace zkhw {
@@ -341,16 +340,11 @@ TEST_F(Tool, DocumentOf100000LevelsIsReadAndLeftBehind) {
 
 // By a tool for the files of Linux; tests/layout has the exports on Windows.
 TEST_F(Tool, ExportsOneFunctionAsOnlyLinuxListsSymbols) {
-    std::FILE* names = popen(ZKFPGA_NM " -D --defined-only --format=just-symbols " ZKFPGA_TOOL, "r");
-    ASSERT_NE(names, nullptr);
     Names exported;
-    std::array<char, 4096> line{};
-    while (std::fgets(line.data(), static_cast<int>(line.size()), names) != nullptr) {
-        std::string name(line.data());
-        name.erase(name.find_last_not_of('\n') + 1);
-        exported.push_back(name.substr(0, name.find('@')));
+    for (const std::string& line :
+         qn::dsc::osdep::PrintedLines(ZKFPGA_NM, {"-D", "--defined-only", "--format=just-symbols", ZKFPGA_TOOL})) {
+        exported.push_back(line.substr(0, line.find('@')));
     }
-    ASSERT_EQ(pclose(names), 0);
     EXPECT_EQ(std::count(exported.begin(), exported.end(), "gFPGAResTree"), 1);
     // What the compiler's own libraries and a sanitizer bring along doesn't count.
     for (const std::string& name : exported) {

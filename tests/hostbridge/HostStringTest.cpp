@@ -118,6 +118,21 @@ TEST_F(HostStringTest, LongTextIsStoredInOneStep) {
     EXPECT_EQ(TakeCalls(), Calls{"HostResizeArray 5 1 1000000"});
 }
 
+TEST_F(HostStringTest, TextGoesIntoAStringThatWasGivenByValue) {
+    Make("old");
+    StoreInGivenHostString(String(u"new one"), text);
+    EXPECT_EQ(Bytes(HostStringToNarrow(text)), "new one");
+    StoreInGivenHostString("a\0b", 3, text);
+    EXPECT_EQ(Bytes(HostStringToNarrow(text)), std::string("a\0b", 3));
+}
+
+TEST_F(HostStringTest, WithoutAStringThatWasGivenByValueTheHostIsNotAsked) {
+    TakeCalls();
+    StoreInGivenHostString(String(u"new one"), nullptr);
+    StoreInGivenHostString("bytes", 5, nullptr);
+    EXPECT_EQ(TakeCalls(), Calls());
+}
+
 TEST_F(HostStringTest, ClearingMakesAnEmptyStringOfNothing) {
     ClearHostString(text);
     ASSERT_NE(text, nullptr);

@@ -1,27 +1,21 @@
-#include <array>
-#include <cstdio>
 #include <fstream>
 #include <iterator>
-#include <sstream>
 #include <string>
 
 #include <gtest/gtest.h>
 
+#include "support/PrintedLines.h"
+
 namespace {
 
-std::string OutputOf(const std::string& command) {
-    std::FILE* const stream = popen(command.c_str(), "r");
-    std::string output;
-    std::array<char, 4096> block{};
-    for (size_t got = 0; stream != nullptr && (got = std::fread(block.data(), 1, block.size(), stream)) > 0;) {
-        output.append(block.data(), got);
-    }
-    EXPECT_TRUE(stream != nullptr && pclose(stream) == 0) << command;
-    return output;
-}
+using qn::dsc::osdep::PrintedLines;
 
 std::string ExportsOf(const char* file) {
-    return OutputOf(std::string("LC_ALL=C '" ZKFPGA_NM "' -D --defined-only --format=just-symbols '") + file + "'");
+    std::string names;
+    for (const std::string& name : PrintedLines(ZKFPGA_NM, {"-D", "--defined-only", "--format=just-symbols", file})) {
+        names += name + "\n";
+    }
+    return names;
 }
 
 std::string ExportList() {
@@ -49,9 +43,8 @@ TEST(ExportedNames, ListHoldsEveryFunctionOfTheBoundary) {
 }
 
 TEST(ExportedNames, LibraryIsKnownByItsMajorVersion) {
-    std::istringstream dynamic(OutputOf("LC_ALL=C '" ZKFPGA_READELF "' --dynamic '" ZKFPGA_LIBRARY "'"));
     std::string soname = "none";
-    for (std::string line; std::getline(dynamic, line);) {
+    for (const std::string& line : PrintedLines(ZKFPGA_READELF, {"--dynamic", ZKFPGA_LIBRARY})) {
         if (line.find("(SONAME)") != std::string::npos) {
             soname = line.substr(line.find('['));
         }

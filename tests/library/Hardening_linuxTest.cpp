@@ -1,31 +1,16 @@
 // What ships is hard to exploit: the tool and the library, as the linker made them.
 
-#include <array>
-#include <cstdio>
-#include <sstream>
 #include <string>
 #include <vector>
 
 #include <gtest/gtest.h>
 
+#include "support/PrintedLines.h"
+
 namespace {
 
-// The lines that readelf prints.
-std::vector<std::string> ReadElf(const std::string& options, const std::string& file) {
-    const std::string command = "LC_ALL=C '" ZKFPGA_READELF "' --wide " + options + " '" + file + "'";
-    std::FILE* const stream = popen(command.c_str(), "r");
-    std::string output;
-    std::array<char, 4096> block{};
-    for (size_t got = 0; stream != nullptr && (got = std::fread(block.data(), 1, block.size(), stream)) > 0;) {
-        output.append(block.data(), got);
-    }
-    EXPECT_TRUE(stream != nullptr && pclose(stream) == 0) << command;
-    std::vector<std::string> lines;
-    std::istringstream text(output);
-    for (std::string line; std::getline(text, line);) {
-        lines.push_back(line);
-    }
-    return lines;
+std::vector<std::string> ReadElf(const std::string& option, const std::string& file) {
+    return qn::dsc::osdep::PrintedLines(ZKFPGA_READELF, {"--wide", option, file});
 }
 
 // The first line that holds `text`; empty if there is none.

@@ -10,6 +10,7 @@
 #include <gtest/gtest.h>
 
 #include "cachebuilder/FPGAResTree.h"
+#include "zkfpga/exports.h"
 #include "zkfpga/memory.h"
 #include "zkfpga/tree_root.h"
 

@@ -46,6 +46,20 @@ TEST(HashedKey, LiteralHasTheHashOfItsText) {
     }
 }
 
+TEST(HashedKey, PlainKeyMayEqualItsOwnHashAndNone) {
+    const HashedKey plain(std::u16string_view(u"name"), 7);
+    for (uint32_t other = 0; other <= 0xFF; ++other) {
+        EXPECT_EQ(plain.MayEqual(static_cast<uint8_t>(other)), other == 7 || other == 0) << other;
+    }
+}
+
+TEST(HashedKey, KeyThatIsNotPlainMayEqualAny) {
+    const HashedKey blank(std::u16string_view(u"a b"));
+    for (uint32_t other = 0; other <= 0xFF; ++other) {
+        EXPECT_TRUE(blank.MayEqual(static_cast<uint8_t>(other))) << other;
+    }
+}
+
 TEST(HashedKey, KeysOfABoardHaveManyHashes) {
     std::vector<uint32_t> counts(256);
     for (uint32_t i = 0; i < 2560; ++i) {

@@ -265,6 +265,16 @@ TEST_F(NodeChanges, BracketsNest) {
     EXPECT_EQ(log.Take(), "a: A PropertyAdded|ChildAdded #0\n");
 }
 
+TEST_F(NodeChanges, BracketsAreCountedInMoreThan29Bits) {
+    for (uint32_t i = 0; i < 1U << 29; ++i) {
+        node->BeginChanges();
+    }
+    AddText(*node, u"x", u"1");
+    EXPECT_EQ(log.Take(), "");
+    node->EndChanges(0, false);
+    EXPECT_EQ(log.Take(), "");
+}
+
 TEST_F(NodeChanges, ReplacingDropsWhatWasRaisedInTheBracket) {
     node->BeginChanges();
     AddText(*node, u"x", u"1");
