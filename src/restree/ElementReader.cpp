@@ -158,7 +158,7 @@ bool ElementReader::IsNodeOrdered(const String& elementName) const {
 
 void ElementReader::BindDocumentElement(String&& entryName, String&& elementName, bool isOrdered) {
     if (node.type.IsEmpty()) {
-        node.name = std::move(entryName);
+        node.TakeName(std::move(entryName));
         node.type = std::move(elementName);
         node.TakeOrder(isOrdered);
     }

@@ -283,8 +283,8 @@ void EntryList::AssignKey(NodeEntry* entry, String&& key) noexcept {
     if (isIndexed) {
         RemoveFromIndex(entry);
     }
-    entry->key.Swap(key);
-    entry->keyHash = HashKey(entry->key.View());
+    const uint8_t hash = HashKey(key.View());
+    entry->SwapKey(key, hash);
     if (isIndexed && longForm->index) {
         AddToIndex(entry, false);
     }

@@ -34,9 +34,11 @@ class NodeEntry {
     // `text` is as it was.
     static NodeEntry* CopyText(const NodeEntry& source, String&& text);
 
-    // A child entry that takes `child`. Throws bad_alloc; then `key` is as it was and `child` still the caller's.
+    // A child entry that takes `child`, whose `name` is its key, and which keeps that name until it goes, or somebody
+    // calls OwnKey. Throws bad_alloc; then `child` is still the caller's.
+    static NodeEntry* MakeChild(const String& name, uint8_t keyHash, ResTreeNode* child);
+    // The same with a key that isn't the name of `child`. Throws bad_alloc; then `key` is as it was, too.
     static NodeEntry* MakeChild(String&& key, ResTreeNode* child);
-    static NodeEntry* MakeChild(String&& key, uint8_t keyHash, ResTreeNode* child);
 
     // Frees the entry. A child must have been taken out with TakeChild.
     static void Release(NodeEntry* entry) noexcept;
@@ -44,7 +46,7 @@ class NodeEntry {
     NodeEntry(const NodeEntry&) = delete;
     NodeEntry& operator=(const NodeEntry&) = delete;
 
-    const String& Key() const { return key; }
+    const String& Key() const { return shape == Shape::Text ? TextKey() : *ChildKey(); }
     uint8_t KeyHash() const { return keyHash; }
     EntryKind Kind() const { return kind; }
     bool IsText() const { return kind == TextEntry || kind == LocalizedTextEntry; }
@@ -69,8 +71,13 @@ class NodeEntry {
     // Turns a text entry into one of the other text kind.
     void SetTextKind(EntryKind textKind) { kind = textKind; }
 
-    // Gives the child to the caller and leaves the entry empty.
+    // Gives the child to the caller and leaves the entry empty. Its key lives as long as the child, unless it has one
+    // of its own.
     ResTreeNode* TakeChild();
+
+    // Gives the entry a key of its own, equal to the one that it has, if that is the name of its child. Throws
+    // bad_alloc.
+    void OwnKey();
 
     // Frees the text of a text or link entry and leaves the entry empty.
     void ReleaseText();
@@ -79,38 +86,59 @@ class NodeEntry {
     friend class EntryList;
     friend class EntryPieces;
 
-    // The two shapes differ behind the common head only, so that a child entry doesn't carry room for a text.
+    // What was allocated; the kind may have become EmptyEntry since.
+    enum class Shape : uint8_t {
+        Text,
+        Child,       // The key is the child's name, as nearly always: a node's name changes by a renaming alone.
+        KeyedChild,  // The key is the entry's.
+    };
+
+    // The shapes differ behind the common head, so that a child entry doesn't carry room for a text.
     struct TextShape;
     struct ChildShape;
 
-    NodeEntry(String&& key, uint8_t keyHash, EntryKind kind, bool textShape)
-        : key(static_cast<String&&>(key)), keyHash(keyHash), kind(kind), textShape(textShape) {}
+    NodeEntry(uint8_t keyHash, EntryKind kind, Shape shape) : keyHash(keyHash), kind(kind), shape(shape) {}
     ~NodeEntry() = default;
 
+    inline const String& TextKey() const;
+    inline const String* ChildKey() const;
     inline String& Payload();
     inline const String& Payload() const;
     inline ResTreeNode* ChildPayload() const;
 
-    String key;
+    // Swaps the key, which is the entry's own, for `key`.
+    void SwapKey(String& key, uint8_t hash) noexcept;
+
     uint32_t pieceNumber = 0;  // Of the piece of a long list that holds the entry (EntryPieces.h); 0 in a short list.
     uint8_t keyHash;           // HashKey of the key.
     EntryKind kind;
-    bool textShape;  // Which shape was allocated; the kind may have become EmptyEntry since.
+    Shape shape;
     bool textMarked = false;
 };
 
 struct NodeEntry::TextShape : NodeEntry {
     TextShape(String&& key, uint8_t keyHash, EntryKind kind, String&& text)
-        : NodeEntry(static_cast<String&&>(key), keyHash, kind, true), text(static_cast<String&&>(text)) {}
+        : NodeEntry(keyHash, kind, Shape::Text), key(static_cast<String&&>(key)), text(static_cast<String&&>(text)) {}
+    String key;
     String text;
 };
 
 struct NodeEntry::ChildShape : NodeEntry {
-    ChildShape(String&& key, uint8_t keyHash, ResTreeNode* child)
-        : NodeEntry(static_cast<String&&>(key), keyHash, ChildEntry, false), child(child) {}
+    ChildShape(const String* key, uint8_t keyHash, Shape shape, ResTreeNode* child)
+        : NodeEntry(keyHash, ChildEntry, shape), child(child), key(key) {}
+    ~ChildShape();
+    ChildShape(const ChildShape&) = delete;
+    ChildShape& operator=(const ChildShape&) = delete;
     ResTreeNode* child;
+    const String* key;
 };
 
+inline const String& NodeEntry::TextKey() const {
+    return static_cast<const TextShape*>(this)->key;
+}
+inline const String* NodeEntry::ChildKey() const {
+    return static_cast<const ChildShape*>(this)->key;
+}
 inline String& NodeEntry::Payload() {
     return static_cast<TextShape*>(this)->text;
 }

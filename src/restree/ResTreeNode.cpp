@@ -3,6 +3,7 @@
 #include <new>
 #include <utility>
 
+#include "qn/dsc/FindUnit.h"
 #include "qn/dsc/osdep/Compare.h"
 #include "qn/dsc/osdep/TaskMemory.h"
 #include "restree/NodeAttachments.h"
@@ -239,8 +240,8 @@ ResTreeNode::Added ResTreeNode::AddChildAt(EntryPosition position, HashedKey has
 
 ResTreeNode::Added ResTreeNode::MakeChildAt(EntryPosition position, HashedKey hashed, String&& key, String&& childType,
                                             bool childOrdered, ResTreeNode*& child) {
-    auto made = std::make_unique<ResTreeNode>(String(key), std::move(childType), childOrdered, this);
-    NodeEntry* entry = NodeEntry::MakeChild(std::move(key), hashed.hash, made.get());
+    auto made = std::make_unique<ResTreeNode>(std::move(key), std::move(childType), childOrdered, this);
+    NodeEntry* entry = NodeEntry::MakeChild(made->name, hashed.hash, made.get());
     child = made.release();
     return Store(position, entry, ChildAdded);
 }
@@ -287,7 +288,9 @@ EntryIterator ResTreeNode::InsertEntry(EntryIterator position, std::u16string_vi
 EntryIterator ResTreeNode::InsertEntry(EntryIterator position, std::u16string_view key,
                                        std::unique_ptr<ResTreeNode> child) {
     const EntryPosition place = IsOrdered() ? position.Position() : PlaceInFront(key);
-    NodeEntry* entry = NodeEntry::MakeChild(String(key), child.get());
+    NodeEntry* entry = qn::dsc::HasSameUnits(key, child->name.View())
+                           ? NodeEntry::MakeChild(child->name, HashKey(key), child.get())
+                           : NodeEntry::MakeChild(String(key), child.get());
     try {
         entries.Insert(place, entry);
     } catch (...) {
@@ -308,6 +311,7 @@ bool ResTreeNode::RenameEntry(std::u16string_view oldKey, std::u16string_view ne
         return false;
     }
     String key(newKey);
+    entry->OwnKey();
     if (IsOrdered()) {
         entries.AssignKey(entry, std::move(key));
         NoteKey(*entry);
@@ -331,8 +335,12 @@ bool ResTreeNode::RenameEntry(std::u16string_view oldKey, std::u16string_view ne
 bool ResTreeNode::Rename(std::u16string_view newName) {
     const ReleaseScope scope;
     String assigned(newName);
-    if (parent != nullptr && !parent->RenameEntry(name.View(), newName)) {
-        return false;
+    if (parent != nullptr) {
+        // Of equal names in an ordered node the first is renamed, which need not be that of this node.
+        OwnKeyInParent();
+        if (!parent->RenameEntry(name.View(), newName)) {
+            return false;
+        }
     }
     name.Swap(assigned);
     Raise(NodeNameChanged);
@@ -340,6 +348,25 @@ bool ResTreeNode::Rename(std::u16string_view newName) {
         parent->Raise(ChildNameChanged);
     }
     return true;
+}
+
+void ResTreeNode::TakeName(String&& newName) {
+    if (parent != nullptr) {
+        OwnKeyInParent();
+    }
+    name = std::move(newName);
+}
+
+// Ahead of a change of the name that isn't one of the entry's key.
+void ResTreeNode::OwnKeyInParent() {
+    NodeEntry* own = parent->FindRaw(name.View());
+    if (own == nullptr || own->Child() != this) {
+        own = nullptr;
+        parent->entries.VisitUnordered([&](NodeEntry* entry) { own = entry->Child() == this ? entry : own; });
+    }
+    if (own != nullptr) {
+        own->OwnKey();
+    }
 }
 
 void ResTreeNode::SetOrdered(bool ordered) {

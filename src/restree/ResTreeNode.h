@@ -405,6 +405,9 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     int32_t LoadIncludedFile(const NarrowString& path, bool asChild, ResTreeNode** node, const LoadChain& includer);
     int32_t LoadFile(const NarrowString& path, bool asChild, ResTreeNode** node, const LoadChain& chain);
     void TakeOrder(bool ordered);
+    // Changes the name, and not the key of the node's entry.
+    void TakeName(String&& newName);
+    void OwnKeyInParent();
     // Have to hear of each entry that comes in, and of each new key. A node above one with deferred contents knows of
     // them, so that who copies need not look for them.
     void NoteKey(const NodeEntry& entry) {

@@ -517,6 +517,35 @@ TEST(ResTreeNode, RenameInAnOrderedParentTakesTheFirstEntryOfTheName) {
     EXPECT_EQ(DumpTree(*root), "Root:Root ordered\n  b=1\n  a=>b:T\n");
 }
 
+TEST(ResTreeNode, RenameOfTheSecondOfEqualNamesChangesTheKeyOfTheFirst) {
+    const auto root = MakeRootNode(true);
+    AddChild(*root, u"a");
+    ResTreeNode* second = AddChild(*root, u"a");
+    EXPECT_TRUE(second->Rename(u"b"));
+    EXPECT_EQ(DumpTree(*root), "Root:Root ordered\n  b=>a:T\n  a=>b:T\n");
+}
+
+TEST(ResTreeNode, RenameOfARenamedEntryGoesByItsKey) {
+    for (const bool ordered : {false, true}) {
+        const auto root = MakeRootNode(ordered);
+        AddChild(*root, u"a");
+        EXPECT_TRUE(root->RenameEntry(u"a", u"b"));
+        EXPECT_TRUE(root->RenameEntry(u"b", u"c"));
+        EXPECT_EQ(root->FindRaw(u"b"), nullptr);
+        EXPECT_EQ(DumpTree(*root), std::string(ordered ? "Root:Root ordered\n" : "Root:Root\n") + "  c=>a:T\n");
+    }
+}
+
+TEST(ResTreeNode, ANameFromADocumentLeavesTheKey) {
+    const auto root = MakeRootNode();
+    ResTreeNode* child = nullptr;
+    root->AddChildEntry(u"key", u"", false, child);
+    EXPECT_EQ(child->LoadResourceText(u"<Element name=\"name\"><a>1</a></Element>", false, nullptr), 0);
+    EXPECT_EQ(ExactText(child->GetName()), "name");
+    EXPECT_EQ(root->FindRaw(u"name"), nullptr);
+    EXPECT_EQ(DumpTree(*root), "Root:Root\n  key=>name:Element\n    a=1\n");
+}
+
 TEST(ResTreeNode, RenameFailsWhereTheParentHasNoSuchEntry) {
     const auto root = MakeRootNode();
     ResTreeNode* child = AddChild(*root, u"a");
