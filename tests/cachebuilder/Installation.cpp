@@ -1,8 +1,5 @@
 #include "cachebuilder/Installation.h"
 
-#include <filesystem>
-#include <system_error>
-
 #include <gtest/gtest.h>
 
 #include "qn/dsc/osdep/path.h"
@@ -18,15 +15,6 @@ using qn::dsc::osdep::RunProgram;
 namespace {
 
 const char* const toolFile = "Targets/QN/FPGA/tool/zkfpga_make_resource_cache";
-
-// A link is enough: the executable asks for the name under which it was started.
-void PlaceTool(const std::string& destination) {
-    std::error_code error;
-    std::filesystem::create_hard_link(ZKFPGA_TOOL, destination, error);
-    if (error) {
-        std::filesystem::copy_file(ZKFPGA_TOOL, destination);
-    }
-}
 
 }  // namespace
 
@@ -89,7 +77,7 @@ void Installation::WriteDeviceSpecs() const {
 
 std::string Installation::Run(const std::vector<std::string>& arguments, const std::string& workingFolder) const {
     if (!root.Exists(toolFile)) {
-        PlaceTool(root.Native(toolFile));
+        root.PlaceProgram(ZKFPGA_TOOL, toolFile);
     }
     const ProgramResult result = RunProgram(root.Native(toolFile), arguments, workingFolder);
     EXPECT_EQ(result.output, "");

@@ -2,7 +2,6 @@
 
 #include <algorithm>
 #include <filesystem>
-#include <system_error>
 
 #include <gtest/gtest.h>
 
@@ -101,13 +100,6 @@ ProgramResult HostInstallation::RunLinked(const std::vector<std::string>& comman
 
 ProgramResult HostInstallation::RunAsHost(const char* program, const std::vector<std::string>& arguments,
                                           const std::string& workingFolder) const {
-    const std::string place = root.Native(hostFile);
-    std::error_code error;
-    std::filesystem::remove(place, error);
-    // A link is enough: the library asks for the name under which the program was started.
-    std::filesystem::create_hard_link(program, place, error);
-    if (error) {
-        std::filesystem::copy_file(program, place);
-    }
-    return RunProgram(place, arguments, workingFolder);
+    root.PlaceProgram(program, hostFile);
+    return RunProgram(root.Native(hostFile), arguments, workingFolder);
 }

@@ -126,7 +126,7 @@ void AddRemovals(Cases& cases) {
     cases["Unadvise twice"] = {[] {
         static Observer observer;
         fixture.shelf->Advise(&observer, 4, registration);
-        for (const ULONG id : {registration, registration, 0xFFFFFFFFU}) {
+        for (const ULONG id : {registration, registration, ULONG{0xFFFFFFFF}}) {
             const HRESULT ended = fixture.shelf->Unadvise(&observer, id, 0);
             Say(Hex(ended) + Count(observer.references));
         }

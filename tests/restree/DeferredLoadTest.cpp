@@ -228,6 +228,30 @@ TEST_F(DeferredLoad, CanRemoveTheVeryStub) {
     EXPECT_EQ(DumpTree(Above()), "a:A\n  s:S\n    V=new\n");
 }
 
+// A copy over which nothing is kept removes what has its name, also what the deferred file brings.
+TEST_F(DeferredLoad, CopyIntoAnOrderedStubTakesThePlaceOfWhatTheFileBrings) {
+    Write("board.xml", "<B><Old name='copy'><V>1</V></Old><Z>z</Z></B>");
+    ResTreeNode* stub = nullptr;
+    Above().AddChildEntry(u"o", u"S", true, stub);
+    stub->SetProperty(u"X", u"x");
+    Defer(*stub, u"board.xml");
+    ResTreeNode* child = nullptr;
+    stub->CloneSubtreeInto(stub->End(), u"copy", Stub(), false, child);
+    EXPECT_EQ(DumpTree(*stub), "o:S ordered\n  X=x\n  Z=z\n  copy:S\n    U=0\n");
+}
+
+TEST_F(DeferredLoad, PlaceOfACopyInAnOrderedStubIsCountedFromTheFront) {
+    Write("board.xml", "<B><Z>z</Z></B>");
+    ResTreeNode* stub = nullptr;
+    Above().AddChildEntry(u"o", u"S", true, stub);
+    stub->SetProperty(u"X", u"x");
+    stub->SetProperty(u"Y", u"y");
+    Defer(*stub, u"board.xml");
+    ResTreeNode* child = nullptr;
+    stub->CloneSubtreeInto(stub->FindEntryRaw(u"Y"), u"copy", Stub(), false, child);
+    EXPECT_EQ(DumpTree(*stub), "o:S ordered\n  X=x\n  copy:S\n    U=0\n  Y=y\n  Z=z\n");
+}
+
 TEST_F(DeferredLoad, ThousandsOfParentsInARowAreAskedWithoutTheStack) {
     std::string document;
     for (int i = 0; i < 2000; ++i) {

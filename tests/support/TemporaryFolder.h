@@ -38,6 +38,8 @@ class TemporaryFolder {
     // Links and pipes need Linux, be it below Wine. `target` is the text of the link, whether anything is there or not.
     void MakeLink(const std::string& target, const std::string& below) const;
     void MakePipe(const std::string& below) const;
+    // Lets the program in the file `program` be started from there, in the place of what is there. The folder exists.
+    void PlaceProgram(const std::string& program, const std::string& below) const;
     void Remove(const std::string& below) const;
     // Last-write time since 1970 UTC. Links are followed.
     void SetFileTime(const std::string& below, int64_t seconds, int64_t nanoseconds) const;

@@ -124,6 +124,14 @@ void TemporaryFolder::MakePipe(const std::string& below) const {
     EXPECT_EQ(mkfifo(Native(below).c_str(), 0600), 0) << below << ": " << std::strerror(errno);
 }
 
+// A link is enough: a program asks for the name under which it was started.
+void TemporaryFolder::PlaceProgram(const std::string& program, const std::string& below) const {
+    std::error_code error;
+    fs::remove(Native(below), error);
+    fs::create_hard_link(program, Native(below), error);
+    EXPECT_TRUE(!error || fs::copy_file(program, Native(below), error)) << below << ": " << error.message();
+}
+
 void TemporaryFolder::Remove(const std::string& below) const {
     EXPECT_GT(fs::remove_all(Native(below)), 0u) << below;
 }

@@ -219,6 +219,12 @@ void TemporaryFolder::MakePipe(const std::string& below) const {
     EXPECT_TRUE(Becomes(Native(below), true)) << below;
 }
 
+// No link: as long as a program runs, nothing that leads to its file can be removed, and tests run side by side.
+void TemporaryFolder::PlaceProgram(const std::string& program, const std::string& below) const {
+    EXPECT_NE(CopyFileW(CallPath(program).c_str(), CallPath(Native(below)).c_str(), FALSE), 0)
+        << below << ": " << GetLastError();
+}
+
 void TemporaryFolder::Remove(const std::string& below) const {
     const std::string path = Native(below);
     WIN32_FIND_DATAW data;
