@@ -28,4 +28,8 @@ endif()
 if(ZKFPGA_COVERAGE)
   target_compile_options(zkfpga_options INTERFACE --coverage -fprofile-update=atomic)
   target_link_options(zkfpga_options INTERFACE --coverage)
+  # Counters are written at the exit of a process: those that end otherwise have to be made to.
+  add_library(zkfpga_counters STATIC ${PROJECT_SOURCE_DIR}/tests/support/CountersAtTheEnd_linux.c)
+  target_link_libraries(zkfpga_options INTERFACE zkfpga_counters)
+  target_link_options(zkfpga_options INTERFACE LINKER:--wrap=raise,--wrap=_Exit,--wrap=_exit)
 endif()

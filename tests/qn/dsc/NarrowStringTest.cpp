@@ -28,6 +28,13 @@ TEST(NarrowString, NullIsTheEmptyText) {
     EXPECT_STREQ(text.CStr(), "");
 }
 
+TEST(NarrowString, EndsWithANul) {
+    const NarrowString text("ab");
+    EXPECT_EQ(text.End(), text.CStr() + 2);
+    EXPECT_EQ(text.At(1), 'b');
+    EXPECT_EQ(text.At(2), '\0');
+}
+
 TEST(NarrowString, IsMadeFromARangeAndFromCopiesOfAByte) {
     const char bytes[] = "abcdef";
     EXPECT_EQ(Bytes(NarrowString(bytes + 1, bytes + 4)), "bcd");
