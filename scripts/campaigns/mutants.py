@@ -66,6 +66,7 @@ class Mutant:
         self.name = None
         self.line = None
         self.path = None
+        self.isAlive = True  # It compiles.
 
 
 def Tokens(source):
@@ -108,6 +109,8 @@ def Fix(tokens, begin, end):
 
 
 class Scope:
+    """What an open brace stands for while the tokens are gone through."""
+
     def __init__(self, kind, isFixed, start):
         self.kind = kind        # "namespace", "class", "enum", "code", "values"
         self.isFixed = isFixed
@@ -178,6 +181,7 @@ def FixConstants(tokens):
 
 
 def IsBinary(tokens, index, source):
+    """Whether the token is an operator between blanks."""
     token = tokens[index]
     return (token.kind == "sign" and not token.isAngle and 0 < index < len(tokens) - 1 and
             tokens[index - 1].text != "operator" and source[token.begin - 1].isspace() and
@@ -274,6 +278,7 @@ class Source:
             self.AddStep(index, token)
 
     def AddNumber(self, token):
+        """0 and 1 become each other, other integers one more or one less."""
         match = re.fullmatch(r"(0[xX][\da-fA-F']+|0[bB][01']+|[\d']+)([uUlLzZ]*)", token.text)
         if not match:
             return
@@ -302,6 +307,7 @@ class Source:
             self.AddResult(index, token)
 
     def AddGuard(self, index, token):
+        """Lets the branch of an "if" never be taken."""
         begin = index + 2
         end = self.tokens[index + 1].partner
         at = begin
@@ -319,6 +325,7 @@ class Source:
                  [(first, first, "!mutants::Is({n}) && ("), (last, last, ")")])
 
     def AddResult(self, index, token):
+        """Lets a function give another number, the opposite, or null. Other types don't compile and are left out."""
         end = RightOperand(self.tokens, index, -1, self.text)
         while self.tokens[end].text in ("?", ":", ","):
             end = RightOperand(self.tokens, end, -1, self.text)
@@ -337,7 +344,8 @@ class Source:
         last = RightOperand(self.tokens, index, tightness, self.text)
         if first == index or last == index + 1:
             return
-        if any(each.kind == "text" and each.text[-1] == '"' for each in self.tokens[first:last]) and name in ("Plus",):
+        # Texts can be joined, but not taken away.
+        if name == "Plus" and any(each.kind == "text" and each.text[-1] == '"' for each in self.tokens[first:last]):
             return
         begin, end = self.tokens[first].begin, self.tokens[last - 1].end
         if name:

@@ -25,7 +25,6 @@ def Sources(root, names):
             source.isChosen = any(path == name or name in path.parents for name in wanted)
             for mutant in source.mutants:
                 mutant.number = number
-                mutant.isAlive = True
                 number += 1
             sources.append(source)
     return sources
@@ -69,19 +68,25 @@ class Build:
                 target.write_bytes(content)
                 shutil.copymode(source, target)
 
-    def Write(self):
+    def Mark(self):
+        """Tells what compiles from what doesn't, and makes the sources with it."""
         for source in self.sources:
             for mutant in source.mutants:
                 mutant.isAlive = mutant.name not in self.dead
-            text, self.spans[source.path] = source.With([mutant for mutant in source.mutants if mutant.isAlive])
-            source.changed = text
-            WriteIfOther(self.tree / source.path, text)
+            alive = [mutant for mutant in source.mutants if mutant.isAlive]
+            source.changed, self.spans[source.path] = source.With(alive)
+        self.stillborn = sum(not mutant.isAlive for source in self.sources for mutant in source.mutants)
+
+    def Write(self):
+        self.Mark()
+        for source in self.sources:
+            WriteIfOther(self.tree / source.path, source.changed)
 
     def Make(self, jobs):
         """Builds the test programs; what keeps them from compiling is left out, as often as need be."""
         self.CopyOthers()
         self.Write()
-        flags = f"-O1 -w -Wno-narrowing -include {SWITCH}"
+        flags = f"-O1 -w -Wno-narrowing -D_GLIBCXX_ASSERTIONS -include {SWITCH}"
         with open(self.log, "w", encoding="utf-8") as log:
             subprocess.run(["cmake", "-S", self.tree, "-B", self.folder, "-G", "Ninja", "-D", "CMAKE_BUILD_TYPE=Debug",
                             "-D", f"CMAKE_CXX_FLAGS_DEBUG={flags}", "-D", "CMAKE_C_FLAGS_DEBUG=-O1 -w",
@@ -104,7 +109,6 @@ class Build:
             self.dead |= found
             self.deadFile.write_text("".join(name + "\n" for name in sorted(self.dead)), encoding="utf-8")
             self.Write()
-        self.stillborn = sum(not mutant.isAlive for source in self.sources for mutant in source.mutants)
 
     def Blamed(self, output):
         """The names of the changes that the compiler speaks of: by the place of the error, or by what first used a
