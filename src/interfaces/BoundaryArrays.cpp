@@ -5,9 +5,6 @@
 namespace zkhw {
 
 HRESULT GiveTexts(const std::vector<String>& texts, ULONG* count, BSTR** array) {
-    if (count == nullptr || array == nullptr) {
-        return E_POINTER;
-    }
     if (!texts.empty()) {
         return GiveTextsWithBlock(texts, count, array);
     }
@@ -17,9 +14,6 @@ HRESULT GiveTexts(const std::vector<String>& texts, ULONG* count, BSTR** array) 
 }
 
 HRESULT GiveTextsWithBlock(const std::vector<String>& texts, ULONG* count, BSTR** array) {
-    if (count == nullptr || array == nullptr) {
-        return E_POINTER;
-    }
     *count = 0;
     *array = nullptr;
     auto* const made = static_cast<BSTR*>(CoTaskMemAlloc(texts.size() * sizeof(BSTR)));

@@ -14,8 +14,10 @@ namespace zkhw {
 
 using qn::dsc::String;
 
-// Gives copies of the texts, each up to its first NUL. S_OK; E_POINTER if an out pointer is null; E_OUTOFMEMORY, and
-// the count is 0, the array null, and nothing is left behind.
+// The out pointers are never null: an operation refuses that before it looks anything up.
+
+// Gives copies of the texts, each up to its first NUL. S_OK; E_OUTOFMEMORY, and the count is 0, the array null, and
+// nothing is left behind.
 HRESULT GiveTexts(const std::vector<String>& texts, ULONG* count, BSTR** array);
 
 // The same; the array is a block also if there are no texts.
@@ -27,9 +29,6 @@ void FreeTexts(ULONG count, BSTR* array);
 // Gives the references of `objects` to the caller; on failure they stay there. Results as above.
 template <typename T>
 HRESULT GiveObjects(std::vector<InterfacePointer<T>>& objects, ULONG* count, T*** array) {
-    if (count == nullptr || array == nullptr) {
-        return E_POINTER;
-    }
     *count = 0;
     *array = nullptr;
     if (objects.empty()) {

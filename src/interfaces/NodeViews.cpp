@@ -34,9 +34,6 @@ HRESULT GiveView(ResTreeNode* node, AdapterObserverSet* observers, IzkhwResource
 
 HRESULT GiveViews(const std::vector<ResTreeNode*>& nodes, AdapterObserverSet* observers, ULONG* count,
                   IzkhwResourceTreeNode*** views) {
-    if (count == nullptr || views == nullptr) {
-        return E_POINTER;
-    }
     *count = 0;
     *views = nullptr;
     std::vector<InterfacePointer<IzkhwResourceTreeNode>> made(nodes.size());

@@ -14,7 +14,7 @@ class ResTreeNode;
 // Gives a view of `node`. S_OK, or E_OUTOFMEMORY and null.
 HRESULT GiveView(ResTreeNode* node, AdapterObserverSet* observers, IzkhwResourceTreeNode** view);
 
-// Gives an array of views. E_POINTER if an out pointer is null; E_OUTOFMEMORY, and the count is 0, the array null, and
+// Gives an array of views; the out pointers are not null. E_OUTOFMEMORY, and the count is 0, the array null, and
 // nothing is left behind.
 HRESULT GiveViews(const std::vector<ResTreeNode*>& nodes, AdapterObserverSet* observers, ULONG* count,
                   IzkhwResourceTreeNode*** views);

@@ -77,7 +77,7 @@ uint32_t ResTreeNode::ReserveOne(const String& owner, uint32_t mode) {
             changed.Erase(changed.Records().size() - 1);
         }
     });
-    if (isDefunct) {
+    if (HasLeft()) {
         return 0;
     }
     Raise(ReservationChanged);

@@ -94,6 +94,15 @@ TEST_F(GResTreePropertiesTest, APathThatEndsInAnEscapedSlashGetsOneMore) {
     EXPECT_EQ(Names(u"/t\\\\", u"includePath=true"), "\n/t\\\\/p");
 }
 
+TEST_F(GResTreePropertiesTest, AnEscapedSlashIsOneAtTheEndOfANameOfAnyLength) {
+    AddText(*AddChild(tree.Root(), u"/"), u"p", u"1");
+    EXPECT_EQ(Names(u"/\\/", u"includePath=true"), "\n/\\//p");
+    AddText(*AddChild(tree.Root(), u"st/"), u"p", u"1");
+    EXPECT_EQ(Names(u"/st\\/", u"includePath=true"), "\n/st\\//p");
+    AddText(*AddChild(tree.Root(), u"s\\/"), u"p", u"1");
+    EXPECT_EQ(Names(u"/s\\\\\\/", u"includePath=true"), "\n/s\\\\\\//p");
+}
+
 TEST_F(GResTreePropertiesTest, SlashesAndBackslashesInPropertyNamesAreEscaped) {
     ResTreeNode* const node = AddChild(tree.Root(), u"n");
     AddText(*node, u"x/y\\z", u"1");

@@ -2,6 +2,7 @@
 
 #include <gtest/gtest.h>
 
+#include "interfaces/support/HostObserver.h"
 #include "interfaces/support/NodeViewTest.h"
 #include "interfaces/support/ProjectItems.h"
 #include "support/FaultyFileSystem.h"
@@ -52,6 +53,14 @@ TEST_F(NodeStub, IsNotReadForWhatIsThere) {
     EXPECT_EQ(view->Unreserve(In(u"me")), S_FALSE);
     EXPECT_FALSE(IsLoaded());
     EXPECT_EQ(files.Count(FileCall::OpenText), 0U);
+}
+
+TEST_F(NodeStub, IsNotReadWhenARegistrationEnds) {
+    HostObserver observer;
+    ASSERT_EQ(view->Advise(&observer, PropertyChanged, 7), S_OK);
+    EXPECT_EQ(view->Unadvise(&observer, 7, 0), S_OK);
+    EXPECT_FALSE(IsLoaded());
+    EXPECT_EQ(observer.Take(), "");
 }
 
 TEST_F(NodeStub, IsReadOnce) {

@@ -171,6 +171,14 @@ TEST_F(DeferredLoad, EntryIsKnownInAnyLetterCase) {
     EXPECT_EQ(TextAt(stub, u"V"), "1");
 }
 
+TEST_F(DeferredLoad, EntryIsKnownWithASignThatCountsForNothing) {
+    Write("board.xml", "<B><V>1</V></B>");
+    ResTreeNode& stub = Stub();
+    stub.SetProperty(u":Deferred\u00ADLoadPath", u"board.xml");
+    EXPECT_FALSE(stub.EnsureDeferredLoaded());
+    EXPECT_EQ(TextAt(stub, u"V"), "1");
+}
+
 TEST_F(DeferredLoad, EntryMayGetItsKeyByARename) {
     Write("board.xml", "<B><V>1</V></B>");
     ResTreeNode& stub = Stub();

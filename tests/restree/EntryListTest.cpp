@@ -206,6 +206,21 @@ TEST(EntryList, DetachGivesThePositionOfTheFollower) {
     }
 }
 
+TEST(EntryList, NothingFollowsTheLastEntryThatIsDetached) {
+    for (const uint32_t count : {1u, 3u, 32u, 33u, 300u}) {
+        EntryList list(true);
+        for (uint32_t i = 0; i < count; ++i) {
+            list.Insert(EntryList::End(), MakeNumbered(u"k", i));
+        }
+        for (uint32_t left = count; left > 0; --left) {
+            const EntryPosition last = list.AtIndex(left - 1);
+            NodeEntry* entry = list.At(last);
+            ASSERT_TRUE(list.Detach(last).IsEnd()) << left << " of " << count;
+            NodeEntry::Release(entry);
+        }
+    }
+}
+
 TEST(EntryList, ListThatWasEmptiedTakesEntriesAgain) {
     for (const bool ordered : {false, true}) {
         EntryList list(ordered);

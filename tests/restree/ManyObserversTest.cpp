@@ -139,6 +139,32 @@ TEST(ManyObservers, ThatStayKeepTheirOrder) {
     root->RemoveObserver(&observer, -1, false);
 }
 
+// Places that are closed up take the flags of their records along.
+TEST(ManyObservers, TheOneThatAloneAsksForAFlagHearsItWhereverItComesToStand) {
+    constexpr int some = 200;
+    for (const int only : {0, 1, 63, 64, 65, 127, 128, some - 1}) {
+        ContextObserver observer;
+        const auto root = MakeRootNode();
+        for (int i = 0; i < some; ++i) {
+            root->AddObserver(&observer, i == only ? NodeNameChanged | PropertyAdded : NodeNameChanged, i);
+        }
+        std::vector<int32_t> left;
+        for (int i = 0; i < some; ++i) {
+            if (i != only && i % 3 != 0) {
+                root->RemoveObserver(&observer, i, false);
+            } else {
+                left.push_back(i);
+            }
+        }
+        root->Raise(PropertyAdded);
+        EXPECT_EQ(observer.heard, std::vector<int32_t>{only});
+        observer.heard.clear();
+        root->Raise(NodeNameChanged);
+        EXPECT_EQ(observer.heard, left);
+        root->RemoveObserver(&observer, -1, false);
+    }
+}
+
 TEST(ManyObservers, MayAllGoInOneNotice) {
     ContextObserver observer;
     const auto root = MakeRootNode();

@@ -131,6 +131,12 @@ TEST(MakeRelativeNodePath, EmptyComponentsCount) {
     EXPECT_EQ(Relative(u"a", u"/a"), u"../../a");
 }
 
+TEST(MakeRelativeNodePath, BlanksBelongToComponents) {
+    EXPECT_EQ(Relative(u"/a/b", u"/a /c"), u"../../a/b");
+    EXPECT_EQ(Relative(u"/a /b", u"/a/c"), u"../../a /b");
+    EXPECT_EQ(Relative(u"/ a", u"/a"), u"../ a");
+}
+
 TEST(MakeRelativeNodePath, BackslashInTheSharedPartOrTheBaseLeavesTheRestAlone) {
     EXPECT_EQ(Relative(u"/a\\/b/c/d", u"/a\\/b/e"), u"../c/d");
     EXPECT_EQ(Relative(u"/a/b", u"/c\\/d/e"), u"../../a/b");

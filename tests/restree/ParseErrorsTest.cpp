@@ -311,6 +311,11 @@ TEST_F(ParseErrorsOfFiles, ContextOfUtf16IsItsBytesUpToTheFirstNul) {
               Heading(1, 6) + "mismatched tag\n   " + StrayByte(0xFF) + StrayByte(0xFE) + "<B\n");
 }
 
+TEST_F(ParseErrorsOfFiles, ContextOfUtf16BeginsWithTheDocumentOnAnyLine) {
+    EXPECT_EQ(ErrorsOfFile(std::string("\xFF\xFE<\0A\0>\0\n\0<\0C\0>\0\n\0<\0/\0B\0>\0", 26)),
+              Heading(3, 2) + "mismatched tag\n   " + StrayByte(0xFF) + StrayByte(0xFE) + "<B\n");
+}
+
 TEST_F(ParseErrorsOfFiles, FileWithoutAnElementBehindAFullBlock) {
     const std::string bytes = "<!--" + std::string(4089, 'x') + "-->";
     ASSERT_EQ(bytes.size(), 4096u);

@@ -207,6 +207,19 @@ TEST_P(MergeOrdered, OnlyTheFirstOfEqualChildrenIsReplaced) {
               "    n=3\n");
 }
 
+TEST_P(MergeOrdered, EntryOfAnotherKindBehindTheReplacedOneStays) {
+    AddText(*AddChild(*target, u"c"), u"n", u"1");
+    AddChild(*target, u"c", u"Other");
+    AddText(*target, u"c", u"2");
+    AddText(*AddChild(*source, u"c"), u"n", u"3");
+    target->MergeFrom(*source, false);
+    EXPECT_EQ(Dump(),
+              "  c:Other\n"
+              "  c=2\n"
+              "  c:T\n"
+              "    n=3\n");
+}
+
 TEST_P(MergeOrdered, MatchingChildStaysAndANewOneStandsInFrontOfTheLastEntry) {
     // The end less one for the entry found, and nothing is removed: the copy ends up in front of the last entry.
     AddText(*AddChild(*target, u"c"), u"n", u"1");

@@ -71,6 +71,17 @@ TEST(TypeTable, NamesAreBlindToCase) {
     EXPECT_EQ(ExactText(table.Find(u"TYPE")->name), "type");
 }
 
+// A soft hyphen counts for nothing, a letter of another width for the letter.
+TEST(TypeTable, NamesOutsideAsciiAreFoundByTheLanguage) {
+    TypeTable table;
+    table.AddTypeRelation(u"Base", u"");
+    table.AddTypeRelation(u"Plain", u"Base");
+    table.AddTypeRelation(u"\u00C9tude", u"Base");
+    EXPECT_EQ(Bases(table, u"Pla\u00ADin"), "Base");
+    EXPECT_EQ(Bases(table, u"\u00E9tude"), "Base");
+    EXPECT_EQ(Bases(table, u"\u00E9tud\u00E9"), "?");
+}
+
 TEST(TypeTable, UnknownTypeHasNoRecord) {
     const TypeTable table;
     EXPECT_EQ(table.Find(u"A"), nullptr);

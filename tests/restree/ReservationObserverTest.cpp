@@ -360,6 +360,41 @@ TEST_F(DeferredReservations, RefusalReadsNothingButTheTextDoes) {
     stub->RemoveObserver(&observer, -1, false);
 }
 
+TEST_F(DeferredReservations, WatchingReservationsReadsTheDependants) {
+    Write("stub.xml", "<N><Reserves>../a</Reserves></N>");
+    ChangeLog log;
+    LoggingObserver observer(log, "o");
+    EXPECT_TRUE(stub->AddObserver(&observer, ReservationChanged, 7));
+    EXPECT_TRUE(IsLoaded());
+    At(*root, u"a").ReserveOne(u"x", ReserveRead);
+    EXPECT_EQ(log.Take(), "o: s ReservationChanged #7\n");
+    EXPECT_TRUE(stub->RemoveObserver(&observer, -1, false));
+}
+
+// The search for the text loads, and what hears of the load takes the node away: nothing is held then. A node goes in
+// another way while anything else in the process is observed.
+class RemovingLoad : public DeferredReservations, public ::testing::WithParamInterface<bool> {};
+
+INSTANTIATE_TEST_SUITE_P(WithAndWithoutOtherObservers, RemovingLoad, ::testing::Bool());
+
+TEST_P(RemovingLoad, NodeThatItsOwnLoadTakesAwayIsRefused) {
+    Write("stub.xml", "<N><Reserves>../a</Reserves><Z name='z'/></N>");
+    ResTreeNode* z = AddChild(*stub, u"z", u"Other");
+    ChangeLog log;
+    LoggingObserver observer(log, "o");
+    observer.reaction = [this](ResTreeNode&, uint32_t) { root->RemoveEntryByName(u"s"); };
+    z->AddObserver(&observer, NodeDeleting, 7);
+    CountingObserver other;
+    if (GetParam()) {
+        At(*root, u"b").AddObserver(&other, NodeNameChanged, 0);
+    }
+    EXPECT_EQ(stub->ReserveOne(u"x", ReserveWrite), 0u);
+    EXPECT_EQ(log.Take(), "o: z NodeDeleting #7\n");
+    EXPECT_EQ(root->FindRaw(u"s"), nullptr);
+    At(*root, u"b").RemoveObserver(&other, -1, false);
+    EXPECT_EQ(ReservationText(At(*root, u"a")), "(none)");
+}
+
 TEST_F(DeferredReservations, DescendantsAreRead) {
     Write("stub.xml", "<N><Z name='z'/></N>");
     EXPECT_TRUE(root->ReserveAll(u"x", ReserveWrite, u""));

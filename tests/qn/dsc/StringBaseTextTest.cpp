@@ -287,6 +287,16 @@ TEST(StringBaseFindFirstOf, FindsAUnitOfTheSet) {
     EXPECT_EQ(text.FindFirstOf(u"XYZ", 0), none);
 }
 
+TEST(StringBaseFindFirstOf, StartsAtTheFrontUnlessToldOtherwise) {
+    const String text(u"/a/");
+    EXPECT_EQ(text.FindFirstOf(String(u"\\/")), 0U);
+    EXPECT_EQ(text.FindFirstOf(u"\\/"), 0U);
+    EXPECT_EQ(text.FindFirstOf(u"\\/"sv), 0U);
+    EXPECT_EQ(text.FindFirstNotOf(String(u"a")), 0U);
+    EXPECT_EQ(text.FindFirstNotOf(u"a"), 0U);
+    EXPECT_EQ(text.FindFirstNotOf(u"a"sv), 0U);
+}
+
 TEST(StringBaseFindFirstOf, FindsNothingInTheEmptySetOrBehindTheEnd) {
     EXPECT_EQ(String(u"abc").FindFirstOf(String(), 0), none);
     EXPECT_EQ(String(u"abc").FindFirstOf(u"abc", 3), none);
@@ -348,6 +358,8 @@ TEST(StringBaseCompare, IsBlindToLetterCase) {
     EXPECT_FALSE(text != u"ABC");
     EXPECT_FALSE(text < String(u"ABC"));
     EXPECT_FALSE(String(u"ABC") < text);
+    EXPECT_FALSE(text < u"ABC");
+    EXPECT_FALSE(u"ABC" < text);
     EXPECT_EQ(Compare(text, String(u"ABC")), 0);
 }
 

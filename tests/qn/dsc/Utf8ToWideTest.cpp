@@ -136,6 +136,18 @@ TEST(Utf8ToWide, AFaultAnywhereInALongTextIsRefused) {
     }
 }
 
+TEST(IsAscii, SeesAByteOutsideAsciiAnywhereInATextOfAnyLength) {
+    for (size_t length = 0; length < 70; ++length) {
+        std::string bytes(length, '\x7F');
+        ASSERT_TRUE(IsAscii(bytes.data(), length)) << length;
+        for (size_t place = 0; place < length; ++place) {
+            bytes[place] = '\x80';
+            ASSERT_FALSE(IsAscii(bytes.data(), length)) << length << " " << place;
+            bytes[place] = '\x7F';
+        }
+    }
+}
+
 TEST(Utf8ToWide, PlainTextOfEveryLengthPasses) {
     std::string bytes;
     std::u16string expected;

@@ -188,6 +188,12 @@ TEST(Compare, LetterCaseOfPairsDoesNotCountAsOnlyLinuxOrdersSo) {
     ExpectEqual(u"\U00010400", u"\U00010428");
 }
 
+// The last letter of an alphabet, of which the next one's small form is another.
+TEST(Compare, LetterCaseOfPairsReachesToTheirLastLetterAsOnlyLinuxOrdersSo) {
+    EXPECT_EQ(Compare(u"\U00010427", u"\U0001044F"), 0);
+    EXPECT_NE(Compare(u"\U00010427", u"\U00010428"), 0);
+}
+
 TEST(Compare, CharactersWithoutAWeightDoNotCount) {
     ExpectEqual(u"\u00ad", u"");
     ExpectEqual(u"a\u00adb", u"AB");

@@ -45,6 +45,12 @@ TEST(LinuxPaths, ANameMatchesInAnyLetterCase) {
     EXPECT_FALSE(IsExistingFile(folder.System(u"Target\\QN\\Board_Resource.xml")));
 }
 
+TEST(LinuxPaths, ANameBelowTheRootMatchesInAnyLetterCase) {
+    EXPECT_TRUE(IsDirectory(u"C:\\TMP"));
+    EXPECT_TRUE(IsDirectory(u"C:\\uSR\\BIN"));
+    EXPECT_FALSE(IsDirectory(u"C:\\No such folder"));
+}
+
 TEST(LinuxPaths, TheNameAsItStandsWins) {
     const TemporaryFolder folder;
     folder.WriteFile("FILE", "1");

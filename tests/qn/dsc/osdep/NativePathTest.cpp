@@ -42,6 +42,11 @@ TEST(NativePath, OtherDrivesNameNothing) {
     EXPECT_EQ(Native(u"D:opt"), namesNothing);
 }
 
+TEST(NativePath, TheRootOfADriveOfTwoLettersNamesNothing) {
+    EXPECT_EQ(Native(u"AB:\\"), namesNothing);
+    EXPECT_EQ(Native(u"ab:/"), namesNothing);
+}
+
 TEST(NativePath, NetworkPathsNameNothing) {
     EXPECT_EQ(Native(u"\\\\server\\share"), namesNothing);
     EXPECT_EQ(Native(u"\\\\"), namesNothing);
@@ -121,6 +126,16 @@ TEST(NativePath, RelativePathsStartAtTheRootIfThatIsTheWorkingFolder) {
 
 TEST(NativePath, AColonBehindTheDriveIsPartOfAName) {
     EXPECT_EQ(Native(u"C:\\a:b\\C:\\x"), "/a:b/C:/x");
+}
+
+TEST(NativePath, AColonBehindOtherSignsThanLettersIsPartOfAName) {
+    const WorkingFolderScope scope("/");
+    EXPECT_EQ(Native(u"a1:\\x"), "/a1:/x");
+    EXPECT_EQ(Native(u"1a:\\x"), "/1a:/x");
+    EXPECT_EQ(Native(u"1:\\x"), "/1:/x");
+    EXPECT_EQ(Native(u"abc:\\x"), "/abc:/x");
+    EXPECT_EQ(Native(u"ab:x"), "/ab:x");
+    EXPECT_EQ(Native(u"ab-\\x"), "/ab-/x");
 }
 
 TEST(NativePath, NamesAreEncodedByTheRuleForNativeText) {
