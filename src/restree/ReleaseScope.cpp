@@ -1,5 +1,6 @@
 #include "restree/ReleaseScope.h"
 
+#include <new>
 #include <vector>
 
 #include "restree/NodeEntry.h"
@@ -17,6 +18,8 @@ struct Kept {
 
 constinit thread_local uint32_t depth = 0;
 constinit thread_local uint64_t countOfNodes = 0;
+// Of nodes, reserved and not yet taken.
+constinit thread_local uint32_t heldPlaces = 0;
 
 // Null while nothing is kept. Neither is destroyed at the end of a thread: the tree of the process is taken down when
 // that of the main thread is over.
@@ -68,12 +71,26 @@ void ReleaseScope::Reserve() {
     if (kept == nullptr) {
         kept = new Kept;
     }
-    if (kept->nodes.size() == kept->nodes.capacity()) {
-        kept->nodes.reserve(kept->nodes.size() * 2 + 8);
+    const size_t taken = kept->nodes.size() + heldPlaces;
+    if (taken >= kept->nodes.capacity()) {
+        kept->nodes.reserve(taken * 2 + 8);
     }
     if (kept->entries.size() == kept->entries.capacity()) {
         kept->entries.reserve(kept->entries.size() * 2 + 8);
     }
+}
+
+bool ReleaseScope::TryReserve() noexcept {
+    try {
+        Reserve();
+    } catch (const std::bad_alloc&) {
+        return false;
+    }
+    return true;
+}
+
+void ReleaseScope::HoldPlace(int32_t change) noexcept {
+    heldPlaces += static_cast<uint32_t>(change);
 }
 
 bool ReleaseScope::HoldsWholeNodes() noexcept {

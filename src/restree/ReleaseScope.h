@@ -26,8 +26,13 @@ class ReleaseScope {
     // How many nodes have been kept on this thread so far, those of former scopes included.
     static uint64_t CountOfNodes() noexcept;
 
-    // Make sure that the next Keep can't fail. Throws bad_alloc.
+    // Makes sure that the next Keep can't fail. Throws bad_alloc; TryReserve gives false instead.
     static void Reserve();
+    static bool TryReserve() noexcept;
+
+    // With 1: the place that was reserved last waits for a later Keep, and what is reserved meanwhile comes on top.
+    // With -1: it is for the next one.
+    static void HoldPlace(int32_t change) noexcept;
 
     // Takes over what has left a tree; only while a scope is active, and after Reserve.
     static void Keep(ResTreeNode* node) noexcept;
