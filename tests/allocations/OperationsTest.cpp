@@ -144,33 +144,29 @@ class Trial {
     std::unique_ptr<Scene> scene;
 };
 
-class OperationsOutOfMemory : public testing::TestWithParam<Operation> {
-  protected:
-    // The outcomes that came up with the contents in memory.
-    Names outcomes;
-    uint64_t failures = 0;
-
-    void FailEachInTurn() {
-        for (const Contents contents : {Contents::InMemory, Contents::InFile}) {
-            if (contents == Contents::InFile && GetParam().answerFromFile.empty()) {
-                continue;
-            }
-            for (const bool fromThenOn : {false, true}) {
-                Trial trial(GetParam(), contents, fromThenOn);
-                failures += trial.Run();
-                if (contents == Contents::InMemory) {
-                    outcomes.merge(trial.outcomes);
-                }
-            }
-        }
-        outcomes.erase(GetParam().answer);
-        RecordProperty("failures", std::to_string(failures));
-    }
-};
+using OperationsOutOfMemory = testing::TestWithParam<Operation>;
 
 TEST_P(OperationsOutOfMemory, EndInOrder) {
-    FailEachInTurn();
-    // Each outcome that the table has does come up.
+    uint64_t failures = 0;
+    for (const bool fromThenOn : {false, true}) {
+        failures += Trial(GetParam(), Contents::InMemory, fromThenOn).Run();
+        if (!GetParam().answerFromFile.empty()) {
+            failures += Trial(GetParam(), Contents::InFile, fromThenOn).Run();
+        }
+    }
+    RecordProperty("failures", std::to_string(failures));
+}
+
+// That the tables say nothing that never comes up. On Windows the boundary's memory is the system's: it can't be made
+// to fail.
+TEST_P(OperationsOutOfMemory, GiveEachOutcomeAsOnlyLinuxOwnsTheMemory) {
+    Names outcomes;
+    for (const bool fromThenOn : {false, true}) {
+        Trial trial(GetParam(), Contents::InMemory, fromThenOn);
+        trial.Run();
+        outcomes.merge(trial.outcomes);
+    }
+    outcomes.erase(GetParam().answer);
     EXPECT_EQ(outcomes, Names(GetParam().withoutMemory.begin(), GetParam().withoutMemory.end()));
 }
 
@@ -204,7 +200,7 @@ TEST(OperationsOutOfMemoryTables, HaveEveryOperationOfTheHeaders) {
             declared.insert(each.name);
         }
     }
-    // That the headers were read, and as they are: 52 of nodes, trees, owner and selector, 22 functions.
+    // That the headers were read, and as they are: 3 of IUnknown, 56 of nodes, trees, owner and selector, 22 functions.
     EXPECT_EQ(declared.size(), 81U);
     Names tried;
     for (const Operation& each : AllOperations()) {
