@@ -65,8 +65,9 @@ void ResTreeNode::ReleaseLostEntries() {
         if (entry->Child() != nullptr) {
             ResTreeNode* child = entry->TakeChild();
             // Destroyed when the scope ends, if there is one, so that nodes lost inside each other need no stack.
-            if (ReleaseScope::IsActive() && ReleaseScope::TryReserve()) {
+            if (ReleaseScope::IsActive()) {
                 child->parent = nullptr;
+                ReleaseScope::TryReserve();
                 ReleaseScope::Keep(child);
             } else {
                 DestroySubtree(child);
@@ -149,10 +150,7 @@ void ResTreeNode::ReleaseNode(ResTreeNode* node) noexcept {
         return;
     }
     if (ReleaseScope::IsActive()) {
-        // What the end of the node leads to is kept as well, but not in its place.
-        ReleaseScope::HoldPlace(1);
         node->TearDown();
-        ReleaseScope::HoldPlace(-1);
         ReleaseScope::Keep(node);
     } else {
         delete node;
@@ -161,8 +159,9 @@ void ResTreeNode::ReleaseNode(ResTreeNode* node) noexcept {
 
 void ResTreeNode::Destroy(ResTreeNode* root) noexcept {
     if (root != nullptr) {
+        // Keeping it needs no room.
         if (ReleaseScope::IsActive()) {
-            ReleaseScope::Reserve();
+            ReleaseScope::TryReserve();
         }
         ReleaseNode(root);
     }

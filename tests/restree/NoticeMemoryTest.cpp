@@ -145,6 +145,21 @@ TEST(NodesWithoutMemory, EndWithAllBelow) {
     }
 }
 
+// An observer may give back the last view of a copy.
+TEST(NodesWithoutMemory, EndAsRootsInsideAnOperation) {
+    for (const bool isWatched : {true, false}) {
+        for (uint64_t nth = 1; nth <= 40; ++nth) {
+            Counter counter;
+            int ends = 0;
+            auto root = isWatched ? MakeWatchedTree(counter, ends) : MakeRootNode();
+            AddText(*AddChild(*root, u"D"), u"Text", u"1");
+            const ReleaseScope scope;
+            const AllocationFaultScope fault(nth, true);
+            ResTreeNode::Destroy(root.release());
+        }
+    }
+}
+
 // Further up the stack something may still hold what goes.
 TEST(NodesWithoutMemory, EndInsideAnOperation) {
     for (const bool fromThenOn : {false, true}) {
