@@ -19,7 +19,9 @@
  * Out pointers must not be null where E_POINTER isn't among the results, unless they are called optional. E_OUTOFMEMORY
  * is given where a string, an array or a view can't be made; what was to be given is then null and its count 0. Where
  * memory for the tree itself runs out, or a reservation's owner is no GUID where one is needed, a C++ exception leaves
- * the operation.
+ * the operation; nothing is given then. Of several changes those that were made stay, and the next call makes the rest;
+ * what Reserve and its like took is let go again, as far as there is memory for that. Contents that memory ran out for
+ * while they were read stay as far as they were read.
  *
  * One thread at a time for all of a tree, the calls of observers included. */
 #ifndef ZKFPGA_TREE_NODE_H
@@ -115,7 +117,8 @@ struct IzkhwResourceTreeNode : public IUnknown {
 
     /* Reads `fragment`, the inside of an element in the language of resource files, into the node, as if it stood in
      * the node's own element. Observers hear of all of it at the end. S_OK. E_FAIL: it isn't well formed; what stood in
-     * front of the fault has been read, and a report stands in the property "XMLParseErrors". */
+     * front of the fault has been read, and a report stands in the property "XMLParseErrors". Or there is no memory for
+     * a parser, and nothing has been read. */
     virtual HRESULT STDMETHODCALLTYPE LoadContent(LPCWSTR fragment) = 0;
 
     /* Removes the entry of that name, with all below it, if there is one. May load. Always S_OK. */
@@ -281,7 +284,8 @@ struct IzkhwResourceTreeNode5 : public IzkhwResourceTreeNode4 {
      * same place below `other`; each property has an equal one there, except "Value" and "Interface", which aren't
      * compared, and "SupportedValues", of whose comma list each piece must be among the other's. With `skipLocalized` a
      * property that is localised on either side isn't compared. Asks both only through these interfaces, so `other`
-     * may be an object of the host. A null `other` gives false. S_OK. E_POINTER: null `result`. */
+     * may be an object of the host. What either can't say for lack of memory counts as not there. A null `other` gives
+     * false. S_OK. E_POINTER: null `result`. */
     virtual HRESULT STDMETHODCALLTYPE IsCompatibleWithEx(IzkhwResourceTreeNode* other, BOOL* result,
                                                          BOOL skipLocalized) = 0;
 

@@ -1,5 +1,7 @@
 #include "restree/ChangeDispatch.h"
 
+#include <new>
+
 #include "restree/NodeAttachments.h"
 
 namespace zkhw {
@@ -17,6 +19,9 @@ void ChangeDispatch::Run(ResTreeNode& node, uint32_t mask) {
     while (!dispatch.steps.empty()) {
         dispatch.Advance();
     }
+    if (dispatch.isIncomplete) {
+        throw std::bad_alloc();
+    }
 }
 
 ChangeDispatch::~ChangeDispatch() {
@@ -28,7 +33,13 @@ ChangeDispatch::~ChangeDispatch() {
     }
 }
 
+// Throws bad_alloc, and nothing has changed.
 void ChangeDispatch::Open(ResTreeNode& node, uint32_t mask) {
+    // Before the pass begins: with room for the node and for both turns of one that watches it, no step of it fails.
+    constexpr size_t room = 3;
+    if (steps.capacity() - steps.size() < room) {
+        steps.reserve(steps.size() * 2 + room);
+    }
     steps.push_back({&node, 0, mask, 0, 0, 0, false, nullptr});
     if (node.attachments) {
         steps.back().outer = node.attachments->dispatch;
@@ -84,7 +95,13 @@ void ChangeDispatch::RaiseInTurn(ResTreeNode& node, uint32_t changes) {
     }
     node.pendingChanges |= changes;
     if (node.suspendCount == 0) {
-        Open(node, allChanges);
+        try {
+            Open(node, allChanges);
+        } catch (const std::bad_alloc&) {
+            // The others are told all the same, so that none stays held back. What waits here comes with the next
+            // change of the node.
+            isIncomplete = true;
+        }
     }
 }
 

@@ -219,6 +219,14 @@ void ObserverList::Remove(ObserverRecord& record) noexcept {
     }
 }
 
+void ObserverList::ForgetObserver(const ResTreeNodeChangeObserver* observer) noexcept {
+    for (ObserverRecord& record : records) {
+        if (record.observer == observer) {
+            record.observer = nullptr;
+        }
+    }
+}
+
 void ObserverList::CloseUpIfWorthwhile() noexcept {
     const size_t removed = markedCount + emptyCount;
     if (removed != 0 && (records.size() <= shortLimit || removed >= records.size() / 2)) {

@@ -81,6 +81,9 @@ class ObserverList {
     // Takes a record out, one that is not removed yet. While notices are under way it keeps its place, marked.
     void Remove(ObserverRecord& record) noexcept;
 
+    // Its records stay, without an observer. For an observer that goes together with the list.
+    void ForgetObserver(const ResTreeNodeChangeObserver* observer) noexcept;
+
     // Notices are under way: places stay as they are.
     void SetNotifying(bool isNotifying) noexcept { notifying = isNotifying; }
 

@@ -1,5 +1,7 @@
 #include "restree/ReleaseScope.h"
 
+#include <new>
+#include <utility>
 #include <vector>
 
 #include "restree/NodeEntry.h"
@@ -17,24 +19,34 @@ struct Kept {
 
 constinit thread_local uint32_t depth = 0;
 constinit thread_local uint64_t countOfNodes = 0;
+// Nodes that have ended and that `kept` had no room for, each with the next one as its parent.
+constinit thread_local ResTreeNode* withoutRoom = nullptr;
 
 // Null while nothing is kept. Neither is destroyed at the end of a thread: the tree of the process is taken down when
 // that of the main thread is over.
 constinit thread_local Kept* kept = nullptr;
 
-// Releasing a node may call an observer, which may remove more.
-void ReleaseKept(void (*release)(ResTreeNode*)) {
-    while (!(kept->nodes.empty() && kept->entries.empty())) {
-        if (!kept->nodes.empty()) {
-            ResTreeNode* node = kept->nodes.back();
-            kept->nodes.pop_back();
-            release(node);
-        } else {
-            NodeEntry* entry = kept->entries.back();
-            kept->entries.pop_back();
-            NodeEntry::Release(entry);
-        }
+// The next node to release, or null.
+template <typename Next>
+ResTreeNode* TakeNode(Next next) {
+    if (withoutRoom != nullptr) {
+        return std::exchange(withoutRoom, next(withoutRoom));
     }
+    if (kept == nullptr || kept->nodes.empty()) {
+        return nullptr;
+    }
+    ResTreeNode* node = kept->nodes.back();
+    kept->nodes.pop_back();
+    return node;
+}
+
+NodeEntry* TakeEntry() {
+    if (kept == nullptr || kept->entries.empty()) {
+        return nullptr;
+    }
+    NodeEntry* entry = kept->entries.back();
+    kept->entries.pop_back();
+    return entry;
 }
 
 }  // namespace
@@ -44,12 +56,18 @@ ReleaseScope::ReleaseScope() noexcept {
 }
 
 ReleaseScope::~ReleaseScope() {
-    // The last scope stands until all is released.
-    if (depth == 1 && kept != nullptr) {
-        ReleaseKept([](ResTreeNode* node) {
-            node->parent = nullptr;
-            delete node;
-        });
+    // The last scope stands until all is released: that may call an observer, which may remove more.
+    if (depth == 1 && (kept != nullptr || withoutRoom != nullptr)) {
+        while (true) {
+            if (ResTreeNode* node = TakeNode([](const ResTreeNode* last) { return last->parent; })) {
+                node->parent = nullptr;
+                delete node;
+            } else if (NodeEntry* entry = TakeEntry()) {
+                NodeEntry::Release(entry);
+            } else {
+                break;
+            }
+        }
         delete kept;
         kept = nullptr;
     }
@@ -76,14 +94,31 @@ void ReleaseScope::Reserve() {
     }
 }
 
+bool ReleaseScope::TryReserve() noexcept {
+    try {
+        Reserve();
+    } catch (const std::bad_alloc&) {
+        return false;
+    }
+    return true;
+}
+
 bool ReleaseScope::HoldsWholeNodes() noexcept {
     return kept != nullptr && kept->hasWholeNodes;
 }
 
 void ReleaseScope::Keep(ResTreeNode* node) noexcept {
     node->isKept = true;
-    kept->hasWholeNodes |= !node->isDefunct;
     ++countOfNodes;
+    if (kept == nullptr || kept->nodes.size() == kept->nodes.capacity()) {
+        if (!node->isDefunct) {
+            node->TearDown();
+        }
+        node->parent = withoutRoom;
+        withoutRoom = node;
+        return;
+    }
+    kept->hasWholeNodes |= !node->isDefunct;
     kept->nodes.push_back(node);
 }
 

@@ -26,10 +26,13 @@ class ReleaseScope {
     // How many nodes have been kept on this thread so far, those of former scopes included.
     static uint64_t CountOfNodes() noexcept;
 
-    // Make sure that the next Keep can't fail. Throws bad_alloc.
+    // Makes sure that the next Keep of an entry can't fail, and that a node stays whole in it. Throws bad_alloc;
+    // TryReserve gives false instead.
     static void Reserve();
+    static bool TryReserve() noexcept;
 
-    // Takes over what has left a tree; only while a scope is active, and after Reserve.
+    // Takes over what has left a tree; only while a scope is active, and, for an entry, after Reserve. A node that
+    // there is no room for ends here, but its memory is kept as well.
     static void Keep(ResTreeNode* node) noexcept;
     static void Keep(NodeEntry* entry) noexcept;
 };

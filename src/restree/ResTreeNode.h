@@ -50,7 +50,8 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     // A detached node with a copy of `sourceTable`, or with no table if that is null.
     ResTreeNode(std::u16string_view name, std::u16string_view type, bool ordered, const TypeTable* sourceTable);
 
-    // Removes the entries one by one from the first, with the notices that go with it, then ends all watching.
+    // Removes the entries one by one from the first, with the notices that go with it, then ends all watching. What no
+    // notice can be given of for lack of memory goes without.
     ~ResTreeNode() override;
 
     // Deletes a root; null does nothing. While a ReleaseScope stands, which an operation of the tree further up the
@@ -215,7 +216,7 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     bool AddObserver(ResTreeNodeChangeObserver* observer, uint32_t mask, int32_t context);
 
     // Ends what AddObserver began; a `context` of -1 stands for all. With `recursive` on all nodes below too, which
-    // loads deferred contents. True if anything was removed.
+    // loads deferred contents. True if anything was removed. Without `recursive` no lack of memory keeps it from that.
     bool RemoveObserver(ResTreeNodeChangeObserver* observer, int32_t context, bool recursive);
 
     // Hold delivery back; nests. BeginChanges gives the flags raised so far and clears them. EndChanges puts `saved`
@@ -375,6 +376,7 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     void RetireDescendants();
     bool StillHolds(const NodeEntry* entry) const;
     void TearDown() noexcept;
+    void EndQuietly() noexcept;
     void ReleaseLostEntries();
     void ReleaseObservers();
     static void ReleaseNode(ResTreeNode* node) noexcept;
@@ -395,8 +397,9 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     bool Unregister(ResTreeNodeChangeObserver* observer, int32_t context);
     bool WatchAncestors();
     bool WatchDependants();
-    void Withdraw(ResTreeNodeChangeObserver* observer, int32_t context);
     static bool RemoveRecords(ResTreeNode& node, ResTreeNodeChangeObserver* observer, int32_t context);
+    static bool UnregisterAll(ResTreeNode& node, ResTreeNodeChangeObserver* observer, int32_t context);
+    static void EndWatchesOf(ResTreeNode& top);
     void ForgetWatching() noexcept;
     static void EndWatch(ObserverRecord& record) noexcept;
     bool AnyActiveObserver(uint32_t mask) const;

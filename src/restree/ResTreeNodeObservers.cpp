@@ -168,29 +168,43 @@ bool ResTreeNode::WatchDependants() {
     return anyNew;
 }
 
-// The record `observer`, `context` of `node`, and what nodes no longer have to watch for its sake.
+// The record `observer`, `context` of `node`, and what nodes no longer have to watch for its sake. Without memory to
+// find that out nodes may go on watching dependants, which nobody hears of, but none goes on watching those above it:
+// that would reach others.
 bool ResTreeNode::RemoveRecords(ResTreeNode& node, ResTreeNodeChangeObserver* observer, int32_t context) {
+    const ReleaseScope scope;
+    if (!UnregisterAll(node, observer, context)) {
+        return false;
+    }
+    try {
+        EndWatchesOf(node);
+    } catch (const std::bad_alloc&) {
+        for (ResTreeNode* from = &node; from->parent != nullptr && !from->AnyActiveObserver(AncestorChanged);
+             from = from->parent) {
+            UnregisterAll(*from->parent, from, ancestorContext);
+        }
+    }
+    return true;
+}
+
+bool ResTreeNode::UnregisterAll(ResTreeNode& node, ResTreeNodeChangeObserver* observer, int32_t context) {
+    bool any = false;
+    while (node.Unregister(observer, context)) {
+        any = true;
+    }
+    return any;
+}
+
+// `top` has lost a record, so it may have less to watch, and so may those that it has watched.
+void ResTreeNode::EndWatchesOf(ResTreeNode& top) {
     struct Removal {
         ResTreeNode* node;
-        ResTreeNodeChangeObserver* observer;
+        ResTreeNode* observer;
         int32_t context;
     };
-    const ReleaseScope scope;
-    bool removedAny = false;
-    std::vector<Removal> open{{&node, observer, context}};
+    std::vector<Removal> open;
     std::vector<ResTreeNode*> dependants;
-    while (!open.empty()) {
-        const Removal removal = open.back();
-        open.pop_back();
-        ResTreeNode* from = removal.node;
-        bool removed = false;
-        while (from->Unregister(removal.observer, removal.context)) {
-            removed = true;
-        }
-        if (!removed) {
-            continue;
-        }
-        removedAny = true;
+    const auto enter = [&](ResTreeNode* from) {
         if (from->parent != nullptr && !from->AnyActiveObserver(AncestorChanged)) {
             open.push_back({from->parent, from, ancestorContext});
         }
@@ -201,8 +215,15 @@ bool ResTreeNode::RemoveRecords(ResTreeNode& node, ResTreeNodeChangeObserver* ob
                 open.push_back({dependant, from, dependantContext});
             }
         }
+    };
+    enter(&top);
+    while (!open.empty()) {
+        const Removal removal = open.back();
+        open.pop_back();
+        if (UnregisterAll(*removal.node, removal.observer, removal.context)) {
+            enter(removal.node);
+        }
     }
-    return removedAny;
 }
 
 bool ResTreeNode::AddObserver(ResTreeNodeChangeObserver* observer, uint32_t mask, int32_t context) {
@@ -220,29 +241,17 @@ bool ResTreeNode::AddObserver(ResTreeNodeChangeObserver* observer, uint32_t mask
         }
     } catch (...) {
         if (isNew) {
-            Withdraw(observer, context);
+            RemoveRecords(*this, observer, context);
         }
         throw;
     }
     return anyNew;
 }
 
-// Takes back a registration that has failed. Without memory even for that, nodes may go on watching dependants for its
-// sake, which nobody hears of, but none goes on watching those above it: that would reach others.
-void ResTreeNode::Withdraw(ResTreeNodeChangeObserver* observer, int32_t context) {
-    try {
-        RemoveRecords(*this, observer, context);
-    } catch (const std::bad_alloc&) {
-        Unregister(observer, context);
-        ResTreeNode* node = this;
-        while (node->parent != nullptr && !node->AnyActiveObserver(AncestorChanged) &&
-               node->parent->Unregister(node, ancestorContext)) {
-            node = node->parent;
-        }
-    }
-}
-
 bool ResTreeNode::RemoveObserver(ResTreeNodeChangeObserver* observer, int32_t context, bool recursive) {
+    if (!recursive) {
+        return RemoveRecords(*this, observer, context);
+    }
     const ReleaseScope scope;
     bool removedAny = false;
     std::vector<ResTreeNode*> open{this};
@@ -250,15 +259,13 @@ bool ResTreeNode::RemoveObserver(ResTreeNodeChangeObserver* observer, int32_t co
         ResTreeNode* node = open.back();
         open.pop_back();
         removedAny |= RemoveRecords(*node, observer, context);
-        if (recursive) {
-            const size_t first = open.size();
-            for (EntryIterator entry = node->BeginLoaded(); !entry.IsEnd(); ++entry) {
-                if (ResTreeNode* child = entry->Child()) {
-                    open.push_back(child);
-                }
+        const size_t first = open.size();
+        for (EntryIterator entry = node->BeginLoaded(); !entry.IsEnd(); ++entry) {
+            if (ResTreeNode* child = entry->Child()) {
+                open.push_back(child);
             }
-            std::reverse(open.begin() + static_cast<std::ptrdiff_t>(first), open.end());
         }
+        std::reverse(open.begin() + static_cast<std::ptrdiff_t>(first), open.end());
     }
     return removedAny;
 }

@@ -5,6 +5,7 @@
 // ReleaseScope, and an entry that an observer has removed already is known by its kind, EmptyEntry.
 
 #include <algorithm>
+#include <new>
 #include <optional>
 #include <unordered_set>
 #include <utility>
@@ -20,7 +21,7 @@ ResTreeNode::~ResTreeNode() {
     if (!isDefunct) {
         TearDown();
     }
-    // What observers have added to a node that was torn down already.
+    // What observers have added to a node that was torn down already, or what there was no memory to tell of.
     entries.VisitUnordered([](NodeEntry* entry) {
         if (entry->Child() != nullptr) {
             DestroySubtree(entry->TakeChild());
@@ -32,11 +33,20 @@ void ResTreeNode::TearDown() noexcept {
     if (!ObserverCount::IsZero()) {
         const ReleaseScope scope;
         entries.DropIndex();
-        while (!entries.IsEmpty()) {
-            RemoveEntry(entries.At(entries.Begin()));
+        try {
+            while (!entries.IsEmpty()) {
+                RemoveEntry(entries.At(entries.Begin()));
+            }
+        } catch (const std::bad_alloc&) {
+            // What is left goes with the node, and without notices.
         }
-        ForgetWatching();
     }
+    EndQuietly();
+}
+
+// All but the entries.
+void ResTreeNode::EndQuietly() noexcept {
+    ForgetWatching();
     isDefunct = true;
     if (attachments) {
         ReleaseLostEntries();
@@ -54,10 +64,10 @@ void ResTreeNode::ReleaseLostEntries() {
     for (NodeEntry* entry : std::exchange(attachments->lostEntries, {})) {
         if (entry->Child() != nullptr) {
             ResTreeNode* child = entry->TakeChild();
+            // Destroyed when the scope ends, if there is one, so that nodes lost inside each other need no stack.
             if (ReleaseScope::IsActive()) {
-                // Destroyed when the scope ends, so that nodes lost inside each other need no stack.
                 child->parent = nullptr;
-                ReleaseScope::Reserve();
+                ReleaseScope::TryReserve();
                 ReleaseScope::Keep(child);
             } else {
                 DestroySubtree(child);
@@ -81,13 +91,17 @@ void ResTreeNode::ReleaseObservers() {
         if (record.chained != nullptr) {
             EndWatch(record);
         } else if (observer != nullptr && observer->DeleteWithNode()) {
-            deleted.insert(observer);
+            try {
+                deleted.insert(observer);
+            } catch (const std::bad_alloc&) {
+                observers.ForgetObserver(observer);
+            }
             delete observer;
         }
     }
 }
 
-// Destroys a subtree that nobody observes. The nodes still to come are threaded through their parent pointers.
+// Destroys a subtree, of which nobody is told. The nodes still to come are threaded through their parent pointers.
 void ResTreeNode::DestroySubtree(ResTreeNode* top) noexcept {
     ResTreeNode* pending = top;
     pending->parent = nullptr;
@@ -110,7 +124,7 @@ void ResTreeNode::DestroySubtree(ResTreeNode* top) noexcept {
                 }
             }
         }
-        node->parent = nullptr;
+        node->EndQuietly();
         delete node;
     }
 }
@@ -145,8 +159,9 @@ void ResTreeNode::ReleaseNode(ResTreeNode* node) noexcept {
 
 void ResTreeNode::Destroy(ResTreeNode* root) noexcept {
     if (root != nullptr) {
+        // Keeping it needs no room.
         if (ReleaseScope::IsActive()) {
-            ReleaseScope::Reserve();
+            ReleaseScope::TryReserve();
         }
         ReleaseNode(root);
     }

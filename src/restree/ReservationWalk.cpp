@@ -1,5 +1,6 @@
 #include "restree/ReservationWalk.h"
 
+#include <new>
 #include <utility>
 
 #include "restree/ResTreeNode.h"
@@ -15,6 +16,15 @@ bool ReservationWalk::IsOnPath(ResTreeNode* node) const {
 
 bool ReservationWalk::ReserveEach(std::vector<ResTreeNode*>&& list, uint32_t mode) {
     levels.push_back({nullptr, std::move(list), 0});
+    try {
+        return TakeEach(mode);
+    } catch (const std::bad_alloc&) {
+        TakeBack();
+        throw;
+    }
+}
+
+bool ReservationWalk::TakeEach(uint32_t mode) {
     while (true) {
         const Level& level = levels.back();
         if (level.next < level.list.size()) {
@@ -47,7 +57,7 @@ void ReservationWalk::Enter(ResTreeNode* node) {
 // then they are dropped again.
 bool ReservationWalk::Take(uint32_t mode) {
     ResTreeNode* node = levels.back().node;
-    granted = node->HasLeft() ? 0 : node->ReserveOne(owner, mode);
+    granted = node->HasLeft() ? 0 : TakeOne(*node, mode);
     if (granted != 0) {
         Leave();
         ++levels.back().next;
@@ -62,6 +72,24 @@ bool ReservationWalk::Take(uint32_t mode) {
     }
     Leave();
     return false;
+}
+
+uint32_t ReservationWalk::TakeOne(ResTreeNode& node, uint32_t mode) {
+    const size_t countBefore = node.GetReservations().size();
+    newlyHeld.push_back(&node);
+    const auto forgetUnlessNew = [&] {
+        if (node.GetReservations().size() <= countBefore) {
+            newlyHeld.pop_back();
+        }
+    };
+    try {
+        const uint32_t given = node.ReserveOne(owner, mode);
+        forgetUnlessNew();
+        return given;
+    } catch (const std::bad_alloc&) {
+        forgetUnlessNew();
+        throw;
+    }
 }
 
 void ReservationWalk::Leave() {
@@ -88,6 +116,19 @@ void ReservationWalk::Undo() {
             return;
         }
         Leave();
+    }
+}
+
+// Unlike for a refusal, what was held before stays held.
+void ReservationWalk::TakeBack() {
+    try {
+        for (; !newlyHeld.empty(); newlyHeld.pop_back()) {
+            if (!newlyHeld.back()->HasLeft()) {
+                newlyHeld.back()->ReleaseOne(owner);
+            }
+        }
+    } catch (const std::bad_alloc&) {
+        // The rest stays held.
     }
 }
 

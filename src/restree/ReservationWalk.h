@@ -29,7 +29,8 @@ class ReservationWalk {
     void Bar(ResTreeNode& node) { onPath[&node] = true; }
 
     // Takes the nodes of the list in order, each behind its dependants. If one is refused, or leaves its tree while its
-    // dependants are taken, drops in reverse order what was taken, and gives false.
+    // dependants are taken, drops in reverse order what was taken, and gives false. Before bad_alloc leaves, drops what
+    // wasn't held before, as far as there is memory for that.
     bool ReserveEach(std::vector<ResTreeNode*>&& list, uint32_t mode);
 
     // What ReserveOne gave for the node that was taken last; 0 if none was.
@@ -52,16 +53,20 @@ class ReservationWalk {
     static constexpr size_t maximalRepetitions = 10'000;
 
     bool IsOnPath(ResTreeNode* node) const;
+    bool TakeEach(uint32_t mode);
     void Enter(ResTreeNode* node);
     bool Take(uint32_t mode);
+    uint32_t TakeOne(ResTreeNode& node, uint32_t mode);
     void Leave();
     void ReleaseTaken();
     void Undo();
+    void TakeBack();
 
     const ReleaseScope scope;
     const String owner;
     std::vector<Level> levels;
     std::unordered_map<ResTreeNode*, bool> onPath;  // Every node that was entered; true while it is.
+    std::vector<ResTreeNode*> newlyHeld;            // By what was taken so far, and by what is about to be.
     size_t repetitions = 0;
     uint32_t granted = 0;
 

@@ -1,5 +1,6 @@
 /* A run-time of a host that takes all its memory from malloc, and so goes on working where a test lets the library run
- * out of memory. Special folder 28 is what `specialFolder` says. */
+ * out of memory. Special folder 28 is what `specialFolder` says. The reference 77 stands for `objectOfRefNum`, which
+ * goes to who asks, with the reference that it has. */
 #include <stdint.h>
 #include <stdlib.h>
 #include <string.h>
@@ -11,8 +12,10 @@
 
 EXPORTED extern char specialFolder[4096];
 EXPORTED extern int liveHandles;
+EXPORTED extern void* objectOfRefNum;
 char specialFolder[4096];
 int liveHandles;
+void* objectOfRefNum;
 
 /* In front of the content of each block. */
 struct BlockHead {
@@ -95,4 +98,11 @@ EXPORTED int32_t HostGetSpecialDir(int32_t code, ZkPath path) {
 
 EXPORTED void HostDestroyPath(ZkPath path) {
     (void)path;
+}
+
+EXPORTED HRESULT QueryInterfaceForZKRefNum(uint32_t refNum, GUID interfaceId, void** result) {
+    (void)interfaceId;
+    *result = refNum == 77 ? objectOfRefNum : NULL;
+    objectOfRefNum = refNum == 77 ? NULL : objectOfRefNum;
+    return *result == NULL ? E_NOINTERFACE : S_OK;
 }

@@ -1,23 +1,15 @@
 // That no pointer, number or id of the public headers was forgotten: the headers are read as text.
 
-#include <fstream>
-#include <iterator>
 #include <regex>
 #include <set>
 #include <sstream>
 
 #include "misuse/MisuseTest.h"
+#include "support/PublicHeaders.h"
 
 namespace {
 
 using Names = std::set<std::string>;
-
-std::string HeaderText(const std::string& name) {
-    std::ifstream file(PUBLIC_HEADERS + name, std::ios::binary);
-    const std::string text{std::istreambuf_iterator<char>(file), {}};
-    const std::string withoutBlocks = std::regex_replace(text, std::regex(R"(/\*[^*]*\*+(?:[^/*][^*]*\*+)*/)"), " ");
-    return std::regex_replace(std::regex_replace(withoutBlocks, std::regex("//[^\n]*"), " "), std::regex("\\s+"), " ");
-}
 
 struct Argument {
     std::string operation;
@@ -38,51 +30,15 @@ void AppendArguments(const std::string& operation, const std::string& list, Argu
     }
 }
 
-// Of the interfaces that this library implements.
-Arguments OfInterfaces() {
-    static const std::regex declaration(R"(struct (\w+) : public \w+ \{)");
-    static const std::regex operation(R"(virtual HRESULT STDMETHODCALLTYPE (\w+)\(([^)]*)\))");
-    static const Names ofTheHost = {"IzkhwResourceTreeNodeObserver",
-                                    "IzkProjectItem",
-                                    "IzkProjectItemLocator",
-                                    "IzkItemResourceLink",
-                                    "IzkItemMarker",
-                                    "IzkProject",
-                                    "IzkHostContext"};
+Arguments OfAll() {
     Arguments all;
-    for (const char* const header : {"tree_node.h", "tree_owner.h", "tree_root.h", "host_interfaces.h"}) {
-        const std::string text = HeaderText(header);
-        for (std::sregex_iterator each(text.begin(), text.end(), declaration), end; each != end; ++each) {
-            const std::string name = (*each)[1];
-            const size_t start = static_cast<size_t>(each->position());
-            const std::string body = text.substr(start, text.find("};", start) - start);
-            for (std::sregex_iterator found(body.begin(), body.end(), operation); found != end; ++found) {
-                if (ofTheHost.count(name) == 0) {
-                    AppendArguments(name + "::" + (*found)[1].str(), (*found)[2], all);
-                }
-            }
-        }
+    for (const support::Declared& each : support::DeclaredOperations()) {
+        AppendArguments(each.name, each.arguments, all);
     }
     all.push_back({"IUnknown::QueryInterface", "void** ", "result"});
-    return all;
-}
-
-Arguments OfFunctions() {
-    static const std::regex prototype(R"(ZKFPGA_API [^;(]*?(\w+)\(([^)]*)\);)");
-    Arguments all;
-    for (const char* const header : {"exports.h", "memory.h"}) {
-        const std::string text = HeaderText(header);
-        for (std::sregex_iterator each(text.begin(), text.end(), prototype), end; each != end; ++each) {
-            AppendArguments((*each)[1], (*each)[2], all);
-        }
+    for (const support::Declared& each : support::DeclaredFunctions()) {
+        AppendArguments(each.name, each.arguments, all);
     }
-    return all;
-}
-
-Arguments OfAll() {
-    Arguments all = OfInterfaces();
-    const Arguments functions = OfFunctions();
-    all.insert(all.end(), functions.begin(), functions.end());
     return all;
 }
 
@@ -151,7 +107,7 @@ TEST(MisuseCases, EveryNumberOfTheHeadersIsZeroAndGreatInOne) {
 TEST(MisuseCases, EveryIdOfTheHeadersIsAskedOfEveryObject) {
     static const std::regex definition(R"(ZKFPGA_IID IID_(\w+) =)");
     const Names names = NamesOf({IdExpectations()});
-    const std::string text = HeaderText("ids.h");
+    const std::string text = support::HeaderText("ids.h");
     size_t count = 0;
     for (std::sregex_iterator each(text.begin(), text.end(), definition), end; each != end; ++each) {
         ++count;
