@@ -276,7 +276,7 @@ const std::vector<ExportOperation> tableOfMemory = {
      {}},
     {"SysAllocString",
      [](HandsOfTheHost& h) {
-         BSTR const made = SysAllocString(u"text");
+         auto* const made = SysAllocString(u"text");
          Note(h, made);
          SysFreeString(made);
          return S_OK;
@@ -285,7 +285,7 @@ const std::vector<ExportOperation> tableOfMemory = {
      {"S_OK null"}},
     {"SysAllocStringLen",
      [](HandsOfTheHost& h) {
-         BSTR const made = SysAllocStringLen(u"text", 3);
+         auto* const made = SysAllocStringLen(u"text", 3);
          Note(h, made);
          SysFreeString(made);
          return S_OK;
