@@ -93,6 +93,7 @@ def Trace(build, folder, scratch, jobs):
     if not changesFile.is_file() or changesFile.read_text(encoding="utf-8") != changes:
         shutil.rmtree(folder, ignore_errors=True)
         folder.mkdir(parents=True)
+        changesFile.write_text(changes, encoding="utf-8")
     wanted = [item for program in build.programs for item in Listing(build, program, scratch)]
     stamps = {file: hashlib.sha256(file.read_bytes()).hexdigest() for file in {file for _, _, file in wanted}}
 
@@ -120,7 +121,6 @@ def Trace(build, folder, scratch, jobs):
         print(f"mutate: fails without a change, and isn't asked: {test}", flush=True)
     if len(failing) > 5:
         raise SystemExit("mutate: too many of them")
-    changesFile.write_text(changes, encoding="utf-8")
     for program in build.programs:
         own = [test for test in tests if test.program == program]
         start = min(test.seconds for test in own)

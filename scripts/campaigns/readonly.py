@@ -12,19 +12,19 @@ NAMESPACE = "/proc/self/ns/mnt"
 OTHERS = ("/proc", "/dev")
 
 
-def GoOnReadOnly(folders):
-    """Starts this program anew, with the same arguments, and goes on there: only what is below the folders can be
-    written. Whoever isn't root needs the right to make namespaces."""
+def GoOnReadOnly(folder, scratch):
+    """Starts this program anew, with the same arguments, and goes on there: only what is below the folder can be
+    written, and /tmp, which is `scratch` there. Whoever isn't root needs the right to make namespaces."""
     if not IsInside():
         os.environ[INSIDE] = os.readlink(NAMESPACE)
         own = [] if os.geteuid() == 0 else ["--map-root-user"]
         os.execvp("unshare", ["unshare", *own, "--mount", "--propagation", "private", sys.executable, *sys.argv])
-    for folder in folders:
-        subprocess.run(["mount", "--bind", folder, folder], check=True)
-    kept = {str(folder) for folder in folders}
+    # The path itself, as the C library has it too.
+    for source, place in ((scratch, "/tmp"), (folder, folder)):
+        subprocess.run(["mount", "--bind", source, place], check=True)
     for line in pathlib.Path("/proc/self/mounts").read_text(encoding="utf-8").splitlines():
         place, _, options = line.split()[1:4]
-        if place in kept or place.startswith(OTHERS):
+        if place in ("/tmp", str(folder)) or place.startswith(OTHERS):
             continue
         # What the system has shut stays so.
         flags = [flag for flag in options.split(",") if flag in ("nosuid", "nodev", "noexec", "noatime", "relatime")]

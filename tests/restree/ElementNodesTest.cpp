@@ -5,6 +5,7 @@
 #include <gtest/gtest.h>
 
 #include "restree/ReadTree.h"
+#include "support/ChangeLog.h"
 
 namespace zkhw {
 namespace {
@@ -707,6 +708,22 @@ R:R
   x:A ordered
   y:A ordered
 )");
+}
+
+// The place of a child that is replaced may be taken before the new one comes: what the element holds is read into the
+// node that was to have it.
+TEST(ElementNodes, ElementWhosePlaceAnObserverTakesIsReadIntoTheNodeAbove) {
+    const auto root = MakeUnnamedRoot();
+    Load(*root, "<R><M name='m'><Old name='x'/></M></R>");
+    ResTreeNode& m = At(*root, u"m");
+    ChangeLog log;
+    LoggingObserver observer(log, "o");
+    observer.reaction = [](ResTreeNode& node, uint32_t) { node.SetProperty(u"x", u"taken"); };
+    m.AddObserver(&observer, ChildRemoved, 0);
+    EXPECT_EQ(Load(*root, "<R><M name='m' replace='false'><New name='x'><V>1</V></New><W>2</W></M></R>"),
+              "\nR:R\n  m:M\n    V=1\n    W=2\n    x=taken\n");
+    EXPECT_EQ(log.Take(), "o: m ChildRemoved #0\n");
+    m.RemoveObserver(&observer, -1, false);
 }
 
 }  // namespace

@@ -434,6 +434,15 @@ TEST_F(ReplacingLoad, NodeThatItRemovesIsPassedOverOnItsTurn) {
     EXPECT_EQ(ReservationText(*stub), "x:=w");
 }
 
+TEST_F(ReplacingLoad, NothingIsGivenBelowANodeThatItRemoves) {
+    ResTreeNode& b = At(*root, u"b");
+    AddText(b, u":DeferredLoadPath", u"..");
+    std::vector<ResTreeNode*> list;
+    b.CollectMatchingDescendants(u"", list);
+    EXPECT_TRUE(IsReplaced());
+    EXPECT_TRUE(list.empty());
+}
+
 TEST_F(ReplacingLoad, DescendantsThatItRemovesAreLeftOut) {
     // The root's own contents are there, so only what "s" defers to it is still to come when the walk gets there.
     ResTreeNode& b = At(*root, u"b");

@@ -9,6 +9,7 @@
 #include "qn/dsc/osdep/BinaryFile.h"
 #include "qn/dsc/osdep/FileFinder.h"
 #include "qn/dsc/osdep/FileSystem.h"
+#include "qn/dsc/osdep/OSException.h"
 #include "qn/dsc/osdep/path.h"
 #include "support/ExactText.h"
 #include "support/SmallStack.h"
@@ -49,6 +50,25 @@ TEST(LinuxPaths, ANameBelowTheRootMatchesInAnyLetterCase) {
     EXPECT_TRUE(IsDirectory(u"C:\\TMP"));
     EXPECT_TRUE(IsDirectory(u"C:\\uSR\\BIN"));
     EXPECT_FALSE(IsDirectory(u"C:\\No such folder"));
+}
+
+// A path of more than 4,095 bytes is opened in steps. What is left behind a step that fails must not be looked for in
+// the working folder.
+TEST(LinuxPaths, TheRestOfALongPathIsNotTakenForARelativeOne) {
+    const TemporaryFolder folder;
+    const std::string name(100, 'x');
+    std::string rest = name;
+    for (int i = 1; i < 5; ++i) {
+        rest += "/" + name;
+    }
+    folder.WriteFile(rest, "x");
+    const WorkingFolderScope scope(folder.Native(""));
+    std::u16string path = u"C:";
+    for (int i = 0; i < 45; ++i) {
+        path += u"\\" + std::u16string(100, u'x');
+    }
+    EXPECT_FALSE(IsExistingFile(String(std::u16string_view(path))));
+    EXPECT_THROW(ContentOf(String(std::u16string_view(path))), PosixError);
 }
 
 TEST(LinuxPaths, TheNameAsItStandsWins) {
