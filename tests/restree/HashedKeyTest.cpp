@@ -1,5 +1,6 @@
 #include "restree/HashedKey.h"
 
+#include <cstring>
 #include <string>
 #include <vector>
 
@@ -58,6 +59,14 @@ TEST(HashedKey, KeyThatIsNotPlainMayEqualAny) {
     for (uint32_t other = 0; other <= 0xFF; ++other) {
         EXPECT_TRUE(blank.MayEqual(static_cast<uint8_t>(other))) << other;
     }
+}
+
+// A key that is hashed by the compiler has to have the hash that it has when it is read from a file.
+TEST(HashedKey, UnitsAreJoinedForTheCompilerAsTheyLieInMemory) {
+    const char16_t units[] = u"\x0102\x0304\x0506\xF708";
+    uint64_t word = 0;
+    std::memcpy(&word, units, sizeof word);
+    EXPECT_EQ(detail::JoinUnits(units), word);
 }
 
 TEST(HashedKey, KeysOfABoardHaveManyHashes) {
