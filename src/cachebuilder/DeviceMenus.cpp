@@ -1,5 +1,8 @@
 #include "cachebuilder/DeviceMenus.h"
 
+#include <optional>
+#include <string_view>
+
 #include "qn/dsc/osdep/DebugTrap.h"
 #include "qn/dsc/osdep/_GetExeFullPath.h"
 #include "qn/dsc/osdep/path.h"
@@ -27,14 +30,14 @@ struct FamilyMenus {
     String spartan6;
 
     // Null for a family that isn't known here.
-    const String* Of(const String& family) const {
-        if (family == u"virtex5") {
+    const String* Of(std::u16string_view family) const {
+        if (Equal(family, u"virtex5")) {
             return &virtex5;
         }
-        if (family == u"virtex6") {
+        if (Equal(family, u"virtex6")) {
             return &virtex6;
         }
-        return family == u"spartan6" ? &spartan6 : nullptr;
+        return Equal(family, u"spartan6") ? &spartan6 : nullptr;
     }
 };
 
@@ -48,7 +51,7 @@ bool ReadMenus(ResTreeNode& specs, std::u16string_view family, String& menus) {
     if (node == nullptr) {
         return false;
     }
-    menus = node->GetPropertyOrEmpty(u"XIPINMenusPath");
+    menus.Assign(node->GetPropertyOrEmpty(u"XIPINMenusPath"));
     return true;
 }
 
@@ -58,11 +61,11 @@ bool ReadFamilyMenus(ResTreeNode& root, FamilyMenus& menus) {
            ReadMenus(*specs, u"Virtex6", menus.virtex6) && ReadMenus(*specs, u"spartan6", menus.spartan6);
 }
 
-// Null if the target names no family.
-const String* FindDeviceFamily(ResTreeNode& target) {
+// None if the target names no family.
+std::optional<std::u16string_view> FindDeviceFamily(ResTreeNode& target) {
     const NodeEntry* compilation = target.Find(u"FPGACompilation");
     if (compilation == nullptr) {
-        return nullptr;
+        return std::nullopt;
     }
     ResTreeNode* node = compilation->Child();
     if (node == nullptr) {
@@ -86,10 +89,10 @@ void CopyMenus(const String& menus, const String& targetDirectory) {
 }
 
 void InstallMenus(const FamilyMenus& menus, ResTreeNode& target) {
-    const String* family = FindDeviceFamily(target);
-    const String* source = family == nullptr ? nullptr : menus.Of(*family);
+    const auto family = FindDeviceFamily(target);
+    const String* source = family ? menus.Of(*family) : nullptr;
     if (source != nullptr && target.Find(u"TargetDir") != nullptr) {
-        CopyMenus(*source, target.GetPropertyOrEmpty(u"TargetDir"));
+        CopyMenus(*source, String(target.GetPropertyOrEmpty(u"TargetDir")));
     }
 }
 

@@ -21,16 +21,16 @@ namespace {
 // set.
 void ArmTarget(ResTreeNode& target, const String& executableDir) {
     target.MakeTypeTableLocal();
-    const String folder = GetDirectoryName(target.GetPropertyOrEmpty(u"TargetXMLPath"));
+    const String folder = GetDirectoryName(String(target.GetPropertyOrEmpty(u"TargetXMLPath")));
     target.SetProperty(u"TargetDir", JoinPath(executableDir, folder).View());
     target.SetProperty(u"TargetClassShortClassName", target.GetName().View());
-    const String file = target.GetPropertyOrEmpty(u"TargetXMLPath");
+    const String file(target.GetPropertyOrEmpty(u"TargetXMLPath"));
     target.SetProperty(u":DeferredLoadPath", file.View());
 }
 
 void ArmOther(ResTreeNode& node) {
-    if (const String* source = node.GetProperty(u"FPGA_XMLSource")) {
-        const String files = *source;
+    if (const auto source = node.GetProperty(u"FPGA_XMLSource")) {
+        const String files(*source);
         node.SetProperty(u":DeferredLoadPath", files.View());
     }
 }

@@ -1,7 +1,6 @@
 #include "cachebuilder/SourceLists.h"
 
-#include <cstring>
-
+#include "qn/dsc/FindUnit.h"
 #include "restree/ResTreeNode.h"
 #include "restree/TextList.h"
 
@@ -28,12 +27,6 @@ void AddPieces(std::u16string_view text, std::unordered_set<std::u16string>& pie
     }
 }
 
-// To the unit, unlike ==. By bytes, since the comparison of views of char16_t goes unit by unit, several times slower.
-bool IsSameText(const String& left, const String& right) {
-    return left.Length() == right.Length() &&
-           std::memcmp(left.CStr(), right.CStr(), left.Length() * sizeof(char16_t)) == 0;
-}
-
 // Whether a separator behind `text` would count as escaped.
 bool EndsInEscape(std::u16string_view text) {
     const size_t last = text.find_last_not_of(u'\\');
@@ -48,16 +41,16 @@ void SourceLists::Add(ResTreeNode& node, const String& file) {
         node.SetProperty(sourceKey, file.View());
         return;
     }
-    String* const source = entry->Text();
-    if (source == nullptr) {
+    const auto source = entry->Text();
+    if (!source) {
         return;
     }
     List& list = lists[&node];
     // A file may have written the entry itself since.
-    if (!IsSameText(list.text, *source)) {
+    if (!qn::dsc::HasSameUnits(list.text.View(), *source)) {
         list.pieces.clear();
-        AddPieces(source->View(), list.pieces);
-        list.text = *source;
+        AddPieces(*source, list.pieces);
+        list.text.Assign(*source);
     }
     if (list.pieces.contains(ToUpper(file.View()))) {
         return;
@@ -69,8 +62,9 @@ void SourceLists::Add(ResTreeNode& node, const String& file) {
         list.text.Append(u",");
         list.text.Append(file);
     }
-    source->Append(u",");
-    source->Append(file);
+    String& text = entry->EditText();
+    text.Append(u",");
+    text.Append(file);
     node.Raise(PropertyChanged);
 }
 

@@ -18,7 +18,7 @@ using qn::dsc::osdep::JoinPath;
 namespace {
 
 void SetIfMissing(ResTreeNode& node, std::u16string_view key, const String& value) {
-    if (node.GetProperty(key) == nullptr) {
+    if (!node.GetProperty(key)) {
         node.SetProperty(key, value.View());
     }
 }

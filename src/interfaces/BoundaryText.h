@@ -5,6 +5,7 @@
 
 #include <string_view>
 
+#include "qn/dsc/FindUnit.h"
 #include "qn/dsc/StringBase.h"
 #include "zkfpga/memory.h"
 #include "zkfpga/types.h"
@@ -28,14 +29,21 @@ inline const OLECHAR* ToBoundary(const char16_t* text) {
 }
 
 // A text as it is once it has crossed the boundary: up to its first NUL.
+inline String UpToNul(std::u16string_view text) {
+    return String(text.substr(0, qn::dsc::FindUnit(text, u'\0')));
+}
 inline String UpToNul(const String& text) {
-    return String(std::u16string_view(text.CStr()));
+    return UpToNul(text.View());
 }
 
 // Gives the caller a copy of `text` up to its first NUL. S_OK, or E_OUTOFMEMORY and null.
-inline HRESULT GiveText(const String& text, BSTR* result) {
-    *result = SysAllocString(ToBoundary(text.CStr()));
+inline HRESULT GiveText(std::u16string_view text, BSTR* result) {
+    *result = SysAllocStringLen(ToBoundary(text.data()), static_cast<unsigned int>(qn::dsc::FindUnit(text, u'\0')));
     return *result != nullptr ? S_OK : E_OUTOFMEMORY;
+}
+
+inline HRESULT GiveText(const String& text, BSTR* result) {
+    return GiveText(text.View(), result);
 }
 
 // A string that was received and is to be freed.

@@ -40,8 +40,8 @@ void CollectProperties(ResTreeNode& node, std::u16string_view path, const Proper
                        std::vector<String>& list) {
     const String prefix = MakePrefix(path, query);
     for (EntryIterator entry = node.BeginLoaded(); !entry.IsEnd(); ++entry) {
-        const String* const value = entry->Text();
-        if (value == nullptr) {
+        const auto value = entry->Text();
+        if (!value) {
             continue;
         }
         String name = prefix + EscapeText(UpToNul(entry->Key()), u'/');

@@ -150,8 +150,8 @@ HRESULT GResTree::GetProperty(LPCWSTR path, LPCWSTR, BSTR* value) {
     ResTreeNode& root = *static_cast<ResTreeNodeAdapter*>(m_root.Get())->GetNode();
     const std::u16string_view text = ViewOf(path);
     const NodePathResult found = WalkNodePath(root, text);
-    const String* const property = found.node->GetProperty(text.substr(found.consumed));
-    return property == nullptr ? S_FALSE : GiveText(*property, value);
+    const auto property = found.node->GetProperty(text.substr(found.consumed));
+    return property ? GiveText(*property, value) : S_FALSE;
 }
 
 HRESULT GResTree::GetFilteredXml(LPCWSTR path, ULONG nodeNameCount, LPCWSTR* nodeNames, ULONG propertyNameCount,

@@ -18,8 +18,8 @@ bool IsExcludedBy(std::u16string_view exclusionProperty, ResTreeNode& node) {
     if (exclusionProperty.empty()) {
         return false;
     }
-    const String* const value = node.GetProperty(exclusionProperty);
-    return value != nullptr && (value->IsEmpty() || ParseBool(*value));
+    const auto value = node.GetProperty(exclusionProperty);
+    return value && (value->empty() || ParseBool(*value));
 }
 
 String DisplayPathBelow(const String& parentDisplayPath, ResTreeNode& node) {

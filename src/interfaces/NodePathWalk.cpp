@@ -39,7 +39,7 @@ NodePathResult WalkNodePath(ResTreeNode& start, std::u16string_view path) {
             result.isComplete = false;
             break;
         }
-        if (const String* const link = entry->LinkPath(); link != nullptr && !link->IsEmpty()) {
+        if (const auto link = entry->LinkPath(); link && !link->empty()) {
             result.crossedLink = true;
         }
         consumed += ConsumedBy(component);

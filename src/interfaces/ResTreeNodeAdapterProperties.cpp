@@ -26,8 +26,8 @@ NodeEntry* EntryAt(ResTreeNode& node, ULONG index, Fits fits) {
 }  // namespace
 
 HRESULT ResTreeNodeAdapter::GetProperty(LPCWSTR name, BSTR* value) {
-    const String* const text = m_node->GetProperty(ViewOf(name));
-    return text == nullptr ? S_FALSE : GiveText(*text, value);
+    const auto text = m_node->GetProperty(ViewOf(name));
+    return text ? GiveText(*text, value) : S_FALSE;
 }
 
 HRESULT ResTreeNodeAdapter::GetPropertyAt(ULONG index, BSTR* value) {
@@ -45,7 +45,7 @@ HRESULT ResTreeNodeAdapter::SetPropertyAt(ULONG index, LPCWSTR value) {
     if (entry == nullptr) {
         return S_FALSE;
     }
-    m_node->SetEntryText(entry, CopyOf(value));
+    m_node->SetEntryText(entry, ViewOf(value));
     return S_OK;
 }
 
@@ -56,7 +56,7 @@ HRESULT ResTreeNodeAdapter::GetPropertyNames(ULONG* count, BSTR** names) {
     std::vector<String> keys;
     for (EntryIterator entry = m_node->BeginLoaded(); !entry.IsEnd(); ++entry) {
         if (entry->IsText()) {
-            keys.push_back(entry->Key());
+            keys.emplace_back(entry->Key());
         }
     }
     return GiveTexts(keys, count, names);

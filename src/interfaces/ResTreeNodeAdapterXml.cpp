@@ -24,8 +24,8 @@ String ToXml(ResTreeNode& node) {
     return text;
 }
 
-std::set<String> NameSet(ULONG count, LPCWSTR* names) {
-    std::set<String> result;
+EntryFilter::NameSet NamesOf(ULONG count, LPCWSTR* names) {
+    EntryFilter::NameSet result;
     for (ULONG i = 0; i < count; ++i) {
         result.insert(CopyOf(names[i]));
     }
@@ -67,8 +67,8 @@ HRESULT ResTreeNodeAdapter::GetFilteredXmlEx(BOOL keep, ULONG nodeNameCount, LPC
                                              ULONG propertyNameCount, LPCWSTR* propertyNames, BSTR* xml) {
     const std::unique_ptr<ResTreeNode> copy = m_node->Clone();
     FilterEntries(*copy, {.keep = keep != 0,
-                          .nodeNames = NameSet(nodeNameCount, nodeNames),
-                          .propertyNames = NameSet(propertyNameCount, propertyNames)});
+                          .nodeNames = NamesOf(nodeNameCount, nodeNames),
+                          .propertyNames = NamesOf(propertyNameCount, propertyNames)});
     // Without memory the text is null and the result no other.
     GiveText(ToXml(*copy), xml);
     return S_OK;

@@ -1,15 +1,27 @@
 #include "restree/ElementName.h"
 
+#include "qn/dsc/Utf8ToWide.h"
+#include "qn/dsc/osdep/Compare.h"
 #include "restree/TextList.h"
 #include "restree/Utf8Text.h"
 
 namespace zkhw {
 
+using qn::dsc::osdep::Equal;
+
 void ElementName::Assign(std::string_view name) {
-    WidenInto(name, text);
-    // Only a text of ASCII has a unit for each byte.
-    const bool isAscii = text.Length() == name.size();
-    meanings = isAscii ? uint8_t{MeaningOfAscii(name)} : MeaningsByCompare();
+    if (room.size() < name.size()) {
+        room.resize(name.size());
+    }
+    if (qn::dsc::WidenAscii(name.data(), name.size(), room.data())) {
+        length = name.size();
+        meanings = MeaningOfAscii(name);
+        return;
+    }
+    const size_t count = qn::dsc::MeasureUtf8(name.data(), name.size());
+    length = count == SIZE_MAX ? 0 : count;
+    qn::dsc::DecodeUtf8(name.data(), name.size(), room.data(), length);
+    meanings = MeaningsByCompare();
 }
 
 // Hyphens and apostrophes count in an equality of ASCII texts, so letter by letter is enough here. The last letter
@@ -35,11 +47,12 @@ ElementName::Meaning ElementName::MeaningOfAscii(std::string_view name) {
 
 // Other scripts have letters that equal ASCII ones but for their width, and signs that count for nothing.
 uint8_t ElementName::MeaningsByCompare() const {
-    uint32_t found = text == u":Link" ? Link : None;
-    found |= text == u":Include" ? Include : None;
-    found |= text == u"Reserves" ? Reserves : None;
-    found |= EndsWith(text.View(), u"Path") || EndsWith(text.View(), u"Dir") ? PathOrDir : None;
-    found |= EndsWith(text.View(), u"List") ? List : None;
+    const std::u16string_view text = Text();
+    uint32_t found = Equal(text, u":Link") ? Link : None;
+    found |= Equal(text, u":Include") ? Include : None;
+    found |= Equal(text, u"Reserves") ? Reserves : None;
+    found |= EndsWith(text, u"Path") || EndsWith(text, u"Dir") ? PathOrDir : None;
+    found |= EndsWith(text, u"List") ? List : None;
     return static_cast<uint8_t>(found);
 }
 

@@ -2,29 +2,26 @@
 
 // The name of an element and what it means to the resource language.
 
+#include <cstddef>
 #include <cstdint>
+#include <string>
 #include <string_view>
-#include <utility>
-
-#include "qn/dsc/StringBase.h"
 
 namespace zkhw {
 
 class ElementName {
   public:
     // Empty: no element.
-    bool IsEmpty() const { return text.IsEmpty(); }
-    void Clear() { text = qn::dsc::String::WithoutBuffer(); }
+    bool IsEmpty() const { return length == 0; }
+    void Clear() { length = 0; }
 
     // Takes a name from libexpat; one that can't be widened becomes empty. Throws bad_alloc.
     void Assign(std::string_view name);
 
-    const qn::dsc::String& Text() const { return text; }
-    // Gives the text away, and is empty then. Nearly every name ends as that of an entry or a type, so it is widened
-    // once, where it comes in.
-    qn::dsc::String TakeText() { return std::exchange(text, qn::dsc::String::WithoutBuffer()); }
+    // Good until the next change.
+    std::u16string_view Text() const { return {room.data(), length}; }
 
-    // These stay as they are when the text is taken.
+    // These stay as they are when the name is cleared.
     bool IsLink() const { return Has(Link); }
     bool IsInclude() const { return Has(Include); }
     bool IsReserves() const { return Has(Reserves); }
@@ -38,7 +35,10 @@ class ElementName {
     static Meaning MeaningOfAscii(std::string_view name);
     uint8_t MeaningsByCompare() const;
 
-    qn::dsc::String text = qn::dsc::String::WithoutBuffer();
+    // Nearly every name ends as that of an entry or a type, so it is widened where it comes in. The room stays for the
+    // next one, and its size has nothing to do with the length.
+    std::u16string room;
+    size_t length = 0;
     uint8_t meanings = None;
 };
 

@@ -63,7 +63,7 @@ void ElementReader::FlushPendingElement(ElementMode mode, std::string_view nextN
         MakeValue(std::move(entryName));
         frame.pendingName.Clear();
     } else if (Attributes().Is(AttributeName::Type, u"xml")) {
-        BeginXmlValue(std::move(entryName), nextName, nextAttributes);
+        BeginXmlValue(entryName, nextName, nextAttributes);
     } else {
         const bool isOrdered = IsNodeOrdered(frame.pendingName.Text());
         if (Attributes().Has(AttributeName::Replace)) {
@@ -71,10 +71,10 @@ void ElementReader::FlushPendingElement(ElementMode mode, std::string_view nextN
         }
         if (!frame.rootTypeKnown) {
             // Its name stays pending in the frame, which sees no further start tag.
-            BindDocumentElement(std::move(entryName), String(frame.pendingName.Text()), isOrdered);
+            BindDocumentElement(std::move(entryName), frame.pendingName.Text(), isOrdered);
             stack.PushFrame(node, nextName, nextAttributes);
         } else {
-            ResTreeNode& child = MakeChild(std::move(entryName), frame.pendingName.TakeText(), isOrdered);
+            ResTreeNode& child = MakeChild(std::move(entryName), frame.pendingName.Text(), isOrdered);
             stack.NoteNode(child);
             frame.pendingName.Clear();
             if (mode == ElementMode::Container) {
@@ -90,25 +90,25 @@ void ElementReader::FlushPendingElement(ElementMode mode, std::string_view nextN
 
 // Nothing is escaped, and the attributes come in the order of their names.
 void ElementReader::AppendTagToXmlValue() {
-    String* value = frame.position->Text();
-    if (value == nullptr) {
+    if (!frame.position->IsText()) {
         return;
     }
+    String& value = frame.position->EditText();
     ++frame.xmlDepth;
-    value->Append(u"<");
-    value->Append(frame.pendingName.Text());
+    value.Append(u"<");
+    value.Append(frame.pendingName.Text());
     for (const auto& [key, text] : Attributes().InOrder()) {
-        value->Append(u" ");
-        value->Append(key);
-        value->Append(u"=\"");
-        value->Append(text);
-        value->Append(u"\"");
+        value.Append(u" ");
+        value.Append(key);
+        value.Append(u"=\"");
+        value.Append(text);
+        value.Append(u"\"");
     }
-    value->Append(u">");
+    value.Append(u">");
 }
 
-void ElementReader::BeginXmlValue(String&& entryName, std::string_view nextName, const char* const* nextAttributes) {
-    frame.position = node.AddTextEntry(std::move(entryName), String(), TextEntry, Before()).entry;
+void ElementReader::BeginXmlValue(const String& entryName, std::string_view nextName, const char* const* nextAttributes) {
+    frame.position = node.AddTextEntry(entryName.View(), {}, TextEntry, Before()).entry;
     frame.xmlDepth = 1;
     // The tag that told of the content is the first one inside the value. Without content nothing stays pending.
     frame.pendingName.Assign(nextName);
@@ -133,7 +133,7 @@ String ElementReader::ChooseEntryName(ElementMode mode, bool& isNode) {
         return Attributes().Value(AttributeName::Name);
     }
     isNode = mode == ElementMode::Container || Attributes().Has(AttributeName::Prototype);
-    return isNode || frame.pendingName.IsLink() ? frame.pendingName.Text() : String::WithoutBuffer();
+    return isNode || frame.pendingName.IsLink() ? String(frame.pendingName.Text()) : String::WithoutBuffer();
 }
 
 const String* ElementReader::Before() {
@@ -144,32 +144,32 @@ const String* ElementReader::Before() {
     return &before;
 }
 
-bool ElementReader::IsNodeOrdered(const String& elementName) const {
+bool ElementReader::IsNodeOrdered(std::u16string_view elementName) const {
     if (Attributes().Has(AttributeName::Ordered)) {
         return Attributes().IsTrue(AttributeName::Ordered);
     }
     if (frame.typeTable != nullptr) {
-        if (const TypeRecord* record = frame.typeTable->Find(elementName.View())) {
+        if (const TypeRecord* record = frame.typeTable->Find(elementName)) {
             return record->IsListType();
         }
     }
     return frame.pendingName.EndsInList();
 }
 
-void ElementReader::BindDocumentElement(String&& entryName, String&& elementName, bool isOrdered) {
+void ElementReader::BindDocumentElement(String&& entryName, std::u16string_view elementName, bool isOrdered) {
     if (node.type.IsEmpty()) {
         node.TakeName(std::move(entryName));
-        node.type = std::move(elementName);
+        node.type.Assign(elementName);
         node.TakeOrder(isOrdered);
     }
     frame.rootTypeKnown = !node.type.IsEmpty();
     stack.NoteNode(node);
 }
 
-ResTreeNode* ElementReader::Lookup(const String& path) {
+ResTreeNode* ElementReader::Lookup(std::u16string_view path) {
     // A path from the root is the same from any node, and deep down in a document the loading node is nearer to it.
-    ResTreeNode& start = path.View().starts_with(u'/') ? stack.LoadingNode() : node;
-    return start.Lookup(path.View(), stack.GetDocumentRoot());
+    ResTreeNode& start = path.starts_with(u'/') ? stack.LoadingNode() : node;
+    return start.Lookup(path, stack.GetDocumentRoot());
 }
 
 ResTreeNode* ElementReader::FindPrototype() {
@@ -177,18 +177,18 @@ ResTreeNode* ElementReader::FindPrototype() {
         return nullptr;
     }
     const String path = Attributes().Value(AttributeName::Prototype);
-    ResTreeNode* prototype = Lookup(path);
+    ResTreeNode* prototype = Lookup(path.View());
     if (prototype == nullptr) {
         Report(u"Unable to find prototype node: ", path);
     }
     return prototype;
 }
 
-ResTreeNode& ElementReader::MakeChild(String&& entryName, String&& elementName, bool isOrdered) {
+ResTreeNode& ElementReader::MakeChild(String&& entryName, std::u16string_view elementName, bool isOrdered) {
     ResTreeNode* prototype = FindPrototype();
     ResTreeNode* child = nullptr;
     const HashedKey hashed(entryName.View());
-    node.ReplaceChild(!frame.mergeExisting, hashed, std::move(entryName), std::move(elementName), isOrdered, child,
+    node.ReplaceChild(!frame.mergeExisting, hashed, std::move(entryName), String(elementName), isOrdered, child,
                       Before());
     if (child == nullptr) {
         // An observer has put something else in the place that was just cleared. What follows is read all the same.
@@ -208,78 +208,83 @@ void ElementReader::MakeValue(String&& entryName) {
     const bool hasType = Attributes().Has(AttributeName::Type);
     const bool isPath =
         hasType ? Attributes().Is(AttributeName::Type, u"path") : name.EndsInPathOrDir() || name.IsInclude();
-    String text = ReadValueText(isPath);
+    TextBuilder text;
+    ReadValueText(isPath, text);
     frame.position = nullptr;
     if (name.IsInclude()) {
-        Include(text);
+        Include(text.Text());
     } else if (name.IsLink()) {
-        MakeLink(std::move(entryName), text);
+        MakeLink(std::move(entryName), text.View());
     } else {
         const bool isReferenceList = hasType ? Attributes().Is(AttributeName::Type, u"ref-list") : name.IsReserves();
-        MakeOrdinaryValue(std::move(text), isReferenceList);
+        MakeOrdinaryValue(text.View(), isReferenceList);
     }
     frame.xmlDepth = 0;
 }
 
-String ElementReader::ReadValueText(bool isPath) {
+// Four-byte sequences are not supported: a value that holds one is empty.
+void ElementReader::ReadValueText(bool isPath, TextBuilder& value) {
     std::string_view text = frame.text;
     if (!Attributes().Is(AttributeName::XmlSpace, u"preserve")) {
         text = TrimmedPart(text);
     }
-    if (!isPath) {
-        return Widen(text);
+    if (isPath && text.find('\\') != std::string_view::npos) {
+        value.Append(JoinPieces(text).View());
+        return;
     }
-    if (text.find('\\') != std::string_view::npos) {
-        return JoinPieces(text);
+    if (isPath) {
+        char* begin = frame.text.data() + (text.data() - frame.text.data());
+        text = {begin, JoinPlainPieces(begin, begin + text.size())};
     }
-    char* begin = frame.text.data() + (text.data() - frame.text.data());
-    return Widen({begin, JoinPlainPieces(begin, begin + text.size())});
+    value.AppendUtf8(text);
 }
 
-void ElementReader::MakeOrdinaryValue(String&& text, bool isReferenceList) {
-    if (const uint32_t open = FindVariable(text); open != String::npos) {
-        text = ExpandVariables(text, CollectParameters(stack), open);
+void ElementReader::MakeOrdinaryValue(std::u16string_view text, bool isReferenceList) {
+    TextBuilder expanded;
+    if (const size_t open = FindVariable(text); open != std::u16string_view::npos) {
+        ExpandVariables(text, CollectParameters(stack), expanded, open);
+        text = expanded.View();
     }
+    String rebased = String::WithoutBuffer();
     if (isReferenceList) {
         // The node's path is only wanted for pieces that begin with a slash.
-        const bool hasPaths = text.Find(u'/') != String::npos;
-        text = RebaseListPaths(text, hasPaths ? node.GetPath() : String());
+        const bool hasPaths = text.find(u'/') != std::u16string_view::npos;
+        rebased = RebaseListPaths(text, hasPaths ? node.GetPath() : String());
+        text = rebased.View();
     }
     if (Attributes().IsTrue(AttributeName::Localize)) {
-        StoreText(LocalizeText(text), LocalizedTextEntry);
+        StoreText(LocalizeText(text).View(), LocalizedTextEntry);
     } else {
-        StoreText(std::move(text), TextEntry);
+        StoreText(text, TextEntry);
     }
 }
 
-void ElementReader::StoreText(String&& text, EntryKind kind) {
-    const ResTreeNode::Added added = node.AddTextEntry(frame.pendingName.TakeText(), std::move(text), kind, Before());
+void ElementReader::StoreText(std::u16string_view text, EntryKind kind) {
+    const ResTreeNode::Added added = node.AddTextEntry(frame.pendingName.Text(), text, kind, Before());
     frame.position = added.entry;
-    // NOLINTNEXTLINE(bugprone-use-after-move): the text was taken only if an entry was made.
-    if (!added.isNew && frame.mergeExisting && node.SetEntryText(added.entry, std::move(text)) &&
+    if (!added.isNew && frame.mergeExisting && node.SetEntryText(added.entry, text) &&
         kind == LocalizedTextEntry) {
         added.entry->SetTextKind(LocalizedTextEntry);
     }
 }
 
-void ElementReader::MakeLink(String&& entryName, const String& text) {
+void ElementReader::MakeLink(String&& entryName, std::u16string_view text) {
     const ResTreeNode* target = Lookup(text);
     if (target == nullptr) {
         // It stays a dead text, even when the target is read later. The first one of a node stays.
         String dead(u"UNRESOLVED LINK: ");
         dead.Append(text);
-        frame.position = node.AddTextEntry(frame.pendingName.TakeText(), std::move(dead), TextEntry, Before()).entry;
+        frame.position = node.AddTextEntry(frame.pendingName.Text(), dead.View(), TextEntry, Before()).entry;
         return;
     }
     if (entryName == u":Link") {
         entryName = target->GetName();
     }
-    String path = MakeRelativeNodePath(target->GetPath(), node.GetPath());
-    const ResTreeNode::Added added = node.AddLinkEntry(std::move(entryName), std::move(path), Before());
+    const String path = MakeRelativeNodePath(target->GetPath(), node.GetPath());
+    const ResTreeNode::Added added = node.AddLinkEntry(entryName.View(), path.View(), Before());
     frame.position = added.entry;
     if (!added.isNew && frame.mergeExisting) {
-        // NOLINTNEXTLINE(bugprone-use-after-move): the path was taken only if an entry was made.
-        node.SetEntryText(added.entry, std::move(path));
+        node.SetEntryText(added.entry, path.View());
     }
 }
 

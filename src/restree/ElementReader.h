@@ -26,18 +26,18 @@ class ElementReader {
 
     void AppendTagToXmlValue();
     String ChooseEntryName(ElementMode mode, bool& isNode);
-    void BeginXmlValue(String&& entryName, std::string_view nextName, const char* const* nextAttributes);
-    bool IsNodeOrdered(const String& elementName) const;
-    void BindDocumentElement(String&& entryName, String&& elementName, bool isOrdered);
-    ResTreeNode& MakeChild(String&& entryName, String&& elementName, bool isOrdered);
+    void BeginXmlValue(const String& entryName, std::string_view nextName, const char* const* nextAttributes);
+    bool IsNodeOrdered(std::u16string_view elementName) const;
+    void BindDocumentElement(String&& entryName, std::u16string_view elementName, bool isOrdered);
+    ResTreeNode& MakeChild(String&& entryName, std::u16string_view elementName, bool isOrdered);
     ResTreeNode* FindPrototype();
-    ResTreeNode* Lookup(const String& path);
+    ResTreeNode* Lookup(std::u16string_view path);
 
     void MakeValue(String&& entryName);
-    String ReadValueText(bool isPath);
-    void MakeOrdinaryValue(String&& text, bool isReferenceList);
-    void StoreText(String&& text, EntryKind kind);
-    void MakeLink(String&& entryName, const String& text);
+    void ReadValueText(bool isPath, TextBuilder& value);
+    void MakeOrdinaryValue(std::u16string_view text, bool isReferenceList);
+    void StoreText(std::u16string_view text, EntryKind kind);
+    void MakeLink(String&& entryName, std::u16string_view text);
     void Include(const String& text);
     void IncludeFile(const String& text);
 

@@ -17,7 +17,7 @@ class BasicEntryIterator {
     bool IsEnd() const { return position.IsEnd(); }
     EntryPosition Position() const { return position; }
 
-    const String& Key() const { return list->At(position)->Key(); }
+    std::u16string_view Key() const { return list->At(position)->Key(); }
     Entry& operator*() const { return *list->At(position); }
     Entry* operator->() const { return list->At(position); }
     BasicEntryIterator& operator++() {

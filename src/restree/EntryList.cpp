@@ -114,7 +114,7 @@ NodeEntry* EntryList::Find(HashedKey key) const {
 
 NodeEntry* EntryList::FindInArray(HashedKey key) const {
     for (uint32_t i = 0; i < count; ++i) {
-        if (key.MayEqual(items[i]->KeyHash()) && Compare(items[i]->Key().View(), key.text) == 0) {
+        if (key.MayEqual(items[i]->KeyHash()) && Compare(items[i]->Key(), key.text) == 0) {
             return items[i];
         }
     }
@@ -129,7 +129,7 @@ bool EntryList::FindPlain(HashedKey key, NodeEntry*& entry) const {
         if (hash == 0) {
             return false;
         }
-        if (hash == key.hash && entry == nullptr && Compare(items[i]->Key().View(), key.text) == 0) {
+        if (hash == key.hash && entry == nullptr && Compare(items[i]->Key(), key.text) == 0) {
             entry = items[i];
         }
     }
@@ -141,7 +141,7 @@ void EntryList::SortArray() const noexcept {
     for (uint32_t i = 1; i < count; ++i) {
         NodeEntry* entry = items[i];
         uint32_t slot = i;
-        for (; slot != 0 && Compare(entry->Key().View(), items[slot - 1]->Key().View()) < 0; --slot) {
+        for (; slot != 0 && Compare(entry->Key(), items[slot - 1]->Key()) < 0; --slot) {
             items[slot] = items[slot - 1];
         }
         items[slot] = entry;
@@ -164,7 +164,7 @@ EntryList::Place EntryList::FindPlace(HashedKey key) const {
         return {EntryPosition::Unsettled(), entry};
     }
     // Copies and caches come in order.
-    if (Compare(At(Last())->Key().View(), key.text) < 0) {
+    if (Compare(At(Last())->Key(), key.text) < 0) {
         return {{}, nullptr};
     }
     return SearchSorted(key.text);
@@ -174,8 +174,8 @@ EntryList::Place EntryList::SearchSorted(std::u16string_view key) const {
     if (IsLong()) {
         const EntryPieces& pieces = longForm->pieces;
         const EntryPosition position =
-            pieces.PartitionPoint([&](const NodeEntry& entry) { return Compare(entry.Key().View(), key) < 0; });
-        const bool found = !position.IsEnd() && Compare(pieces.At(position)->Key().View(), key) == 0;
+            pieces.PartitionPoint([&](const NodeEntry& entry) { return Compare(entry.Key(), key) < 0; });
+        const bool found = !position.IsEnd() && Compare(pieces.At(position)->Key(), key) == 0;
         return {position, found ? pieces.At(position) : nullptr};
     }
     Settle();
@@ -183,7 +183,7 @@ EntryList::Place EntryList::SearchSorted(std::u16string_view key) const {
     uint32_t high = count;
     while (low < high) {
         const uint32_t middle = low + (high - low) / 2;
-        const int order = Compare(items[middle]->Key().View(), key);
+        const int order = Compare(items[middle]->Key(), key);
         if (order == 0) {
             return {{0, middle}, items[middle]};
         }
@@ -247,7 +247,7 @@ EntryPosition EntryList::InsertAnywhere(EntryPosition position, NodeEntry* entry
         }
         MakeLong();
         if (!ordered && position == EntryPosition::Unsettled()) {
-            position = SearchSorted(entry->Key().View()).position;
+            position = SearchSorted(entry->Key()).position;
         } else {
             position = slot == count ? EntryPosition{} : longForm->pieces.AtIndex(slot);
         }

@@ -98,8 +98,8 @@ class EntryList {
     // Takes an entry out without releasing it; gives the position of the one that followed it.
     EntryPosition Detach(EntryPosition position) noexcept;
 
-    // Swaps the key of an entry of an ordered list, or of one that has been taken out of a sorted list, for `key`. The
-    // entry owns its key (NodeEntry::OwnKey).
+    // Swaps the key of an entry of an ordered list, or of one that has been taken out of a sorted list, for `key`. Only
+    // behind NodeEntry::OwnKey.
     void AssignKey(NodeEntry* entry, String&& key) noexcept;
 
     // Forgets the index of the keys. Worth doing ahead of a removal of very many entries.

@@ -12,13 +12,13 @@ namespace zkhw {
 using qn::dsc::String;
 using qn::dsc::osdep::Equal;
 
-String LocalizeText(const String& text) {
+String LocalizeText(std::u16string_view text) {
     const std::u16string_view language = GetResourceLanguage().View();
     constexpr std::u16string_view english = u"eng";
     std::u16string_view chosen;
     String chosenText = String::WithoutBuffer();  // Holds `chosen` if that isn't a part of `text`.
     bool isChosen = false;
-    PieceReader items(text.View(), u",", true);
+    PieceReader items(text, u",", true);
     while (items.Next()) {
         String unescaped = String::WithoutBuffer();
         std::u16string_view item = items.Raw();
@@ -42,10 +42,10 @@ String LocalizeText(const String& text) {
         }
     }
     if (!isChosen) {
-        return text;
+        return String(text);
     }
     constexpr char16_t nul[] = {0};
-    return String::Concat({chosen, std::u16string_view(nul, 1), text.View()});
+    return String::Concat({chosen, std::u16string_view(nul, 1), text});
 }
 
 }  // namespace zkhw

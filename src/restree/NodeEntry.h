@@ -1,13 +1,16 @@
 #pragma once
 
 // One named entry of a node: a text, a child node or a link. A NodeEntry lives on the heap, at one place from
-// its making to its release, so a pointer to it or to its text stays good while its neighbours come and go.
+// its making to its release, so a pointer to it stays good while its neighbours come and go.
 // The entry owns its payload.
 
 #include <cstddef>
 #include <cstdint>
+#include <optional>
+#include <string_view>
 
 #include "qn/dsc/StringBase.h"
+#include "restree/HashedKey.h"
 
 namespace zkhw {
 
@@ -25,14 +28,8 @@ enum EntryKind : uint8_t {
 
 class NodeEntry {
   public:
-    // A text or link entry. Both strings are moved from. Throws bad_alloc; then both are as they were. `keyHash` is
-    // HashKey of the key, for who has it.
-    static NodeEntry* MakeText(String&& key, EntryKind kind, String&& text);
-    static NodeEntry* MakeText(String&& key, uint8_t keyHash, EntryKind kind, String&& text);
-
-    // An entry of the key and the kind of `source`, a text or link entry, with another text. Throws bad_alloc; then
-    // `text` is as it was.
-    static NodeEntry* CopyText(const NodeEntry& source, String&& text);
+    // A text or link entry. Throws bad_alloc, and OutOfRange for a key or a text that no String can hold.
+    static NodeEntry* MakeText(HashedKey key, EntryKind kind, std::u16string_view text);
 
     // A child entry that takes `child`, whose `name` is its key, and which keeps that name until it goes, or somebody
     // calls OwnKey. Throws bad_alloc; then `child` is still the caller's.
@@ -46,24 +43,33 @@ class NodeEntry {
     NodeEntry(const NodeEntry&) = delete;
     NodeEntry& operator=(const NodeEntry&) = delete;
 
-    const String& Key() const { return shape == Shape::Text ? TextKey() : *ChildKey(); }
+    // Good until the entry gets another key.
+    inline std::u16string_view Key() const;
     uint8_t KeyHash() const { return keyHash; }
     EntryKind Kind() const { return kind; }
     bool IsText() const { return kind == TextEntry || kind == LocalizedTextEntry; }
 
-    // The value of a text entry of either kind; null for any other.
-    String* Text() {
-        textMarked = false;
-        return IsText() ? &Payload() : nullptr;
+    // The value of a text entry of either kind; none for any other. Good until the text or the key is changed.
+    std::optional<std::u16string_view> Text() const {
+        return IsText() ? std::optional(Payload()) : std::nullopt;
     }
-    const String* Text() const { return IsText() ? &Payload() : nullptr; }
 
-    // A mark on the text as it stands: it is gone as soon as the text is asked for in a form for writing.
+    // Assigns the text of a text entry; `text` may be a part of the entry's own. Throws bad_alloc, and OutOfRange for
+    // a text that no String can hold; then nothing has changed.
+    void SetText(std::u16string_view text);
+
+    // The text of a text entry in a form that can be changed in place, and grows in linear time. It costs memory, so
+    // it is meant for texts that are written piece by piece. Throws bad_alloc. Good as long as Text.
+    String& EditText();
+
+    // A mark on the text as it stands: it is gone as soon as the text is assigned, or asked for by EditText.
     void MarkText() { textMarked = true; }
     bool IsTextMarked() const { return textMarked; }
 
-    // The path of a link; null for any other kind.
-    const String* LinkPath() const { return kind == LinkEntry ? &Payload() : nullptr; }
+    // The path of a link; none for any other kind. Good as long as Text.
+    std::optional<std::u16string_view> LinkPath() const {
+        return kind == LinkEntry ? std::optional(Payload()) : std::nullopt;
+    }
 
     // The node of a child entry; null for any other kind. Owned by the entry.
     ResTreeNode* Child() const { return kind == ChildEntry ? ChildPayload() : nullptr; }
@@ -75,38 +81,36 @@ class NodeEntry {
     // of its own.
     ResTreeNode* TakeChild();
 
-    // Gives the entry a key of its own, equal to the one that it has, if that is the name of its child. Throws
-    // bad_alloc.
+    // Gives the entry a key that can be changed, equal to the one that it has. Throws bad_alloc.
     void OwnKey();
 
-    // Frees the text of a text or link entry and leaves the entry empty.
+    // Leaves a text or link entry empty.
     void ReleaseText();
 
   private:
     friend class EntryList;
     friend class EntryPieces;
 
-    // What was allocated; the kind may have become EmptyEntry since.
+    // What stands behind the common head; the kind may have become EmptyEntry since.
     enum class Shape : uint8_t {
-        Text,
+        Packed,      // Key and text in the entry's own block, as nearly always: most are never changed.
+        Unpacked,    // Key and text as Strings.
         Child,       // The key is the child's name, as nearly always: a node's name changes by a renaming alone.
         KeyedChild,  // The key is the entry's.
     };
 
-    // The shapes differ behind the common head, so that a child entry doesn't carry room for a text.
     struct TextShape;
     struct ChildShape;
 
     NodeEntry(uint8_t keyHash, EntryKind kind, Shape shape) : keyHash(keyHash), kind(kind), shape(shape) {}
     ~NodeEntry() = default;
 
-    inline const String& TextKey() const;
-    inline const String* ChildKey() const;
-    inline String& Payload();
-    inline const String& Payload() const;
+    inline std::u16string_view Payload() const;
     inline ResTreeNode* ChildPayload() const;
 
-    // Swaps the key, which is the entry's own, for `key`.
+    void Unpack(std::u16string_view text);
+
+    // Swaps the key for `key`. Only behind OwnKey.
     void SwapKey(String& key, uint8_t hash) noexcept;
 
     uint32_t pieceNumber = 0;  // Of the piece of a long list that holds the entry (EntryPieces.h); 0 in a short list.
@@ -116,35 +120,63 @@ class NodeEntry {
     bool textMarked = false;
 };
 
+// A packed entry has its units in the same block, behind the lengths: a tree has more of these than of anything else,
+// and two Strings of their own took twice the memory.
 struct NodeEntry::TextShape : NodeEntry {
-    TextShape(String&& key, uint8_t keyHash, EntryKind kind, String&& text)
-        : NodeEntry(keyHash, kind, Shape::Text), key(static_cast<String&&>(key)), text(static_cast<String&&>(text)) {}
-    String key;
-    String text;
+    struct Lengths {
+        uint32_t key;
+        uint32_t text;
+    };
+    struct Strings {
+        String key;
+        String text;
+    };
+
+    TextShape(HashedKey key, EntryKind kind, std::u16string_view text);
+
+    static size_t SizeFor(size_t keyLength, size_t textLength) {
+        return sizeof(TextShape) + (keyLength + textLength) * sizeof(char16_t);
+    }
+    char16_t* Units() { return reinterpret_cast<char16_t*>(this + 1); }
+    const char16_t* Units() const { return reinterpret_cast<const char16_t*>(this + 1); }
+
+    union {
+        Lengths lengths;
+        Strings* strings;  // Of an Unpacked one.
+    };
 };
 
 struct NodeEntry::ChildShape : NodeEntry {
-    ChildShape(const String* key, uint8_t keyHash, Shape shape, ResTreeNode* child)
-        : NodeEntry(keyHash, ChildEntry, shape), child(child), key(key) {}
-    ~ChildShape();
-    ChildShape(const ChildShape&) = delete;
-    ChildShape& operator=(const ChildShape&) = delete;
+    ChildShape(const String* name, uint8_t keyHash, ResTreeNode* child)
+        : NodeEntry(keyHash, ChildEntry, Shape::Child), child(child), name(name) {}
+
     ResTreeNode* child;
-    const String* key;
+    union {
+        const String* name;
+        String* ownKey;  // Of a KeyedChild.
+    };
 };
 
-inline const String& NodeEntry::TextKey() const {
-    return static_cast<const TextShape*>(this)->key;
+inline std::u16string_view NodeEntry::Key() const {
+    if (shape == Shape::Packed) {
+        const auto& entry = static_cast<const TextShape&>(*this);
+        return {entry.Units(), entry.lengths.key};
+    }
+    if (shape == Shape::Unpacked) {
+        return static_cast<const TextShape*>(this)->strings->key.View();
+    }
+    const auto& entry = static_cast<const ChildShape&>(*this);
+    return (shape == Shape::Child ? *entry.name : *entry.ownKey).View();
 }
-inline const String* NodeEntry::ChildKey() const {
-    return static_cast<const ChildShape*>(this)->key;
+
+inline std::u16string_view NodeEntry::Payload() const {
+    const auto& entry = static_cast<const TextShape&>(*this);
+    if (shape == Shape::Packed) {
+        return {entry.Units() + entry.lengths.key, entry.lengths.text};
+    }
+    return entry.strings->text.View();
 }
-inline String& NodeEntry::Payload() {
-    return static_cast<TextShape*>(this)->text;
-}
-inline const String& NodeEntry::Payload() const {
-    return static_cast<const TextShape*>(this)->text;
-}
+
 inline ResTreeNode* NodeEntry::ChildPayload() const {
     return static_cast<const ChildShape*>(this)->child;
 }

@@ -128,11 +128,11 @@ String JoinEscapedPath(TextArgument parentPath, TextArgument name) {
     return JoinList(parentPath, name, separator, false, true);
 }
 
-String JoinDisplayPath(TextArgument parentPath, TextArgument name, const String* displayName) {
-    if (displayName == nullptr) {
+String JoinDisplayPath(TextArgument parentPath, TextArgument name, std::optional<std::u16string_view> displayName) {
+    if (!displayName) {
         return JoinEscapedPath(parentPath, name);
     }
-    return displayName->IsEmpty() ? String(parentPath.View()) : JoinEscapedPath(parentPath, *displayName);
+    return displayName->empty() ? String(parentPath.View()) : JoinEscapedPath(parentPath, *displayName);
 }
 
 String MakeRelativeNodePath(TextArgument target, TextArgument base) {

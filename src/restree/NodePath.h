@@ -3,6 +3,9 @@
 // The text of node paths: "/" is the root, "/a/b" a node below it, "../b" one that is seen from another. A "/" or a
 // backslash that belongs to a name has a backslash before it. Nothing here looks at a tree. All linear in the texts.
 
+#include <optional>
+#include <string_view>
+
 #include "qn/dsc/StringBase.h"
 #include "qn/dsc/TextArgument.h"
 
@@ -14,9 +17,9 @@ using qn::dsc::TextArgument;
 // The path of the child `name`, which is put in with its escapes, of the node at `parentPath`.
 String JoinEscapedPath(TextArgument parentPath, TextArgument name);
 
-// The same with names for display: `displayName` stands for `name` unless it is null. A node with an empty display
+// The same with names for display: `displayName`, if there is one, stands for `name`. A node with an empty display
 // name leaves no trace: the result is `parentPath`.
-String JoinDisplayPath(TextArgument parentPath, TextArgument name, const String* displayName);
+String JoinDisplayPath(TextArgument parentPath, TextArgument name, std::optional<std::u16string_view> displayName);
 
 // The path that leads from the node at `base` to the node at `target`: ".." for each component of `base` that `target`
 // does not share, then the components of `target` that are left. Components are compared blind to letter case. Empty

@@ -47,7 +47,7 @@ NodeEntry* OrderedKeyIndex::Find(std::u16string_view key) {
         return nullptr;
     }
     NodeEntry* entry = sorted->At(position);
-    return Compare(entry->Key().View(), key) == 0 ? entry : nullptr;
+    return Compare(entry->Key(), key) == 0 ? entry : nullptr;
 }
 
 void OrderedKeyIndex::Add(NodeEntry* entry, bool atEnd) {
@@ -78,14 +78,14 @@ bool OrderedKeyIndex::StandsBefore(const NodeEntry& left, const NodeEntry& right
 size_t OrderedKeyIndex::FindSlot(uint32_t hash, std::u16string_view key) const {
     size_t slot = HomeOf(hash);
     while (slots[slot].entry != nullptr &&
-           (slots[slot].hash != hash || Compare(slots[slot].entry->Key().View(), key) != 0)) {
+           (slots[slot].hash != hash || Compare(slots[slot].entry->Key(), key) != 0)) {
         slot = (slot + 1) & (slots.size() - 1);
     }
     return slot;
 }
 
 void OrderedKeyIndex::AddToSlots(NodeEntry* entry, bool atEnd) {
-    const std::u16string_view key = entry->Key().View();
+    const std::u16string_view key = entry->Key();
     uint32_t hash = 0;
     if (hasForeignKeys || !HashAscii(key, hash)) {
         hasForeignKeys = true;
@@ -123,17 +123,17 @@ void OrderedKeyIndex::Enlarge() {
 
 void OrderedKeyIndex::RemoveFromSlots(const NodeEntry* entry) {
     uint32_t hash = 0;
-    if (hasForeignKeys || !HashAscii(entry->Key().View(), hash)) {
+    if (hasForeignKeys || !HashAscii(entry->Key(), hash)) {
         return;
     }
-    const size_t slot = FindSlot(hash, entry->Key().View());
+    const size_t slot = FindSlot(hash, entry->Key());
     if (slots[slot].entry != entry) {
         return;
     }
     if (slots[slot].isRepeated) {
         RequireSorted();
         const EntryPosition next = sorted->Next(PlaceOf(entry));
-        if (!next.IsEnd() && Compare(sorted->At(next)->Key().View(), entry->Key().View()) == 0) {
+        if (!next.IsEnd() && Compare(sorted->At(next)->Key(), entry->Key()) == 0) {
             slots[slot].entry = sorted->At(next);
             return;
         }
@@ -166,7 +166,7 @@ void OrderedKeyIndex::RequireSorted() {
         entries.push_back(list.At(position));
     }
     std::stable_sort(entries.begin(), entries.end(), [](const NodeEntry* left, const NodeEntry* right) {
-        return Compare(left->Key().View(), right->Key().View()) < 0;
+        return Compare(left->Key(), right->Key()) < 0;
     });
     sorted.emplace(false);
     try {
@@ -180,22 +180,22 @@ void OrderedKeyIndex::RequireSorted() {
 }
 
 EntryPosition OrderedKeyIndex::LowerBound(std::u16string_view key) const {
-    return sorted->PartitionPoint([&](const NodeEntry& entry) { return Compare(entry.Key().View(), key) < 0; });
+    return sorted->PartitionPoint([&](const NodeEntry& entry) { return Compare(entry.Key(), key) < 0; });
 }
 
 void OrderedKeyIndex::AddSorted(NodeEntry* entry, bool atEnd) {
-    const std::u16string_view key = entry->Key().View();
+    const std::u16string_view key = entry->Key();
     sorted->Insert(sorted->PartitionPoint([&](const NodeEntry& other) {
-        const int order = Compare(other.Key().View(), key);
+        const int order = Compare(other.Key(), key);
         return order < 0 || (order == 0 && (atEnd || StandsBefore(other, *entry)));
     }),
                    entry);
 }
 
 EntryPosition OrderedKeyIndex::PlaceOf(const NodeEntry* entry) const {
-    const std::u16string_view key = entry->Key().View();
+    const std::u16string_view key = entry->Key();
     return sorted->PartitionPoint([&](const NodeEntry& other) {
-        const int order = Compare(other.Key().View(), key);
+        const int order = Compare(other.Key(), key);
         return order < 0 || (order == 0 && &other != entry && StandsBefore(other, *entry));
     });
 }

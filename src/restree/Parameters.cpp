@@ -58,37 +58,35 @@ bool InstanceParameters::AppendValue(std::u16string_view name, TextBuilder& text
     return true;
 }
 
-uint32_t FindVariable(const String& text) {
-    const size_t open = FindOpenMark(text.View(), 0);
-    return open == text.View().size() ? String::npos : static_cast<uint32_t>(open);
+size_t FindVariable(std::u16string_view text) {
+    const size_t open = FindOpenMark(text, 0);
+    return open == text.size() ? std::u16string_view::npos : open;
 }
 
-String ExpandVariables(const String& text, const Parameters& parameters, uint32_t from) {
+void ExpandVariables(std::u16string_view text, const Parameters& parameters, TextBuilder& result, size_t from) {
     if (parameters.IsEmpty()) {
-        return text;
+        result.Append(text);
+        return;
     }
-    const std::u16string_view source = text.View();
-    TextBuilder result;
     size_t done = 0;
-    size_t open = FindOpenMark(source, from);
-    while (open < source.size()) {
+    size_t open = FindOpenMark(text, from);
+    while (open < text.size()) {
         const size_t inside = open + openMark.size();
-        const size_t close = FindUnit(source, u'}', inside);
-        if (close == source.size()) {
+        const size_t close = FindUnit(text, u'}', inside);
+        if (close == text.size()) {
             break;
         }
-        result.Append(source.substr(done, open - done));
-        const std::u16string_view key = TrimmedPart(source.substr(inside, close - inside));
+        result.Append(text.substr(done, open - done));
+        const std::u16string_view key = TrimmedPart(text.substr(inside, close - inside));
         if (!parameters.AppendValue(key, result)) {
             result.Append(openMark);
             result.Append(key);
             result.Append(u'}');
         }
         done = close + 1;
-        open = FindOpenMark(source, done);
+        open = FindOpenMark(text, done);
     }
-    result.Append(source.substr(done));
-    return result.Text();
+    result.Append(text.substr(done));
 }
 
 // --- Expansion in a subtree ---
@@ -111,9 +109,11 @@ void ResTreeNode::ApplyParameters(const Parameters& parameters) {
                 return;
             }
             inner.pop_back();
-        } else if (const String* text = entry->Text()) {
-            if (const uint32_t open = FindVariable(*text); open != String::npos) {
-                level.node->SetEntryText(entry, ExpandVariables(*text, parameters, open));
+        } else if (const auto text = entry->Text()) {
+            if (const size_t open = FindVariable(*text); open != std::u16string_view::npos) {
+                TextBuilder expanded;
+                ExpandVariables(*text, parameters, expanded, open);
+                level.node->SetEntryText(entry, expanded.View());
             }
         } else if (ResTreeNode* child = entry->Child()) {
             child->EnsureDeferredLoaded();

@@ -3,6 +3,7 @@
 // Parameters of the resource language: what "#{name}" in a text stands for. Most texts ask for one or two of the many
 // attributes that are open, so values are looked for when they are asked for.
 
+#include <cstddef>
 #include <cstdint>
 #include <map>
 #include <string_view>
@@ -60,12 +61,12 @@ class InstanceParameters : public Parameters {
     int32_t index;
 };
 
-// `text` with every "#{name}" that has a parameter replaced by its value, in one pass. An unknown one stays, without
+// Appends `text` with every "#{name}" that has a parameter replaced by its value, in one pass. An unknown one stays, without
 // the blanks inside its braces; a "#{" that isn't closed stays with all that follows. `from` is what FindVariable gave,
 // for who has it.
-String ExpandVariables(const String& text, const Parameters& parameters, uint32_t from = 0);
+void ExpandVariables(std::u16string_view text, const Parameters& parameters, TextBuilder& result, size_t from = 0);
 
 // The offset of the first "#{"; npos if there is nothing to expand.
-uint32_t FindVariable(const String& text);
+size_t FindVariable(std::u16string_view text);
 
 }  // namespace zkhw

@@ -112,11 +112,11 @@ void ParseStack::FinishElement(const char* name) {
         ElementReader(*this).FlushPendingElement(ElementMode::Leaf, {}, nullptr);
     }
     if (frame->position != nullptr) {
-        String* value = frame->position->Text();
-        if (value != nullptr && frame->xmlDepth > 1) {
-            value->Append(u"</");
-            value->Append(Widen(name));
-            value->Append(u">");
+        if (frame->position->IsText() && frame->xmlDepth > 1) {
+            String& value = frame->position->EditText();
+            value.Append(u"</");
+            value.Append(Widen(name));
+            value.Append(u">");
             --frame->xmlDepth;
         } else {
             frame->position = nullptr;

@@ -110,15 +110,13 @@ NodeEntry* ResTreeNode::Find(HashedKey key) {
     return FindRaw(key);
 }
 
-const String* ResTreeNode::GetProperty(HashedKey key) {
+std::optional<std::u16string_view> ResTreeNode::GetProperty(HashedKey key) {
     const NodeEntry* entry = Find(key);
-    return entry == nullptr ? nullptr : entry->Text();
+    return entry == nullptr ? std::nullopt : entry->Text();
 }
 
-const String& ResTreeNode::GetPropertyOrEmpty(HashedKey key) {
-    static const String empty;
-    const String* value = GetProperty(key);
-    return value == nullptr ? empty : *value;
+std::u16string_view ResTreeNode::GetPropertyOrEmpty(HashedKey key) {
+    return GetProperty(key).value_or(std::u16string_view());
 }
 
 ResTreeNode* ResTreeNode::ResolveEntry(EntryIterator iterator) {
@@ -129,9 +127,9 @@ ResTreeNode* ResTreeNode::ResolveEntry(NodeEntry* entry) {
     if (entry == nullptr) {
         return nullptr;
     }
-    if (entry->LinkPath() != nullptr) {
+    if (const auto link = entry->LinkPath()) {
         // A load on the way may change the entry.
-        const String path = *entry->LinkPath();
+        const String path(*link);
         return Lookup(path.View(), nullptr);
     }
     return entry->Child();
@@ -141,22 +139,21 @@ ResTreeNode* ResTreeNode::ResolveEntry(NodeEntry* entry) {
 
 bool ResTreeNode::SetProperty(std::u16string_view key, std::u16string_view value) {
     if (NodeEntry* entry = Find(key)) {
-        return SetEntryText(entry, String(value));
+        return SetEntryText(entry, value);
     }
-    AddTextEntry(String(key), String(value), TextEntry);
+    AddTextEntry(key, value, TextEntry);
     return true;
 }
 
 bool ResTreeNode::SetEntryText(EntryIterator iterator, std::u16string_view value) {
-    return !iterator.IsEnd() && SetEntryText(&*iterator, String(value));
+    return !iterator.IsEnd() && SetEntryText(&*iterator, value);
 }
 
-bool ResTreeNode::SetEntryText(NodeEntry* entry, String&& value) {
-    String* text = entry == nullptr ? nullptr : entry->Text();
-    if (text == nullptr) {
+bool ResTreeNode::SetEntryText(NodeEntry* entry, std::u16string_view value) {
+    if (entry == nullptr || !entry->IsText()) {
         return false;
     }
-    text->Swap(value);
+    entry->SetText(value);
     RaiseTextChange(*entry);
     return true;
 }
@@ -165,7 +162,7 @@ void ResTreeNode::RaiseTextChange(const NodeEntry& entry) {
     if (!MayBeHeard() && (parent == nullptr || !parent->MayBeHeard())) {
         return;
     }
-    const bool isDisplayName = Compare(entry.Key().View(), displayNameKey) == 0;
+    const bool isDisplayName = Compare(entry.Key(), displayNameKey) == 0;
     const ReleaseScope scope;
     Raise(PropertyChanged);
     if (isDisplayName) {
@@ -197,26 +194,26 @@ ResTreeNode::Added ResTreeNode::Store(EntryPosition position, NodeEntry* entry, 
     return {entry, true};
 }
 
-ResTreeNode::Added ResTreeNode::AddTextEntry(String&& key, String&& value, EntryKind kind, const String* before) {
-    return AddText(std::move(key), std::move(value), kind, PropertyAdded, before);
+ResTreeNode::Added ResTreeNode::AddTextEntry(std::u16string_view key, std::u16string_view value, EntryKind kind,
+                                             const String* before) {
+    return AddText(key, value, kind, PropertyAdded, before);
 }
 
-ResTreeNode::Added ResTreeNode::AddLinkEntry(String&& key, String&& path, const String* before) {
-    return AddText(std::move(key), std::move(path), LinkEntry, ChildAdded, before);
+ResTreeNode::Added ResTreeNode::AddLinkEntry(std::u16string_view key, std::u16string_view path, const String* before) {
+    return AddText(key, path, LinkEntry, ChildAdded, before);
 }
 
-ResTreeNode::Added ResTreeNode::AddText(String&& key, String&& text, EntryKind kind, uint32_t change,
+ResTreeNode::Added ResTreeNode::AddText(HashedKey key, std::u16string_view text, EntryKind kind, uint32_t change,
                                         const String* before) {
     EntryPosition position = PositionBefore(before);
-    const HashedKey hashed(key.View());
     if (!IsOrdered()) {
-        const EntryList::Place place = entries.FindPlace(hashed);
+        const EntryList::Place place = entries.FindPlace(key);
         if (place.entry != nullptr) {
             return {place.entry, false};
         }
         position = place.position;
     }
-    return Store(position, NodeEntry::MakeText(std::move(key), hashed.hash, kind, std::move(text)), change);
+    return Store(position, NodeEntry::MakeText(key, kind, text), change);
 }
 
 ResTreeNode::Added ResTreeNode::AddChildEntry(std::u16string_view key, std::u16string_view childType, bool childOrdered,
@@ -274,7 +271,7 @@ EntryPosition ResTreeNode::PlaceInFront(std::u16string_view key) const {
 EntryIterator ResTreeNode::InsertEntry(EntryIterator position, std::u16string_view key, EntryKind kind,
                                        std::u16string_view text) {
     const EntryPosition place = IsOrdered() ? position.Position() : PlaceInFront(key);
-    NodeEntry* entry = NodeEntry::MakeText(String(key), kind, String(text));
+    NodeEntry* entry = NodeEntry::MakeText(key, kind, text);
     try {
         entries.Insert(place, entry);
     } catch (...) {
@@ -422,11 +419,7 @@ bool ResTreeNode::Supports(std::u16string_view text) {
     if (text.empty() || IsA(text)) {
         return true;
     }
-    const String* protocols = GetProperty(protocolsKey);
-    if (protocols == nullptr) {
-        return false;
-    }
-    const std::u16string_view value = protocols->View();
+    const std::u16string_view value = GetPropertyOrEmpty(protocolsKey);
     for (size_t hit = value.find(text); hit != std::u16string_view::npos; hit = value.find(text, hit + 1)) {
         const size_t end = hit + text.size();
         if ((hit == 0 || value[hit - 1] == u',') && (end == value.size() || value[end] == u',')) {
@@ -453,9 +446,7 @@ void ResTreeNode::GetProtocols(std::vector<String>& list) {
     if (const TypeRecord* record = table == nullptr ? nullptr : table->Find(type.View())) {
         AppendBaseNames(*record, list);
     }
-    if (const String* protocols = GetProperty(protocolsKey)) {
-        SplitList(protocols->View(), u',', list, true);
-    }
+    SplitList(GetPropertyOrEmpty(protocolsKey), u',', list, true);
 }
 
 void ResTreeNode::MakeTypeTableLocal() {

@@ -9,6 +9,7 @@
 
 #include <cstdint>
 #include <memory>
+#include <optional>
 #include <set>
 #include <string_view>
 #include <vector>
@@ -102,12 +103,12 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
         return {entries, StillHolds(entry) ? entries.Locate(entry) : EntryList::End()};
     }
 
-    // The value of the text entry `key`; null if there is none or the entry is of another kind. May load (FindEntry).
+    // The value of the text entry `key`; none if there is no such entry or it is of another kind. May load (FindEntry).
     // The result lives in the node until the entry is changed or removed.
-    const String* GetProperty(HashedKey key);
+    std::optional<std::u16string_view> GetProperty(HashedKey key);
 
-    // As GetProperty, with one shared empty String in place of null.
-    const String& GetPropertyOrEmpty(HashedKey key);
+    // As GetProperty, with the empty text in place of none.
+    std::u16string_view GetPropertyOrEmpty(HashedKey key);
 
     // The node that the entry stands for: a child, or where a link leads. Null at the end, for a text and for a link
     // that leads nowhere. Following a link may load.
@@ -121,13 +122,14 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
 
     // Assigns the value of a text entry; its kind stays. False, and nothing changes, if the entry is no text.
     bool SetEntryText(EntryIterator iterator, std::u16string_view value);
-    bool SetEntryText(NodeEntry* entry, String&& value);
+    bool SetEntryText(NodeEntry* entry, std::u16string_view value);
 
     // Add an entry in front of `before`, or at the end if that is null or not to be found. An unordered node that has
-    // the key already makes nothing and gives what is there; an ordered node always makes a new entry.
-    // Strings are moved from when an entry is made.
-    Added AddTextEntry(String&& key, String&& value, EntryKind kind, const String* before = nullptr);
-    Added AddLinkEntry(String&& key, String&& path, const String* before = nullptr);
+    // the key already makes nothing and gives what is there; an ordered node always makes a new entry. Looking for
+    // `before` may load: the other texts must outlive that.
+    Added AddTextEntry(std::u16string_view key, std::u16string_view value, EntryKind kind,
+                       const String* before = nullptr);
+    Added AddLinkEntry(std::u16string_view key, std::u16string_view path, const String* before = nullptr);
 
     // `child` is the new node; if nothing was made, the existing one, or null if the entry is no child.
     Added AddChildEntry(std::u16string_view key, std::u16string_view childType, bool childOrdered, ResTreeNode*& child,
@@ -358,7 +360,7 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     void RaiseTextChange(const NodeEntry& entry);
     EntryPosition PositionBefore(const String* before);
     EntryPosition PlaceInFront(std::u16string_view key) const;
-    Added AddText(String&& key, String&& text, EntryKind kind, uint32_t change, const String* before);
+    Added AddText(HashedKey key, std::u16string_view text, EntryKind kind, uint32_t change, const String* before);
     Added AddChildAt(EntryPosition position, HashedKey hashed, String&& key, String&& childType, bool childOrdered,
                      ResTreeNode*& child);
     Added ReplaceChild(bool unconditional, HashedKey hashed, String&& key, String&& childType, bool childOrdered,

@@ -50,7 +50,7 @@ struct ResTreeNode::MergeWalk {
         }
     }
     void MergeText(Level& level, const NodeEntry& entry);
-    void StoreText(Level& level, const NodeEntry& entry, String&& text);
+    void StoreText(Level& level, const NodeEntry& entry, std::u16string_view text);
     void MergeLink(Level& level, const NodeEntry& entry);
 
     const ReleaseScope scope;
@@ -68,12 +68,12 @@ void ResTreeNode::MergeWalk::Run() {
             levels.Pop();
         } else if (entry->IsText()) {
             MergeText(level, *entry);
-        } else if (entry->LinkPath() != nullptr) {
+        } else if (entry->Kind() == LinkEntry) {
             MergeLink(level, *entry);
         } else if (ResTreeNode* sourceChild = entry->Child(); sourceChild != nullptr && sourceChild != top) {
             NodeEntry* placed = nullptr;
             if (ResTreeNode* child = level.target->PrepareClone(
-                    EntryList::End(), {entry->Key().View(), entry->KeyHash()}, *sourceChild, overwrite, placed)) {
+                    EntryList::End(), {entry->Key(), entry->KeyHash()}, *sourceChild, overwrite, placed)) {
                 Enter(*child, *sourceChild);
             }
         }
@@ -81,31 +81,33 @@ void ResTreeNode::MergeWalk::Run() {
 }
 
 void ResTreeNode::MergeWalk::MergeText(Level& level, const NodeEntry& entry) {
-    const String& text = *entry.Text();
-    const uint32_t open = parameters == nullptr ? String::npos : FindVariable(text);
-    if (open == String::npos) {
-        StoreText(level, entry, String(text));
+    const std::u16string_view text = *entry.Text();
+    const size_t open = parameters == nullptr ? std::u16string_view::npos : FindVariable(text);
+    if (open == std::u16string_view::npos) {
+        StoreText(level, entry, text);
         return;
     }
-    StoreText(level, entry, ExpandVariables(text, *parameters, open));
+    TextBuilder expanded;
+    ExpandVariables(text, *parameters, expanded, open);
+    StoreText(level, entry, expanded.View());
     if (level.target == top) {
         // Nobody hears of nodes that are just being made, but the node that holds the new one may gather its changes.
         top->RaiseTextChange(entry);
     }
 }
 
-void ResTreeNode::MergeWalk::StoreText(Level& level, const NodeEntry& entry, String&& text) {
+void ResTreeNode::MergeWalk::StoreText(Level& level, const NodeEntry& entry, std::u16string_view text) {
     ResTreeNode& target = *level.target;
+    const HashedKey key(entry.Key(), entry.KeyHash());
     if (level.copiedInOrder == target.entries.Size()) {
         // The search would end at the end.
         ++level.copiedInOrder;
-        target.Store(EntryList::End(), NodeEntry::CopyText(entry, std::move(text)), PropertyAdded);
+        target.Store(EntryList::End(), NodeEntry::MakeText(key, entry.Kind(), text), PropertyAdded);
         return;
     }
-    const Added added = target.AddTextEntry(String(entry.Key()), std::move(text), entry.Kind());
+    const Added added = target.AddText(key, text, entry.Kind(), PropertyAdded, nullptr);
     if (!added.isNew && overwrite) {
-        // NOLINTNEXTLINE(bugprone-use-after-move): the text was taken only if an entry was made.
-        target.SetEntryText(added.entry, std::move(text));
+        target.SetEntryText(added.entry, text);
     }
 }
 
@@ -117,11 +119,10 @@ void ResTreeNode::MergeWalk::MergeLink(Level& level, const NodeEntry& entry) {
     }
     // The text of the link counts as one further component of the path, slashes and all.
     const String linkTarget = JoinList(level.sourcePath, *entry.LinkPath(), u'/', false, true);
-    String path = MakeRelativeNodePath(linkTarget, level.targetPath);
-    const Added added = level.target->AddLinkEntry(String(entry.Key()), std::move(path));
+    const String path = MakeRelativeNodePath(linkTarget, level.targetPath);
+    const Added added = level.target->AddLinkEntry(entry.Key(), path.View());
     if (!added.isNew && overwrite) {
-        // NOLINTNEXTLINE(bugprone-use-after-move): the path was taken only if an entry was made.
-        level.target->SetEntryText(added.entry, std::move(path));
+        level.target->SetEntryText(added.entry, path.View());
     }
 }
 

@@ -180,10 +180,10 @@ void ResTreeNode::ReportParseError(const ParseStack& stack, const NarrowString* 
 
     NodeEntry* entry = Find(parseErrorsKey);
     if (entry == nullptr) {
-        AddTextEntry(String(parseErrorsKey), std::move(report), TextEntry);
-    } else if (String* reports = entry->Text()) {
+        AddTextEntry(parseErrorsKey, report.View(), TextEntry);
+    } else if (entry->IsText()) {
         // In place: with many reports a copy of them all for each would take quadratic time.
-        reports->Append(report);
+        entry->EditText().Append(report);
         Raise(PropertyChanged);
     }
 }
@@ -206,7 +206,7 @@ void ResTreeNode::TakeOrder(bool ordered) {
     size_t at = lost.size();
     for (NodeEntry* entry : kept) {
         --at;
-        const EntryList::Place place = ordered ? EntryList::Place{} : entries.FindPlace(entry->Key().View());
+        const EntryList::Place place = ordered ? EntryList::Place{} : entries.FindPlace(entry->Key());
         if (place.entry == nullptr) {
             entries.Insert(place.position, entry);
             lost.erase(lost.begin() + static_cast<ptrdiff_t>(at));
@@ -215,7 +215,7 @@ void ResTreeNode::TakeOrder(bool ordered) {
 }
 
 void ResTreeNode::NoteUnusualKey(const NodeEntry& entry) {
-    if (qn::dsc::osdep::Compare(entry.Key().View(), deferredPathKey.text) == 0) {
+    if (qn::dsc::osdep::Compare(entry.Key(), deferredPathKey.text) == 0) {
         NoteDeferredContents();
     }
 }
@@ -236,7 +236,7 @@ bool ResTreeNode::TakeDeferredPaths(std::vector<String>& paths) {
     if (entry == nullptr || !entry->IsText()) {
         return false;
     }
-    SplitList(entry->Text()->View(), u',', paths, true);
+    SplitList(*entry->Text(), u',', paths, true);
     // Before any file is read: the load's own lookups must not come back here.
     RemoveEntry(entry);
     return true;

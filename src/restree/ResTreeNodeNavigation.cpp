@@ -85,15 +85,15 @@ ResTreeNode* ResTreeNode::Lookup(std::u16string_view path, ResTreeNode* document
             node = node->parent;
         } else if (Compare(component, u".") != 0) {
             const NodeEntry* entry = node->Find(component);
-            const String* link = entry == nullptr ? nullptr : entry->LinkPath();
-            if (link == nullptr) {
+            const auto link = entry == nullptr ? std::nullopt : entry->LinkPath();
+            if (!link) {
                 node = entry == nullptr ? nullptr : entry->Child();
             } else {
                 if (++followed > maximalLinks) {
                     return nullptr;
                 }
-                const size_t linkStart = FindStart(link->View(), node, nullptr);
-                links.push_back(std::make_unique<LinkPath>(link->View(), linkStart));
+                const size_t linkStart = FindStart(*link, node, nullptr);
+                links.push_back(std::make_unique<LinkPath>(*link, linkStart));
             }
         }
         if (node == nullptr) {
@@ -194,11 +194,11 @@ String ResTreeNode::GetDisplayPath() {
     const ReleaseScope scope;
     GrowingPath path;
     for (ResTreeNode* node : WayFromRoot(this)) {
-        const String* displayName = node->GetProperty(displayNameKey);
-        if (displayName == nullptr) {
+        const auto displayName = node->GetProperty(displayNameKey);
+        if (!displayName) {
             path.Append(node->name.View());
-        } else if (!displayName->IsEmpty()) {
-            path.Append(displayName->View());
+        } else if (!displayName->empty()) {
+            path.Append(*displayName);
         }
     }
     return path.Take();

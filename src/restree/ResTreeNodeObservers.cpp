@@ -284,7 +284,7 @@ void ResTreeNode::GetDependants(std::vector<ResTreeNode*>& list, bool raw) {
         return;
     }
     std::vector<String> paths;
-    SplitList(entry->Text()->View(), u',', paths, true);
+    SplitList(*entry->Text(), u',', paths, true);
     const size_t first = list.size();
     const uint64_t removals = ReleaseScope::CountOfNodes();
     LookUpAll(paths, list);

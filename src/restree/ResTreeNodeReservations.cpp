@@ -151,7 +151,7 @@ void ResTreeNode::MirrorReservations() {
             RemoveEntry(entry);
         }
     } else if (entry == nullptr) {
-        list->NoteWritten(*AddTextEntry(String(reservationKey), list->Text(), TextEntry).entry);
+        list->NoteWritten(*AddTextEntry(reservationKey, list->Text().View(), TextEntry).entry);
     } else if (entry->IsText()) {
         list->WriteTo(*entry);
         Raise(PropertyChanged);

@@ -223,9 +223,9 @@ void ReservationList::WriteTo(NodeEntry& entry) {
     const bool isEditable =
         edit.kind != Edit::Anything && written == &entry && entry.IsTextMarked() && changes == changesWritten + 1;
     if (isEditable) {
-        EditText(*entry.Text());
+        EditText(entry.EditText());
     } else {
-        *entry.Text() = Text();
+        entry.SetText(Text().View());
     }
     NoteWritten(entry);
 }

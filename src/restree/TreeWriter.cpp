@@ -50,7 +50,7 @@ void AppendTextElement(String& out, std::u16string_view tag, std::u16string_view
     out.Append(u">"sv);
 }
 
-void AppendLink(String& out, std::u16string_view key, const String& path, Indent indent) {
+void AppendLink(String& out, std::u16string_view key, std::u16string_view path, Indent indent) {
     BeginLine(out, indent);
     // Two blanks: that is the form of a link.
     out.Append(u"<:Link  name=\""sv);
@@ -61,8 +61,7 @@ void AppendLink(String& out, std::u16string_view key, const String& path, Indent
 }
 
 // What a localised text shows is only its choice; behind the first NUL stands the list that it was chosen from.
-std::u16string_view LanguageList(const String& value) {
-    const std::u16string_view text = value.View();
+std::u16string_view LanguageList(std::u16string_view text) {
     const size_t separator = text.find(u'\0');
     const bool hasList = separator != std::u16string_view::npos && separator + 1 < text.size();
     return hasList ? text.substr(separator + 1) : text;
@@ -95,7 +94,7 @@ ResTreeNode* AppendFlatEntry(const NodeEntry& entry, String& out, std::u16string
                              const String* type) {
     switch (entry.Kind()) {
         case TextEntry:
-            AppendTextElement(out, key, entry.Text()->View(), indent, type, false);
+            AppendTextElement(out, key, *entry.Text(), indent, type, false);
             return nullptr;
         case LocalizedTextEntry:
             AppendTextElement(out, key, LanguageList(*entry.Text()), indent, type, true);
@@ -152,7 +151,7 @@ class SubtreeWriter {
             if (next == nullptr) {
                 continue;
             }
-            if (ResTreeNode* child = AppendFlatEntry(*next, out, next->Key().View(), indent.Deeper(), nullptr)) {
+            if (ResTreeNode* child = AppendFlatEntry(*next, out, next->Key(), indent.Deeper(), nullptr)) {
                 Open(*child, indent.Deeper().blanks);
             }
         }
@@ -196,7 +195,7 @@ void AppendEntry(const NodeEntry& entry, String& out, std::u16string_view key, I
 void AppendProperty(const ResTreeNode& node, String& out, std::u16string_view key, Indent indent, const String* type,
                     const String* fallback) {
     if (const NodeEntry* entry = node.FindRaw(key)) {
-        AppendEntry(*entry, out, entry->Key().View(), indent, type);
+        AppendEntry(*entry, out, entry->Key(), indent, type);
     } else if (fallback != nullptr) {
         AppendTextElement(out, key, fallback->View(), indent, type, false);
     }

@@ -5,6 +5,7 @@
 
 #include <array>
 #include <cstddef>
+#include <cstdint>
 #include <cstring>
 #include <memory>
 #include <string_view>
@@ -45,6 +46,24 @@ class TextBuilder {
         }
         WidenAscii(part.data(), part.size(), units + size);
         size += part.size();
+    }
+
+    // Appends what `bytes` of UTF-8 stand for, by the rules of Utf8ToWide.h. False, and the text is as it was, if they
+    // are not such text.
+    bool AppendUtf8(std::string_view bytes) {
+        if (bytes.size() > capacity - size) [[unlikely]] {
+            Grow(bytes.size());
+        }
+        size_t count = bytes.size();
+        if (!WidenAscii(bytes.data(), bytes.size(), units + size)) [[unlikely]] {
+            count = MeasureUtf8(bytes.data(), bytes.size());
+            if (count == SIZE_MAX) {
+                return false;
+            }
+            DecodeUtf8(bytes.data(), bytes.size(), units + size, count);
+        }
+        size += count;
+        return true;
     }
 
     bool IsEmpty() const { return size == 0; }
