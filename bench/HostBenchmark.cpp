@@ -74,7 +74,7 @@ ResTreeNode& AddNode(ResTreeNode& parent, const char16_t* name, bool ordered = f
 
 void FillIn(ResTreeNode& node) {
     for (const char16_t* key : keys) {
-        node.AddTextEntry(String(key), String(u"COM.QN.FPGA.Board"), zkhw::TextEntry);
+        node.AddTextEntry(key, u"COM.QN.FPGA.Board", zkhw::TextEntry);
     }
 }
 

@@ -30,7 +30,7 @@ void Fill(benchmark::State& state, bool ordered, int64_t stride) {
     for (auto round : state) {
         ResTreeNode node(u"n", u"N", ordered);
         for (const std::u16string& key : keys) {
-            benchmark::DoNotOptimize(node.AddTextEntry(String(key), String(u"value"), zkhw::TextEntry).entry);
+            benchmark::DoNotOptimize(node.AddTextEntry(key, u"value", zkhw::TextEntry).entry);
         }
     }
     state.SetItemsProcessed(state.iterations() * state.range(0));
@@ -46,7 +46,7 @@ void FillInFront(benchmark::State& state) {
         for (size_t i = 0; i < keys.size(); ++i) {
             const String before(keys[i == 0 ? 0 : i - 1]);
             benchmark::DoNotOptimize(
-                node.AddTextEntry(String(keys[i]), String(u"value"), zkhw::TextEntry, &before).entry);
+                node.AddTextEntry(keys[i], u"value", zkhw::TextEntry, &before).entry);
         }
     }
     state.SetItemsProcessed(state.iterations() * state.range(0));

@@ -23,7 +23,7 @@ void FindEntry(benchmark::State& state, bool ordered) {
     std::vector<std::u16string> keys;
     for (int64_t i = 0; i < size; ++i) {
         keys.push_back(Key(i * 7919 % size));
-        node.AddTextEntry(String(Key(i)), String(u"value"), zkhw::TextEntry);
+        node.AddTextEntry(Key(i), u"value", zkhw::TextEntry);
     }
     // The first search of a long ordered node builds its index.
     benchmark::DoNotOptimize(node.Find(keys[0]));

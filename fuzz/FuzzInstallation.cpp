@@ -96,7 +96,7 @@ bool Survives(const NodeEntry& entry) {
     if (!entry.IsText()) {
         return false;
     }
-    const std::u16string_view text = entry.Text()->View();
+    const std::u16string_view text = *entry.Text();
     const bool isPath = zkhw::EndsWith(entry.Key(), u"Path");
     if (entry.Kind() != zkhw::LocalizedTextEntry && text.find(u'\0') != std::u16string_view::npos) {
         return false;
@@ -110,7 +110,7 @@ bool Survives(const NodeEntry& entry) {
 
 bool KeepsSurvivingValues(const ResTreeNode& node) {
     for (auto entry = node.Begin(); entry != node.End(); ++entry) {
-        if (IsKept(entry.Key().View()) && !Survives(*entry)) {
+        if (IsKept(entry.Key()) && !Survives(*entry)) {
             return false;
         }
     }
@@ -128,7 +128,7 @@ size_t CountSources(ResTreeNode& root) {
             const NodeEntry* source = child->IsA(u"Target") ? nullptr : child->FindRaw(u"FPGA_XMLSource");
             std::vector<String> files;
             if (source != nullptr && source->IsText()) {
-                zkhw::SplitList(source->Text()->View(), u',', files, true);
+                zkhw::SplitList(*source->Text(), u',', files, true);
             }
             sources += files.empty() ? 1 : files.size();
         }
@@ -145,7 +145,7 @@ bool IsHostSet(const ResTreeNode& node) {
 void SameEntries(ResTreeNode& scanned, ResTreeNode& grown, bool isTop);
 
 void SameEntry(const NodeEntry& scanned, const NodeEntry& grown) {
-    Require(scanned.Key().View() == grown.Key().View(), "the same keys in order");
+    Require(scanned.Key() == grown.Key(), "the same keys in order");
     Require(scanned.Kind() == grown.Kind(), "each of the same kind");
     if (ResTreeNode* child = scanned.Child()) {
         Require(child->GetName().View() == grown.Child()->GetName().View(), "a child has its name");
@@ -153,16 +153,16 @@ void SameEntry(const NodeEntry& scanned, const NodeEntry& grown) {
         Require(child->IsOrdered() == grown.Child()->IsOrdered(), "a child has its form");
         SameEntries(*child, *grown.Child(), false);
     } else if (scanned.IsText()) {
-        Require(scanned.Text()->View() == grown.Text()->View(), "a text has its value");
+        Require(scanned.Text() == grown.Text(), "a text has its value");
     } else {
-        Require(scanned.LinkPath()->View() == grown.LinkPath()->View(), "a link has its path");
+        Require(scanned.LinkPath() == grown.LinkPath(), "a link has its path");
     }
 }
 
 // At the top what the cache keeps, and everywhere reports, which tell from where they were read, are left out.
 void SameEntries(ResTreeNode& scanned, ResTreeNode& grown, bool isTop) {
     const auto next = [isTop](ResTreeNode& node, zkhw::EntryIterator& entry) {
-        while (entry != node.End() && ((isTop && IsKept(entry.Key().View())) || entry.Key() == u"XMLParseErrors")) {
+        while (entry != node.End() && ((isTop && IsKept(entry.Key())) || Equal(entry.Key(), u"XMLParseErrors"))) {
             ++entry;
         }
         return entry != node.End();
@@ -180,12 +180,12 @@ void SameEntries(ResTreeNode& scanned, ResTreeNode& grown, bool isTop) {
 
 void SameKept(const ResTreeNode& scanned, ResTreeNode& stub, bool mayLoad) {
     for (auto entry = scanned.Begin(); entry != scanned.End(); ++entry) {
-        const bool isKept = scanned.IsA(u"Target") ? IsKept(entry.Key().View())
-                                                   : entry.Key() == u"Protocols" || entry.Key() == u"FPGA_XMLSource";
+        const bool isKept = scanned.IsA(u"Target") ? IsKept(entry.Key())
+                                                   : Equal(entry.Key(), u"Protocols") || Equal(entry.Key(), u"FPGA_XMLSource");
         if (isKept) {
-            const NodeEntry* kept = scanned.FindRaw(entry.Key().View());
-            const NodeEntry* found = mayLoad ? stub.Find(entry.Key().View()) : stub.FindRaw(entry.Key().View());
-            Require(found != nullptr && found->IsText() && found->Text()->View() == kept->Text()->View(),
+            const NodeEntry* kept = scanned.FindRaw(entry.Key());
+            const NodeEntry* found = mayLoad ? stub.Find(entry.Key()) : stub.FindRaw(entry.Key());
+            Require(found != nullptr && found->IsText() && found->Text() == kept->Text(),
                     "a stub has what the cache keeps");
         }
     }

@@ -86,8 +86,8 @@ void Same(ResTreeNode& node, const Model& model) {
     size_t at = 0;
     for (auto entry = node.Begin(); entry != node.End(); ++entry, ++at) {
         fuzz::Require(at < model.items.size(), "no entry too many");
-        fuzz::Require(entry.Key().View() == model.items[at].first, "the keys stand in their order");
-        fuzz::Require(entry->Text()->View() == model.items[at].second, "each has its value");
+        fuzz::Require(entry.Key() == model.items[at].first, "the keys stand in their order");
+        fuzz::Require(entry->Text() == model.items[at].second, "each has its value");
     }
     fuzz::Require(at == model.items.size(), "no entry too few");
 }
@@ -106,13 +106,13 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
         const std::u16string other = ShortKey(input.TakeByte());
         switch (operation % 7) {
             case 0: {
-                const bool isNew = node.AddTextEntry(String(key), String(other), zkhw::TextEntry).isNew;
+                const bool isNew = node.AddTextEntry(key, other, zkhw::TextEntry).isNew;
                 fuzz::Require(isNew == model.Add(key, other, nullptr), "an entry is new to both");
                 break;
             }
             case 1: {
                 const String before(other);
-                const bool isNew = node.AddTextEntry(String(key), String(u"v"), zkhw::TextEntry, &before).isNew;
+                const bool isNew = node.AddTextEntry(key, u"v", zkhw::TextEntry, &before).isNew;
                 fuzz::Require(isNew == model.Add(key, u"v", &other), "an entry is new to both");
                 break;
             }
@@ -134,14 +134,14 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
                 // Many at once, so that the larger layouts are reached.
                 for (uint8_t i = 0; i < operation; ++i) {
                     const std::u16string many = ShortKey(static_cast<uint8_t>(i * 7 + key.back()));
-                    node.AddTextEntry(String(many), String(many), zkhw::TextEntry);
+                    node.AddTextEntry(many, many, zkhw::TextEntry);
                     model.Add(many, many, nullptr);
                 }
                 break;
             default: {
-                const String* value = node.GetProperty(key);
-                fuzz::Require((value != nullptr) == model.Has(key), "what one finds, the other finds");
-                fuzz::Require(value == nullptr || value->View() == model.items[model.Find(key)].second,
+                const auto value = node.GetProperty(key);
+                fuzz::Require(value.has_value() == model.Has(key), "what one finds, the other finds");
+                fuzz::Require(!value || *value == model.items[model.Find(key)].second,
                               "the first of a key is found");
             }
         }

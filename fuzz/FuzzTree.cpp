@@ -74,9 +74,9 @@ void AddEntry(Session& session, fuzz::model::Node& node, fuzz::Input& input, zkh
         if (++session.links > mostLinks) {
             return;
         }
-        isNew = real.AddLinkEntry(zkhw::String(key), zkhw::String(text), realPosition).isNew;
+        isNew = real.AddLinkEntry(key, text, realPosition).isNew;
     } else {
-        isNew = real.AddTextEntry(zkhw::String(key), zkhw::String(text), kind, realPosition).isNew;
+        isNew = real.AddTextEntry(key, text, kind, realPosition).isNew;
     }
     const bool isNewInModel = session.model.Add(node, key, kind, text, ordered, position) != nullptr;
     Require(session.isWild || isNew == isNewInModel, "an entry is new to both");

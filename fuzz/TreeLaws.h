@@ -20,19 +20,19 @@ inline void CheckTree(zkhw::ResTreeNode& root) {
         open.pop_back();
         const zkhw::NodeEntry* previous = nullptr;
         for (auto entry = node.Begin(); entry != node.End(); ++entry) {
-            Require(node.IsOrdered() || previous == nullptr || Compare(previous->Key().View(), entry.Key().View()) < 0,
+            Require(node.IsOrdered() || previous == nullptr || Compare(previous->Key(), entry.Key()) < 0,
                     "an unordered node has its keys in order, each once");
             previous = &*entry;
-            const zkhw::NodeEntry* found = node.FindRaw(entry.Key().View());
+            const zkhw::NodeEntry* found = node.FindRaw(entry.Key());
             Require(found != nullptr, "every entry's key is found");
-            Require(node.IsOrdered() ? Compare(found->Key().View(), entry.Key().View()) == 0 : found == &*entry,
+            Require(node.IsOrdered() ? Compare(found->Key(), entry.Key()) == 0 : found == &*entry,
                     "the key of an unordered node finds its entry");
             Require(node.PositionOf(&*entry) == entry, "an entry stands where it is found");
             if (entry->Kind() == zkhw::ChildEntry) {
                 Require(entry->Child() != nullptr && entry->Child()->GetParent() == &node, "a child knows its parent");
                 open.push_back(entry->Child());
             } else {
-                Require(entry->Text() != nullptr || entry->LinkPath() != nullptr, "what is no child has a text");
+                Require(entry->Text() || entry->LinkPath(), "what is no child has a text");
             }
         }
     }
@@ -49,8 +49,9 @@ inline void CheckPaths(zkhw::ResTreeNode& root, size_t limit) {
         for (auto entry = node.Begin(); !node.IsOrdered() && entry != node.End(); ++entry) {
             zkhw::ResTreeNode* child = entry->Child();
             // An empty name and the names of the navigation are not found as components.
-            if (child != nullptr && child->GetName().View() == entry.Key().View() && entry.Key() != u"" &&
-                entry.Key() != u"." && entry.Key() != u"..") {
+            const auto isNamed = [&](std::u16string_view name) { return qn::dsc::osdep::Equal(entry.Key(), name); };
+            if (child != nullptr && child->GetName().View() == entry.Key() && !isNamed(u"") && !isNamed(u".") &&
+                !isNamed(u"..")) {
                 open.push_back(child);
             }
         }

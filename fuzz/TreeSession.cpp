@@ -75,13 +75,13 @@ void SameNode(model::Node& node, ResTreeNode& real) {
     auto entry = real.Begin();
     for (const auto& expected : node.entries) {
         Require(entry != real.End(), "no entry too few");
-        Require(entry.Key().View() == expected->key && entry->Kind() == expected->kind, "the same entries in order");
+        Require(entry.Key() == expected->key && entry->Kind() == expected->kind, "the same entries in order");
         if (expected->child) {
             Require(entry->Child()->GetParent() == &real, "a child knows its parent");
             SameNode(*expected->child, *entry->Child());
         } else {
-            const zkhw::String* text = entry->IsText() ? entry->Text() : entry->LinkPath();
-            Require(text->View() == expected->text, "each has its value");
+            const auto text = entry->IsText() ? entry->Text() : entry->LinkPath();
+            Require(text && *text == expected->text, "each has its value");
         }
         ++entry;
     }

@@ -120,7 +120,7 @@ void Fill(ResTreeNode& n) {
     AddText(n, u"Protocols", u"P,Q");
     AddText(n, u"SupportedValues", u"a,b");
     AddText(n, u"Reserves", u"../Partner");
-    n.AddTextEntry(zkhw::String(u"Loc"), zkhw::String(std::u16string_view(u"x\0eng=x", 7)), zkhw::LocalizedTextEntry);
+    n.AddTextEntry(u"Loc", std::u16string_view(u"x\0eng=x", 7), zkhw::LocalizedTextEntry);
     AddText(*AddChild(n, u"with/slash"), u"P", u"1");
     AddLink(n, u"Partner", u"../Partner");
 }
@@ -135,7 +135,7 @@ World::World(const ContentsFile* file)
     if (file == nullptr) {
         Fill(n);
     } else {
-        n.AddTextEntry(zkhw::String(u":DeferredLoadPath"), file->Path(), zkhw::TextEntry);
+        n.AddTextEntry(u":DeferredLoadPath", file->Path().View(), zkhw::TextEntry);
         // That would look for "Reserves".
         everything &= ~ULONG{ZkhwReservationChanged};
     }

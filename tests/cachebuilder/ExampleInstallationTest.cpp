@@ -40,8 +40,11 @@ using qn::dsc::osdep::TemporaryFolder;
 constexpr const char16_t* toolBelowRoot = u"Targets\\QN\\FPGA\\Utilities\\zkfpga_make_resource_cache";
 constexpr const char16_t* workingBelowRoot = u"Targets\\QN\\FPGA";
 
+std::string Utf8(std::u16string_view text) {
+    return std::string(NarrowString(String(text)).View());
+}
 std::string Utf8(const String& text) {
-    return std::string(NarrowString(text).View());
+    return Utf8(text.View());
 }
 
 std::string ReadBytes(const char* path) {
@@ -78,8 +81,8 @@ std::string Text(ResTreeNode& root, const char* path, const char* key) {
     if (node == nullptr) {
         return std::string("no node ") + path;
     }
-    const String* text = node->GetProperty(String(key).View());
-    return text != nullptr ? Utf8(*text) : "none";
+    const auto text = node->GetProperty(String(key).View());
+    return text ? Utf8(*text) : "none";
 }
 
 // What `visit` says of each node, where it says anything, with the node's path.
@@ -116,8 +119,8 @@ TEST(ExampleInstallation, IsReadWithoutAReport) {
 TEST(ExampleInstallation, HasNoUnresolvedLink) {
     EXPECT_EQ(Findings(Example(),
                        [](ResTreeNode&, NodeEntry& entry) {
-                           const String* text = entry.Text();
-                           return text != nullptr && text->View().find(u"UNRESOLVED LINK") == 0 ? Utf8(*text) : "";
+                           const auto text = entry.Text();
+                           return text && text->find(u"UNRESOLVED LINK") == 0 ? Utf8(*text) : "";
                        }),
               nothing);
 }
@@ -163,8 +166,8 @@ TEST(ExampleInstallation, LeavesNoParameterOpenOnABoard) {
         if (entry->Child()->IsA(u"Target")) {
             EXPECT_EQ(Findings(*entry->Child(),
                                [](ResTreeNode&, NodeEntry& inner) {
-                                   const String* text = inner.Text();
-                                   return text != nullptr && text->View().find(u"#{") != std::u16string_view::npos
+                                   const auto text = inner.Text();
+                                   return text && text->find(u"#{") != std::u16string_view::npos
                                               ? Utf8(*text)
                                               : "";
                                }),
@@ -215,7 +218,7 @@ TEST(ExampleInstallation, HasTheFamilyPartAndLinesOfEachBoard) {
             ResTreeNode& node = *module->Child();
             for (EntryIterator line = node.Begin(); line != node.End(); ++line) {
                 ResTreeNode* lineNode = node.ResolveEntry(line);
-                lines += lineNode != nullptr && lineNode->GetProperty(u"Pin") != nullptr ? 1U : 0U;
+                lines += lineNode != nullptr && lineNode->GetProperty(u"Pin") ? 1U : 0U;
             }
         }
         EXPECT_EQ(lines, facts.lines) << path;
@@ -387,11 +390,11 @@ TEST(ExampleInstallation, GivesTheSameLinesToTheThreeBoardsThatShareThem) {
 }
 
 TEST(ExampleInstallation, FillsTheDefaultsWithTheBoard) {
-    const String* text =
+    const auto text =
         Example().Lookup(u"/ML605", nullptr)->GetProperty(u"LocalizedInformationToDisplayWhenAddingNewTarget");
-    ASSERT_NE(text, nullptr);
+    ASSERT_TRUE(text);
     // Without a host the language is English; the whole list stands behind the NUL.
-    EXPECT_EQ(Utf8(String(text->View().data())),
+    EXPECT_EQ(Utf8(text->substr(0, text->find(u'\0'))),
               "Connect the QN Probe to the JTAG port of the ML605, then switch the board on.");
     EXPECT_EQ(Text(Example(), "/ML605/Support", "Contact"), "boards@qn.example");
     EXPECT_EQ(Text(Example(), "/XUPV5/Support", "Contact"), "university@qn.example");

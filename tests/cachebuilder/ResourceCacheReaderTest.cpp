@@ -125,7 +125,7 @@ TEST_F(ResourceCacheReader, MissingPropertyIsEmptyAfterwardsNotMissing) {
     ASSERT_EQ(Read(), 0);
     NodeEntry* ids = Child(u"Y").FindRaw(u"DeviceIDs");
     ASSERT_NE(ids, nullptr);
-    ASSERT_NE(ids->Text(), nullptr);
+    ASSERT_TRUE(ids->IsText());
     EXPECT_EQ(ExactText(*ids->Text()), "");
 }
 
@@ -138,7 +138,7 @@ TEST_F(ResourceCacheReader, FirstMissLoadsTheFileOfTheTarget) {
     EXPECT_EQ(Child(u"X").FindRaw(u":DeferredLoadPath"), nullptr);
     ASSERT_NE(root->Lookup(u"X/Sub", nullptr), nullptr);
     EXPECT_EQ(ExactText(root->Lookup(u"X/Sub", nullptr)->GetPropertyOrEmpty(u"K")), "v");
-    EXPECT_EQ(Child(u"X").GetProperty(u"Nothing"), nullptr);
+    EXPECT_FALSE(Child(u"X").GetProperty(u"Nothing"));
     EXPECT_EQ(OpenedSince(before), 1u);
 }
 
@@ -179,7 +179,7 @@ TEST_F(ResourceCacheReader, FileThatIsGoneLeavesTheStubAsItWas) {
     BuildCache();
     ASSERT_EQ(Read(), 0);
     installation.Root().Remove(Installation::Below("x/x_resource.xml"));
-    EXPECT_EQ(Child(u"X").GetProperty(u"Speed"), nullptr);
+    EXPECT_FALSE(Child(u"X").GetProperty(u"Speed"));
     EXPECT_EQ(ExactText(Child(u"X").GetPropertyOrEmpty(u"DeviceIDs")), "7");
     EXPECT_EQ(Child(u"X").FindRaw(u":DeferredLoadPath"), nullptr);
     EXPECT_EQ(Child(u"X").FindRaw(u"XMLParseErrors"), nullptr);

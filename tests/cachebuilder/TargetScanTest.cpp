@@ -28,8 +28,8 @@ class TargetScan : public testing::Test {
 
     // "nothing" if there is no such text.
     std::string Text(const char16_t* child, const char16_t* key) {
-        const String* text = Child(child).GetProperty(key);
-        return text == nullptr ? "nothing" : ExactText(*text);
+        const auto text = Child(child).GetProperty(key);
+        return text ? ExactText(*text) : "nothing";
     }
 
     std::string Dump(const char16_t* child) { return DumpTree(Child(child)); }
@@ -212,7 +212,7 @@ TEST_F(TargetScan, BrokenFileIsReportedAndTheScanGoesOn) {
     installation.Write("a_resource.xml", "<Some><K>v</K>");
     installation.Write("b_resource.xml", "<Target name=\"B\"><K>v</K></Target>");
     Scan();
-    EXPECT_NE(root->GetPropertyOrEmpty(u"XMLParseErrors").Find(u"a_resource.xml"), String::npos);
+    EXPECT_NE(root->GetPropertyOrEmpty(u"XMLParseErrors").find(u"a_resource.xml"), std::u16string_view::npos);
     EXPECT_EQ(Text(u"B", u"TargetClass"), "COM.QN.FPGA.B");
     // What was read before the fault stays, without a note of its file.
     EXPECT_EQ(Text(u"Some", u"FPGA_XMLSource"), "nothing");

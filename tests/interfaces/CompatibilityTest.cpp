@@ -171,7 +171,7 @@ TEST_F(Compatibility, ACircleOfLinksEnds) {
 }
 
 TEST_F(Compatibility, LocalisedPropertiesAreComparedByTheirText) {
-    a->AddTextEntry(String(u"L"), String(std::u16string_view(u"x\0eng=x", 7)), LocalizedTextEntry);
+    a->AddTextEntry(u"L", std::u16string_view(u"x\0eng=x", 7), LocalizedTextEntry);
     AddText(*b, u"L", u"x");
     EXPECT_EQ(CompareBoth(), 1);
     b->SetProperty(u"L", u"y");

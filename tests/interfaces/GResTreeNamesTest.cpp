@@ -225,7 +225,7 @@ TEST_F(GResTreeNamesTest, WithDisplayNamesTheResourceIsTheBareNameAndTheDisplayN
 }
 
 TEST_F(GResTreeNamesTest, ALocalisedDisplayNameEndsThePathAtItsText) {
-    a->AddTextEntry(String(u"DisplayName"), String(std::u16string_view(u"One\0jpn;Eins", 12)), LocalizedTextEntry);
+    a->AddTextEntry(u"DisplayName", std::u16string_view(u"One\0jpn;Eins", 12), LocalizedTextEntry);
     EXPECT_EQ(Names(u"", u"includeDisplayNames=true"), Cluster("a", "", "/One"));
     // What stands behind the NUL hides what would follow.
     EXPECT_EQ(Names(u"/a", u"includeDisplayNames=true"), Cluster("b", "", "/One") + Cluster("c", "", "/One"));

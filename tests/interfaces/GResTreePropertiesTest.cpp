@@ -151,7 +151,7 @@ TEST_F(GResTreePropertiesTest, TheKeysOfAliasesMeanNothing) {
 
 TEST_F(GResTreePropertiesTest, LocalisedPropertiesStandInTheirPlaceWithTheirText) {
     OwnedTree ordered(true);
-    ordered.Root().AddTextEntry(String(u"l"), String(std::u16string_view(u"One\0jpn;Eins", 12)), LocalizedTextEntry);
+    ordered.Root().AddTextEntry(u"l", std::u16string_view(u"One\0jpn;Eins", 12), LocalizedTextEntry);
     AddChild(ordered.Root(), u"child");
     AddText(ordered.Root(), u"p", u"1");
     AddText(ordered.Root(), u"p", u"2");

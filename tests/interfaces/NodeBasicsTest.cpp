@@ -60,7 +60,7 @@ TEST_F(NodeBasics, GetDisplayPathTakesDisplayNamesAndLeavesOutEmptyOnes) {
 
 TEST_F(NodeBasics, GetDisplayPathOfALocalisedNameEndsAtItsNul) {
     ResTreeNode* const a = AddChild(*root, u"a");
-    a->AddTextEntry(String(u"DisplayName"), String(std::u16string_view(u"Shown\0eng=Shown", 15)), LocalizedTextEntry);
+    a->AddTextEntry(u"DisplayName", std::u16string_view(u"Shown\0eng=Shown", 15), LocalizedTextEntry);
     EXPECT_EQ(DisplayPathOf(View(*a)), "S_OK /Shown");
 }
 

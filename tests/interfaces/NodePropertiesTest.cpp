@@ -10,7 +10,7 @@ namespace {
 class NodeProperties : public NodeViewTest {
   protected:
     NodeProperties() {
-        root->AddTextEntry(String(u"Label"), String(std::u16string_view(u"Clock\0eng=Clock", 15)), LocalizedTextEntry);
+        root->AddTextEntry(u"Label", std::u16string_view(u"Clock\0eng=Clock", 15), LocalizedTextEntry);
         AddChild(*root, u"Child");
         AddText(*root, u"Speed", u"40");
         AddLink(*root, u"Link", u"Child");

@@ -44,13 +44,13 @@ TEST_F(NodeXml, GetXmlWritesTheNodeWithoutAnIndent) {
 TEST_F(NodeXml, GetXmlEndsAtANulInsideTheText) {
     ResTreeNode* const a = AddChild(*root, u"A");
     // A localised text that ends in its NUL is written whole.
-    a->AddTextEntry(String(u"L"), String(std::u16string_view(u"x\0", 2)), LocalizedTextEntry);
+    a->AddTextEntry(u"L", std::u16string_view(u"x\0", 2), LocalizedTextEntry);
     EXPECT_EQ(Xml(View(*a)), "S_OK \n<T name=\"A\">\n   <L localize=\"true\">x");
 }
 
 TEST_F(NodeXml, GetXmlOfALocalisedTextWritesItsLanguages) {
     ResTreeNode* const a = AddChild(*root, u"A");
-    a->AddTextEntry(String(u"L"), String(std::u16string_view(u"x\0eng=x,jpn=y", 13)), LocalizedTextEntry);
+    a->AddTextEntry(u"L", std::u16string_view(u"x\0eng=x,jpn=y", 13), LocalizedTextEntry);
     EXPECT_EQ(Xml(View(*a)), "S_OK \n<T name=\"A\">\n   <L localize=\"true\">eng=x,jpn=y</L>\n</T>");
 }
 

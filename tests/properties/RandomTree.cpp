@@ -118,7 +118,7 @@ class Maker {
             entryKind = LocalizedTextEntry;
             value = random.OneIn(2) ? std::u16string(u"one\0eng=one,jpn=x"sv) + value : value;
         }
-        node.AddTextEntry(String(key), String(value), entryKind);
+        node.AddTextEntry(key, value, entryKind);
     }
 
     // At the end of an ordered node, so that all that stands ahead can be found there.
@@ -134,7 +134,7 @@ class Maker {
                                node.Lookup(path.View(), nullptr) != &target || node.FindRaw(key.View()) != nullptr)) {
             return;
         }
-        node.AddLinkEntry(String(key), String(path));
+        node.AddLinkEntry(key.View(), path.View());
     }
 
     // Whether the reader has begun `target` when it comes to the link. In an unordered node that may stand ahead of

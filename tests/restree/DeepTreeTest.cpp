@@ -363,7 +363,7 @@ TEST(WideTree, ManyOrderedChildrenAreReplacedInFrontOfEachOther) {
     }
     int index = 0;
     for (EntryIterator entry = root->Begin(); !entry.IsEnd(); ++entry, ++index) {
-        ASSERT_EQ(entry.Key().View(), NumberedKey(index));
+        ASSERT_EQ(entry.Key(), NumberedKey(index));
         ASSERT_EQ(qn::dsc::ExactText(entry->Child()->GetType()), "U");
     }
     EXPECT_EQ(index, 20'000);

@@ -50,8 +50,8 @@ TEST_F(DeferredLoad, ReadsTheFilesOnce) {
     Write("board.xml", "<B><V>1</V></B>");
     ResTreeNode& stub = Stub();
     Defer(stub, u"board.xml");
-    EXPECT_EQ(stub.GetProperty(u"missing"), nullptr);
-    EXPECT_EQ(stub.GetProperty(u"missing"), nullptr);
+    EXPECT_FALSE(stub.GetProperty(u"missing"));
+    EXPECT_FALSE(stub.GetProperty(u"missing"));
     EXPECT_TRUE(stub.EnsureDeferredLoaded());
     EXPECT_EQ(OpenedFiles(), 1u);
     EXPECT_EQ(stub.FindRaw(u":DeferredLoadPath"), nullptr);
@@ -90,7 +90,7 @@ TEST_F(DeferredLoad, FailureEndsTheWalk) {
 TEST_F(DeferredLoad, MissingFileLeavesTheStubWithoutAReport) {
     ResTreeNode& stub = Stub();
     Defer(stub, u"missing.xml");
-    EXPECT_EQ(stub.GetProperty(u"V"), nullptr);
+    EXPECT_FALSE(stub.GetProperty(u"V"));
     EXPECT_EQ(DumpTree(stub), "s:S\n  U=0\n");
 }
 
@@ -183,7 +183,7 @@ TEST_F(DeferredLoad, EntryMayGetItsKeyByARename) {
     Write("board.xml", "<B><V>1</V></B>");
     ResTreeNode& stub = Stub();
     stub.SetProperty(u"later", u"board.xml");
-    EXPECT_EQ(stub.GetProperty(u"V"), nullptr);
+    EXPECT_FALSE(stub.GetProperty(u"V"));
     EXPECT_TRUE(stub.RenameEntry(u"later", u":DeferredLoadPath"));
     EXPECT_EQ(TextAt(stub, u"V"), "1");
 }
@@ -192,7 +192,7 @@ TEST_F(DeferredLoad, EntryOfAnOrderedNodeMayGetItsKeyByARename) {
     Write("board.xml", "<B><V>1</V></B>");
     Load(*root, "<R><L name='l' ordered='true'><later>board.xml</later></L></R>");
     ResTreeNode& list = At(*root, u"l");
-    EXPECT_EQ(list.GetProperty(u"V"), nullptr);
+    EXPECT_FALSE(list.GetProperty(u"V"));
     EXPECT_TRUE(list.RenameEntry(u"later", u":DeferredLoadPath"));
     EXPECT_EQ(TextAt(list, u"V"), "1");
 }

@@ -155,8 +155,11 @@ const PageReader& Page() {
     return reader;
 }
 
+std::string Utf8(std::u16string_view text) {
+    return std::string(NarrowString(String(text)).View());
+}
 std::string Utf8(const String& text) {
-    return std::string(NarrowString(text).View());
+    return Utf8(text.View());
 }
 
 std::string WithDocumentedRoot(std::string text, const std::string& root) {
@@ -173,7 +176,7 @@ std::string TakeReports(ResTreeNode& top) {
     while (!waiting.empty()) {
         ResTreeNode& node = *waiting.back();
         waiting.pop_back();
-        if (const String* report = node.GetProperty(u"XMLParseErrors")) {
+        if (const auto report = node.GetProperty(u"XMLParseErrors")) {
             reports += Utf8(*report);
             node.RemoveEntryByName(u"XMLParseErrors");
         }

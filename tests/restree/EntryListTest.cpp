@@ -16,13 +16,13 @@ namespace {
 
 // A text whose value is a number by which the tests know the entry.
 NodeEntry* MakeNumbered(std::u16string_view key, uint32_t number) {
-    return NodeEntry::MakeText(String(key), TextEntry,
-                               String(number % 1000 + 1, static_cast<char16_t>(number / 1000 + 1)));
+    return NodeEntry::MakeText(key, TextEntry,
+                               std::u16string(number % 1000 + 1, static_cast<char16_t>(number / 1000 + 1)));
 }
 
 uint32_t NumberOf(const NodeEntry& entry) {
-    const String& text = *entry.Text();
-    return (static_cast<uint32_t>(text.At(0)) - 1) * 1000 + text.Length() - 1;
+    const std::u16string_view text = *entry.Text();
+    return (uint32_t{text[0]} - 1) * 1000 + static_cast<uint32_t>(text.size()) - 1;
 }
 
 std::u16string KeyOf(uint32_t number) {
@@ -246,7 +246,9 @@ TEST(EntryList, KeyThatIsAssignedIsFoundAndTheOldOneIsNot) {
             list.Insert(EntryList::End(), MakeNumbered(KeyOf(i), i));
         }
         ASSERT_NE(list.Find(u"k3"), nullptr);
-        list.AssignKey(list.At(list.AtIndex(3)), String(u"K4"));
+        NodeEntry* renamed = list.At(list.AtIndex(3));
+        renamed->OwnKey();
+        list.AssignKey(renamed, String(u"K4"));
         EXPECT_EQ(list.Find(u"k3"), nullptr);
         // In front of the other "k4".
         EXPECT_EQ(NumberOf(*list.Find(u"k4")), 3u);
@@ -417,7 +419,9 @@ class OrderedModel {
     void Assign() {
         const std::u16string key = RandomKey(random, variety, spelling, hasWideKeys);
         const size_t index = random.Below(static_cast<uint32_t>(items.size()));
-        list.AssignKey(list.At(list.AtIndex(static_cast<uint32_t>(index))), String(std::u16string_view(key)));
+        NodeEntry* renamed = list.At(list.AtIndex(static_cast<uint32_t>(index)));
+        renamed->OwnKey();
+        list.AssignKey(renamed, String(std::u16string_view(key)));
         items[index].key = Folded(key);
     }
 
@@ -633,7 +637,7 @@ TEST(EntryList, PiecesThatGoFromALongOrderedListLeaveTheOthersFindable) {
     }
     for (EntryPosition position = list.Begin(); !position.IsEnd(); position = list.Next(position)) {
         ASSERT_EQ(list.Locate(list.At(position)), position);
-        ASSERT_EQ(list.Find(list.At(position)->Key().View()), list.At(position));
+        ASSERT_EQ(list.Find(list.At(position)->Key()), list.At(position));
     }
 }
 
@@ -752,6 +756,7 @@ uint64_t AllocationsOfRenaming(uint32_t count) {
     const support::AllocationCounter counter;
     for (uint32_t i = 0; i < count; ++i) {
         NodeEntry* entry = list.Find(KeyOf(i));
+        entry->OwnKey();
         list.AssignKey(entry, String(std::u16string_view(KeyOf(i).replace(0, 1, u"n"))));
         EXPECT_EQ(list.Find(KeyOf(i)), nullptr);
     }

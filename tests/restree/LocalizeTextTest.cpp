@@ -18,7 +18,7 @@ struct Choice {
 void ExpectChoices(const std::vector<Choice>& choices) {
     for (const Choice& choice : choices) {
         const String list(choice.list);
-        EXPECT_EQ(ExactText(LocalizeText(list)), choice.chosen + std::string("{0000}") + ExactText(list));
+        EXPECT_EQ(ExactText(LocalizeText(list.View())), choice.chosen + std::string("{0000}") + ExactText(list));
     }
 }
 
@@ -61,7 +61,7 @@ TEST(LocalizeText, GivesTheListAloneIfNoTextFits) {
 
 TEST(LocalizeText, KeepsANulInsideTheList) {
     const String list(u"eng=a\0b,jpn=X", 13);
-    EXPECT_EQ(ExactText(LocalizeText(list)), "a{0000}b{0000}eng=a{0000}b,jpn=X");
+    EXPECT_EQ(ExactText(LocalizeText(list.View())), "a{0000}b{0000}eng=a{0000}b,jpn=X");
 }
 
 }  // namespace

@@ -19,8 +19,8 @@ std::u16string Joined(TextArgument parentPath, TextArgument name) {
 }
 
 std::u16string Displayed(TextArgument parentPath, TextArgument name, const char16_t* displayName) {
-    const String display(displayName);
-    return Units(zkhw::JoinDisplayPath(parentPath, name, displayName == nullptr ? nullptr : &display));
+    const auto shown = displayName == nullptr ? std::nullopt : std::optional<std::u16string_view>(displayName);
+    return Units(zkhw::JoinDisplayPath(parentPath, name, shown));
 }
 
 std::u16string Relative(TextArgument target, TextArgument base) {

@@ -17,13 +17,19 @@ namespace {
 
 using qn::dsc::ExactText;
 
+std::string Expanded(const char16_t* text, const Parameters& parameters) {
+    TextBuilder result;
+    ExpandVariables(text, parameters, result);
+    return ExactText(result.View());
+}
+
 std::string Expanded(const char16_t* text) {
     ParameterMap values;
     values.emplace(u"A", u"1");
     values.emplace(u"B C", u"2");
     values.emplace(u"Empty", u"");
     values.emplace(u"Again", u"#{A}");
-    return ExactText(ExpandVariables(text, MapParameters(std::move(values))));
+    return Expanded(text, MapParameters(std::move(values)));
 }
 
 // --- One text ---
@@ -101,27 +107,27 @@ TEST(FindVariable, GivesTheFirstMark) {
 
 TEST(FindVariable, GivesNposWithoutAMark) {
     for (const char16_t* text : {u"", u"#", u"# {", u"{#}", u"0123456789#"}) {
-        EXPECT_EQ(FindVariable(text), String::npos) << ExactText(String(text));
+        EXPECT_EQ(FindVariable(text), std::u16string_view::npos) << ExactText(String(text));
     }
 }
 
 TEST(InstanceParameters, AreTheNameAndTheLoopVariable) {
     const InstanceParameters parameters(u"Bank7", u"i", -2147483647 - 1);
     EXPECT_FALSE(parameters.IsEmpty());
-    EXPECT_EQ(ExactText(ExpandVariables(u"#{name} #{NAME} #{i} #{I} #{j} #{}", parameters)),
+    EXPECT_EQ(Expanded(u"#{name} #{NAME} #{i} #{I} #{j} #{}", parameters),
               "Bank7 Bank7 -2147483648 -2147483648 #{j} #{}");
 }
 
 TEST(InstanceParameters, EmptyVariableIsNone) {
-    EXPECT_EQ(ExactText(ExpandVariables(u"#{name}#{}#{ }", InstanceParameters(u"Bank7", u"", 1))), "Bank7#{}#{}");
+    EXPECT_EQ(Expanded(u"#{name}#{}#{ }", InstanceParameters(u"Bank7", u"", 1)), "Bank7#{}#{}");
 }
 
 TEST(InstanceParameters, NameWinsOverAVariableOfThatName) {
-    EXPECT_EQ(ExactText(ExpandVariables(u"#{name}", InstanceParameters(u"x", u"Name", 1))), "x");
+    EXPECT_EQ(Expanded(u"#{name}", InstanceParameters(u"x", u"Name", 1)), "x");
 }
 
 TEST(ExpandVariables, WithoutAnyParameterTheTextStaysWithItsBlanks) {
-    EXPECT_EQ(ExactText(ExpandVariables(u"a#{ x }b", MapParameters(ParameterMap()))), "a#{ x }b");
+    EXPECT_EQ(Expanded(u"a#{ x }b", MapParameters(ParameterMap())), "a#{ x }b");
 }
 
 // --- Texts of a document ---
@@ -545,7 +551,7 @@ class ExpandedUnderObservers : public ::testing::TestWithParam<std::tuple<bool, 
   protected:
     ExpandedUnderObservers() {
         for (int i = 0; i < Count(); ++i) {
-            root->AddTextEntry(Key(i), String(u"#{K}"), TextEntry);
+            root->AddTextEntry(Key(i).View(), u"#{K}", TextEntry);
         }
         values.emplace(u"K", u"k");
     }
@@ -568,7 +574,7 @@ class ExpandedUnderObservers : public ::testing::TestWithParam<std::tuple<bool, 
     static int CountExpanded(ResTreeNode& node) {
         int count = 0;
         for (EntryIterator entry = node.Begin(); !entry.IsEnd(); ++entry) {
-            if (entry->Text() != nullptr) {
+            if (entry->IsText()) {
                 EXPECT_EQ(ExactText(*entry->Text()), "k") << ExactText(entry->Key());
                 ++count;
             }
@@ -634,7 +640,7 @@ TEST_P(ExpandedUnderObservers, EntriesMayComeInFront) {
     Once(*root, [this] {
         const String first = Key(0);
         for (int i = 0; i < 200; ++i) {
-            root->AddTextEntry(Wide("0" + std::to_string(1000 + i)), String(u"k"), TextEntry, &first);
+            root->AddTextEntry(Wide("0" + std::to_string(1000 + i)).View(), u"k", TextEntry, &first);
         }
     });
     Apply();
@@ -644,7 +650,7 @@ TEST_P(ExpandedUnderObservers, EntriesMayComeInFront) {
 TEST_P(ExpandedUnderObservers, EntriesThatComeBehindAreExpandedToo) {
     Once(*root, [this] {
         for (int i = 0; i < 200; ++i) {
-            root->AddTextEntry(Wide("z" + std::to_string(1000 + i)), String(u"#{K}"), TextEntry);
+            root->AddTextEntry(Wide("z" + std::to_string(1000 + i)).View(), u"#{K}", TextEntry);
         }
     });
     Apply();
@@ -656,7 +662,7 @@ TEST_P(ExpandedUnderObservers, ChildThatIsBeingWalkedMayGo) {
     AddChild(*root, u"zchild");
     AddText(*root->Lookup(u"zchild", nullptr), u"V", u"#{K}");
     for (int i = 0; i < Count(); ++i) {
-        child->AddTextEntry(Key(i), String(u"#{K}"), TextEntry);
+        child->AddTextEntry(Key(i).View(), u"#{K}", TextEntry);
     }
     Once(*child, [this] { root->RemoveEntryByName(u"0child"); });
     Apply();
@@ -668,7 +674,7 @@ TEST_P(ExpandedUnderObservers, ChildThatIsBeingWalkedMayGo) {
 TEST_P(ExpandedUnderObservers, NodeItselfMayGo) {
     ResTreeNode* child = AddChild(*root, u"child", u"T", std::get<0>(GetParam()));
     for (int i = 0; i < Count(); ++i) {
-        child->AddTextEntry(Key(i), String(u"#{K}"), TextEntry);
+        child->AddTextEntry(Key(i).View(), u"#{K}", TextEntry);
     }
     Once(*child, [this] { root->RemoveEntryByName(u"child"); });
     child->ApplyParameters(MapParameters(std::move(values)));

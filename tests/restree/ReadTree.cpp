@@ -44,9 +44,9 @@ ResTreeNode& At(ResTreeNode& root, const char16_t* path) {
 }
 
 std::string TextAt(ResTreeNode& node, const char16_t* key) {
-    const String* text = node.GetProperty(key);
-    EXPECT_NE(text, nullptr) << qn::dsc::ExactText(std::u16string_view(key));
-    return text == nullptr ? "(none)" : qn::dsc::ExactText(*text);
+    const auto text = node.GetProperty(key);
+    EXPECT_TRUE(text) << qn::dsc::ExactText(std::u16string_view(key));
+    return text ? qn::dsc::ExactText(*text) : "(none)";
 }
 
 ResourceFiles::ResourceFiles() : scope(files) {

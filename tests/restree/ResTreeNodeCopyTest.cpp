@@ -22,10 +22,10 @@ std::string TextOf(ResTreeNode& node, const char16_t* key) {
     if (entry == nullptr) {
         return "(none)";
     }
-    if (const String* path = entry->LinkPath()) {
+    if (const auto path = entry->LinkPath()) {
         return ExactText(*path);
     }
-    return entry->Text() == nullptr ? "(child)" : ExactText(*entry->Text());
+    return entry->Text() ? ExactText(*entry->Text()) : "(child)";
 }
 
 // Two children of a root, both ordered if `ordered`.
@@ -679,7 +679,7 @@ class CloneUnderObservers : public ::testing::TestWithParam<std::tuple<bool, int
         for (int i = 0; i < std::get<1>(GetParam()); ++i) {
             std::string key = std::to_string(1000 + i);
             key.front() = 'a';
-            root->AddTextEntry(String(key.c_str()), String(), TextEntry);
+            root->AddTextEntry(std::u16string(key.begin(), key.end()), u"", TextEntry);
         }
         AddText(*AddChild(source, u"c"), u"d", u"1");
         AddText(source, u"e", u"2");

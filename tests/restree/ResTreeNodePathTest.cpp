@@ -241,8 +241,7 @@ std::unique_ptr<ResTreeNode> MakeLinkChain(int length) {
     for (int i = 1; i <= length; ++i) {
         const std::string from = std::to_string(i);
         const std::string to = std::to_string(i - 1);
-        root->AddLinkEntry(String(std::u16string_view(std::u16string(from.begin(), from.end()))),
-                           String(std::u16string_view(std::u16string(to.begin(), to.end()))));
+        root->AddLinkEntry(std::u16string(from.begin(), from.end()), std::u16string(to.begin(), to.end()));
     }
     return root;
 }

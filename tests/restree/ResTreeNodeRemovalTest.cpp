@@ -197,7 +197,7 @@ TEST_F(RemovalNotices, TextsAndLinksOfARemovedNodeGoLastAndFromTheFirst) {
     WatchAll(*root, observer);
     observer.reaction = [this](ResTreeNode& node, uint32_t changes) {
         if ((changes & (NodeDeleting | NodeDeleted)) != 0) {
-            log.Add("  " + std::string(node.GetProperty(u"text") == nullptr ? "without" : "with") + " text");
+            log.Add("  " + std::string(node.GetProperty(u"text") ? "with" : "without") + " text");
         }
     };
     root->RemoveEntryByName(u"A");

@@ -16,7 +16,7 @@ namespace zkhw {
 // The text of "ZKHWReservation", "(none)" if there is no such entry.
 inline std::string ReservationText(const ResTreeNode& node) {
     const NodeEntry* entry = node.FindRaw(u"ZKHWReservation");
-    return entry == nullptr || entry->Text() == nullptr ? "(none)" : qn::dsc::ExactText(*entry->Text());
+    return entry == nullptr || !entry->IsText() ? "(none)" : qn::dsc::ExactText(*entry->Text());
 }
 
 class ReservedTree : public ::testing::Test {

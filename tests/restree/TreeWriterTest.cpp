@@ -34,11 +34,11 @@ ResTreeNode& AddChild(ResTreeNode& parent, std::u16string_view name, std::u16str
 }
 
 void AddText(ResTreeNode& node, const char16_t* key, std::u16string_view value, EntryKind kind = TextEntry) {
-    EXPECT_TRUE(node.AddTextEntry(String(key), String(value), kind).isNew);
+    EXPECT_TRUE(node.AddTextEntry(key, value, kind).isNew);
 }
 
 void AddLink(ResTreeNode& node, const char16_t* key, const char16_t* path) {
-    EXPECT_TRUE(node.AddLinkEntry(String(key), String(path)).isNew);
+    EXPECT_TRUE(node.AddLinkEntry(key, path).isNew);
 }
 
 std::string Written(ResTreeNode& node, std::u16string_view indent = u"") {

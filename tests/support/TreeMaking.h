@@ -17,17 +17,17 @@ inline constexpr const TypeTable* noTable = nullptr;
 
 inline ResTreeNode::Added AddText(ResTreeNode& node, const char16_t* key, const char16_t* value,
                                   EntryKind kind = TextEntry) {
-    return node.AddTextEntry(String(key), String(value), kind);
+    return node.AddTextEntry(key, value, kind);
 }
 
 inline ResTreeNode::Added AddTextBefore(ResTreeNode& node, const char16_t* key, const char16_t* value,
                                         const char16_t* before) {
     const String place(before);
-    return node.AddTextEntry(String(key), String(value), TextEntry, &place);
+    return node.AddTextEntry(key, value, TextEntry, &place);
 }
 
 inline ResTreeNode::Added AddLink(ResTreeNode& node, const char16_t* key, const char16_t* path) {
-    return node.AddLinkEntry(String(key), String(path));
+    return node.AddLinkEntry(key, path);
 }
 
 // The new child, or what AddChildEntry gives in its place.
