@@ -69,7 +69,7 @@ BENCHMARK(ParseNames);
 void LocalizeText(benchmark::State& state) {
     const String list(u"eng=Line 17 of the board,jpn=\u7dda 17");
     for (auto round : state) {
-        benchmark::DoNotOptimize(zkhw::LocalizeText(list));
+        benchmark::DoNotOptimize(zkhw::LocalizeText(list.View()));
     }
 }
 BENCHMARK(LocalizeText);
