@@ -24,7 +24,7 @@ constexpr auto cachePath = u"C:\\Targets\\QN\\FPGA\\resource_cache.xml";
 void CheckStub(ResTreeNode& child) {
     if (child.IsA(u"Target")) {
         const auto name = child.GetProperty(u"TargetClassShortClassName");
-        fuzz::Require(!name || *name == child.GetName().View(), "a target's short name is its name");
+        fuzz::Require(!name || *name == child.GetName(), "a target's short name is its name");
         fuzz::Require(child.GetTypeTable() != nullptr, "a target has its own types");
     }
     child.Find(u"no such entry");

@@ -114,10 +114,10 @@ bool KeepsSurvivingValues(const ResTreeNode& node) {
             return false;
         }
     }
-    const std::u16string_view name = node.GetName().View();
+    const std::u16string_view name = node.GetName();
     const bool isClean = std::none_of(name.begin(), name.end(), [](char16_t unit) { return unit < 0x20; });
     // A name that is the type but for letter case comes back as the type.
-    return isClean && (name == node.GetType().View() || !Equal(name, node.GetType().View()));
+    return isClean && (name == node.GetType() || !Equal(name, node.GetType()));
 }
 
 // How many files have fed the children of the root, the host set counted once.
@@ -137,7 +137,7 @@ size_t CountSources(ResTreeNode& root) {
 }
 
 bool IsHostSet(const ResTreeNode& node) {
-    return !node.IsA(u"Target") && Equal(node.GetName().View(), u"FPGAHostSet");
+    return !node.IsA(u"Target") && Equal(node.GetName(), u"FPGAHostSet");
 }
 
 // --- Comparison ---
@@ -148,8 +148,8 @@ void SameEntry(const NodeEntry& scanned, const NodeEntry& grown) {
     Require(scanned.Key() == grown.Key(), "the same keys in order");
     Require(scanned.Kind() == grown.Kind(), "each of the same kind");
     if (ResTreeNode* child = scanned.Child()) {
-        Require(child->GetName().View() == grown.Child()->GetName().View(), "a child has its name");
-        Require(child->GetType().View() == grown.Child()->GetType().View(), "a child has its type");
+        Require(child->GetName() == grown.Child()->GetName(), "a child has its name");
+        Require(child->GetType() == grown.Child()->GetType(), "a child has its type");
         Require(child->IsOrdered() == grown.Child()->IsOrdered(), "a child has its form");
         SameEntries(*child, *grown.Child(), false);
     } else if (scanned.IsText()) {
@@ -200,7 +200,7 @@ void LookDeep(ResTreeNode& scanned, ResTreeNode& root) {
         const ResTreeNode* expected = open[tried]->GetParent() == nullptr ? nullptr : open[tried];
         const ResTreeNode* first = scanned.Lookup(open[tried]->GetPath().View(), nullptr);
         Require(expected == nullptr || first == nullptr || found != nullptr, "a lookup makes a stub grow");
-        Require(first == nullptr || found->GetType().View() == first->GetType().View(), "and finds a node of the type");
+        Require(first == nullptr || found->GetType() == first->GetType(), "and finds a node of the type");
         for (auto entry = open[tried]->Begin(); entry != open[tried]->End(); ++entry) {
             if (entry->Child() != nullptr) {
                 open.push_back(entry->Child());
@@ -253,8 +253,8 @@ void CheckGrowth(Installation& installation, FPGAResTree& owner, ResTreeNode& sc
     };
     bool hasChangedForm = false;
     WithEach(scanned, stubs, [&](ResTreeNode& node, ResTreeNode& stub) {
-        Require(stub.GetName().View() == node.GetName().View(), "a stub has its name");
-        Require(stub.GetType().View() == node.GetType().View(), "a stub has its type");
+        Require(stub.GetName() == node.GetName(), "a stub has its name");
+        Require(stub.GetType() == node.GetType(), "a stub has its type");
         Require(stub.IsOrdered() || !node.IsOrdered(), "an ordered node comes back ordered");
         hasChangedForm = hasChangedForm || stub.IsOrdered() != node.IsOrdered();
         if (!IsHostSet(node)) {

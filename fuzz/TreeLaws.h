@@ -50,7 +50,7 @@ inline void CheckPaths(zkhw::ResTreeNode& root, size_t limit) {
             zkhw::ResTreeNode* child = entry->Child();
             // An empty name and the names of the navigation are not found as components.
             const auto isNamed = [&](std::u16string_view name) { return qn::dsc::osdep::Equal(entry.Key(), name); };
-            if (child != nullptr && child->GetName().View() == entry.Key() && !isNamed(u"") && !isNamed(u".") &&
+            if (child != nullptr && child->GetName() == entry.Key() && !isNamed(u"") && !isNamed(u".") &&
                 !isNamed(u"..")) {
                 open.push_back(child);
             }

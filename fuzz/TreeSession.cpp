@@ -63,7 +63,7 @@ HRESULT Observer::NodeChanged(IzkhwResourceTreeNode* node, ULONG changes, ULONG 
 
 void SameNode(model::Node& node, ResTreeNode& real) {
     node.real = &real;
-    Require(real.GetName().View() == node.name && real.GetType().View() == node.type, "name and type are the same");
+    Require(real.GetName() == node.name && real.GetType() == node.type, "name and type are the same");
     Require(real.IsOrdered() == node.ordered, "both keep the order or neither");
     Require(real.HasNoPendingChanges() == (node.pending == 0), "changes wait in both or in neither");
     const std::vector<zkhw::Reservation>& held = real.GetReservations();

@@ -23,7 +23,7 @@ void ArmTarget(ResTreeNode& target, const String& executableDir) {
     target.MakeTypeTableLocal();
     const String folder = GetDirectoryName(String(target.GetPropertyOrEmpty(u"TargetXMLPath")));
     target.SetProperty(u"TargetDir", JoinPath(executableDir, folder).View());
-    target.SetProperty(u"TargetClassShortClassName", target.GetName().View());
+    target.SetProperty(u"TargetClassShortClassName", target.GetName());
     const String file(target.GetPropertyOrEmpty(u"TargetXMLPath"));
     target.SetProperty(u":DeferredLoadPath", file.View());
 }

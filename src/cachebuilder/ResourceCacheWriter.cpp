@@ -6,6 +6,7 @@
 #include "qn/dsc/WideToUtf8.h"
 #include "qn/dsc/osdep/TextStream.h"
 #include "restree/ReleaseScope.h"
+#include "qn/dsc/osdep/Compare.h"
 #include "restree/ResTreeNode.h"
 #include "restree/ResultCode.h"
 #include "restree/TreeWriter.h"
@@ -40,7 +41,7 @@ void AppendOther(ResTreeNode& node, String& text) {
 void AppendChild(ResTreeNode& child, String& text) {
     if (child.IsA(u"Target")) {
         AppendTarget(child, text);
-    } else if (child.GetName() == u"FPGAHostSet") {
+    } else if (qn::dsc::osdep::Equal(child.GetName(), u"FPGAHostSet")) {
         WriteNode(child, text, childIndent);
     } else {
         AppendOther(child, text);

@@ -5,6 +5,7 @@
 #include "cachebuilder/FPGAResTree.h"
 #include "cachebuilder/SourceLists.h"
 #include "cachebuilder/TargetDiscovery.h"
+#include "qn/dsc/osdep/Compare.h"
 #include "qn/dsc/osdep/path.h"
 #include "restree/ResTreeNode.h"
 #include "restree/ResultCode.h"
@@ -27,8 +28,8 @@ void StampTarget(ResTreeNode& target, const String& file, const String& relative
     target.MakeTypeTableLocal();
     target.SetProperty(u"TargetXMLPath", relativePath.View());
     target.SetProperty(u"TargetDir", GetDirectoryName(file).View());
-    target.SetProperty(u"TargetClassShortClassName", target.GetName().View());
-    SetIfMissing(target, u"TargetClass", u"COM.QN.FPGA." + target.GetName());
+    target.SetProperty(u"TargetClassShortClassName", target.GetName());
+    SetIfMissing(target, u"TargetClass", String::Concat({u"COM.QN.FPGA.", target.GetName()}));
     SetIfMissing(target, u"EIOItemTypeName", u"FPGA I/O");
     SetIfMissing(target, u"EIOItemIconName", JoinPath(u"fpga", u"IO.png"));
 }
@@ -56,7 +57,7 @@ int32_t FPGAResTree::ScanTargets(const String& directory, ResTreeNode& root) {
         }
         if (node->IsA(u"Target")) {
             StampTarget(*node, file, relativePath);
-        } else if (!(node->GetName() == u"FPGAHostSet")) {
+        } else if (!qn::dsc::osdep::Equal(node->GetName(), u"FPGAHostSet")) {
             sources.Add(*node, relativePath);
         }
     }

@@ -114,7 +114,7 @@ class DescendantNames {
                 DisplayPathBelow(level.crossed ? level.displayBase : level.ownDisplayPath.DisplayOf(node), child);
         }
         if (IsWanted(child)) {
-            lists.names.push_back(query.includePath ? level.newBase : child.GetName());
+            lists.names.push_back(query.includePath ? level.newBase : String(child.GetName()));
             if (query.wantsDisplayPaths) {
                 lists.displayPaths.push_back(level.newDisplayBase);
             }
@@ -125,7 +125,7 @@ class DescendantNames {
     void AppendPlainChild(Level& level, ResTreeNode& child) {
         ResTreeNode& node = *level.node;
         lists.names.push_back(query.includePath ? JoinEscapedPath(level.ownPath.Of(node), child.GetName())
-                                                : child.GetName());
+                                                : String(child.GetName()));
         if (query.wantsDisplayPaths) {
             lists.displayPaths.push_back(DisplayPathBelow(level.ownDisplayPath.DisplayOf(node), child));
         }
@@ -156,7 +156,7 @@ void CollectChildNames(ResTreeNode& node, const NameQuery& query, NameLists& lis
         if (child == nullptr || !child->Supports(query.type)) {
             continue;
         }
-        lists.names.push_back(query.includePath ? JoinEscapedPath(base, entry->Key()) : child->GetName());
+        lists.names.push_back(query.includePath ? JoinEscapedPath(base, entry->Key()) : String(child->GetName()));
         if (query.wantsDisplayPaths) {
             lists.displayPaths.push_back(DisplayPathBelow(displayBase, *child));
         }

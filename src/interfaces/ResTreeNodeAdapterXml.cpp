@@ -40,7 +40,7 @@ HRESULT ResTreeNodeAdapter::LoadContent(LPCWSTR fragment) {
     text.Append(u"<"sv);
     text.Append(m_node->GetType());
     text.Append(u" name=\""sv);
-    AppendXmlEscaped(text, m_node->GetName().View(), false);
+    AppendXmlEscaped(text, m_node->GetName(), false);
     text.Append(m_node->IsOrdered() ? u"\" ordered=\"true\">"sv : u"\" ordered=\"false\">"sv);
     text.Append(ViewOf(fragment));
     text.Append(u"</"sv);

@@ -71,10 +71,10 @@ void ElementReader::FlushPendingElement(ElementMode mode, std::string_view nextN
         }
         if (!frame.rootTypeKnown) {
             // Its name stays pending in the frame, which sees no further start tag.
-            BindDocumentElement(std::move(entryName), frame.pendingName.Text(), isOrdered);
+            BindDocumentElement(entryName, frame.pendingName.Text(), isOrdered);
             stack.PushFrame(node, nextName, nextAttributes);
         } else {
-            ResTreeNode& child = MakeChild(std::move(entryName), frame.pendingName.Text(), isOrdered);
+            ResTreeNode& child = MakeChild(entryName, frame.pendingName.Text(), isOrdered);
             stack.NoteNode(child);
             frame.pendingName.Clear();
             if (mode == ElementMode::Container) {
@@ -156,13 +156,12 @@ bool ElementReader::IsNodeOrdered(std::u16string_view elementName) const {
     return frame.pendingName.EndsInList();
 }
 
-void ElementReader::BindDocumentElement(String&& entryName, std::u16string_view elementName, bool isOrdered) {
-    if (node.type.IsEmpty()) {
-        node.TakeName(std::move(entryName));
-        node.type.Assign(elementName);
+void ElementReader::BindDocumentElement(const String& entryName, std::u16string_view elementName, bool isOrdered) {
+    if (node.GetType().empty()) {
+        node.TakeTexts(NameAndType(entryName.View(), elementName));
         node.TakeOrder(isOrdered);
     }
-    frame.rootTypeKnown = !node.type.IsEmpty();
+    frame.rootTypeKnown = !node.GetType().empty();
     stack.NoteNode(node);
 }
 
@@ -184,12 +183,11 @@ ResTreeNode* ElementReader::FindPrototype() {
     return prototype;
 }
 
-ResTreeNode& ElementReader::MakeChild(String&& entryName, std::u16string_view elementName, bool isOrdered) {
+ResTreeNode& ElementReader::MakeChild(const String& entryName, std::u16string_view elementName, bool isOrdered) {
     ResTreeNode* prototype = FindPrototype();
     ResTreeNode* child = nullptr;
-    const HashedKey hashed(entryName.View());
-    node.ReplaceChild(!frame.mergeExisting, hashed, std::move(entryName), String(elementName), isOrdered, child,
-                      Before());
+    NameAndType texts(entryName.View(), elementName);
+    node.ReplaceChild(!frame.mergeExisting, std::move(texts), HashKey(entryName.View()), isOrdered, child, Before());
     if (child == nullptr) {
         // An observer has put something else in the place that was just cleared. What follows is read all the same.
         return node;
@@ -278,7 +276,7 @@ void ElementReader::MakeLink(String&& entryName, std::u16string_view text) {
         return;
     }
     if (entryName == u":Link") {
-        entryName = target->GetName();
+        entryName.Assign(target->GetName());
     }
     const String path = MakeRelativeNodePath(target->GetPath(), node.GetPath());
     const ResTreeNode::Added added = node.AddLinkEntry(entryName.View(), path.View(), Before());

@@ -28,8 +28,8 @@ class ElementReader {
     String ChooseEntryName(ElementMode mode, bool& isNode);
     void BeginXmlValue(const String& entryName, std::string_view nextName, const char* const* nextAttributes);
     bool IsNodeOrdered(std::u16string_view elementName) const;
-    void BindDocumentElement(String&& entryName, std::u16string_view elementName, bool isOrdered);
-    ResTreeNode& MakeChild(String&& entryName, std::u16string_view elementName, bool isOrdered);
+    void BindDocumentElement(const String& entryName, std::u16string_view elementName, bool isOrdered);
+    ResTreeNode& MakeChild(const String& entryName, std::u16string_view elementName, bool isOrdered);
     ResTreeNode* FindPrototype();
     ResTreeNode* Lookup(std::u16string_view path);
 

@@ -1,6 +1,5 @@
 #include "restree/NodeEntry.h"
 
-#include <cstring>
 #include <memory>
 #include <new>
 #include <utility>
@@ -12,39 +11,22 @@ namespace zkhw {
 
 namespace {
 
-constexpr const char* moduleName = "restree/NodeEntry";
-
 void* Allocate(size_t size) {
     void* memory = qn::dsc::osdep::TaskMemAlloc(size);
     if (memory == nullptr) {
-        throw std::bad_alloc();
+        qn::dsc::exception::ThrowBadAllocation();
     }
     return memory;
-}
-
-void CopyUnits(char16_t* target, std::u16string_view units) {
-    if (!units.empty()) {
-        std::memmove(target, units.data(), units.size() * sizeof(char16_t));
-    }
 }
 
 }  // namespace
 
 // --- Texts and links ---
 
-NodeEntry::TextShape::TextShape(HashedKey key, EntryKind kind, std::u16string_view text)
-    : NodeEntry(key.hash, kind, Shape::Packed),
-      lengths{static_cast<uint32_t>(key.text.size()), static_cast<uint32_t>(text.size())} {
-    CopyUnits(Units(), key.text);
-    CopyUnits(Units() + key.text.size(), text);
-}
-
 NodeEntry* NodeEntry::MakeText(HashedKey key, EntryKind kind, std::u16string_view text) {
-    static_assert(sizeof(void*) != 8 || (sizeof(TextShape) == 16 && sizeof(ChildShape) == 24));
-    if (key.text.size() > String::npos || text.size() > String::npos) [[unlikely]] {
-        qn::dsc::exception::ThrowAt(qn::dsc::exception::OutOfRange(), moduleName, __LINE__);
-    }
-    return new (Allocate(TextShape::SizeFor(key.text.size(), text.size()))) TextShape(key, kind, text);
+    static_assert(sizeof(void*) != 8 || (sizeof(TextShape) == sizeof(NodeEntry) + sizeof(TextPair) && sizeof(ChildShape) == 24));
+    const size_t size = sizeof(NodeEntry) + TextPair::SizeFor(key.text, text);
+    return new (Allocate(size)) TextShape(key, kind, text);
 }
 
 // Makes Strings of the key and of `text`, which need not be the entry's present one.
@@ -58,10 +40,7 @@ void NodeEntry::SetText(std::u16string_view text) {
     auto& entry = static_cast<TextShape&>(*this);
     if (shape == Shape::Unpacked) {
         entry.strings->text.Assign(text);
-    } else if (text.size() <= entry.lengths.text) {
-        CopyUnits(entry.Units() + entry.lengths.key, text);
-        entry.lengths.text = static_cast<uint32_t>(text.size());
-    } else {
+    } else if (!entry.packed.AssignSecond(text)) {
         Unpack(text);
     }
     textMarked = false;
@@ -81,25 +60,21 @@ void NodeEntry::ReleaseText() {
     if (shape == Shape::Unpacked) {
         entry.strings->text.Erase(0, String::npos, false);
     } else {
-        entry.lengths.text = 0;
+        entry.packed.AssignSecond({});
     }
 }
 
 // --- Children ---
 
-NodeEntry* NodeEntry::MakeChild(const String& name, uint8_t keyHash, ResTreeNode* child) {
-    return new (Allocate(sizeof(ChildShape))) ChildShape(&name, keyHash, child);
+NodeEntry* NodeEntry::MakeChild(const NameAndType& texts, uint8_t keyHash, ResTreeNode* child) {
+    return new (Allocate(sizeof(ChildShape))) ChildShape(&texts, keyHash, child);
 }
 
 NodeEntry* NodeEntry::MakeChild(String&& key, ResTreeNode* child) {
-    const uint8_t keyHash = HashKey(key.View());
-    NodeEntry* entry = MakeChild(key, keyHash, child);
-    try {
-        static_cast<ChildShape*>(entry)->ownKey = new String(std::move(key));
-    } catch (...) {
-        Release(entry);
-        throw;
-    }
+    auto ownKey = std::make_unique<String>(String::WithoutBuffer());
+    auto* entry = new (Allocate(sizeof(ChildShape))) ChildShape(nullptr, HashKey(key.View()), child);
+    ownKey->Swap(key);
+    entry->ownKey = ownKey.release();
     entry->shape = Shape::KeyedChild;
     return entry;
 }
@@ -116,7 +91,7 @@ void NodeEntry::OwnKey() {
         Unpack(Payload());
     } else if (shape == Shape::Child) {
         auto& entry = static_cast<ChildShape&>(*this);
-        entry.ownKey = new String(*entry.name);
+        entry.ownKey = new String(entry.texts->Name());
         shape = Shape::KeyedChild;
     }
 }

@@ -11,6 +11,8 @@
 
 #include "qn/dsc/StringBase.h"
 #include "restree/HashedKey.h"
+#include "restree/NameAndType.h"
+#include "restree/TextPair.h"
 
 namespace zkhw {
 
@@ -31,9 +33,9 @@ class NodeEntry {
     // A text or link entry. Throws bad_alloc, and OutOfRange for a key or a text that no String can hold.
     static NodeEntry* MakeText(HashedKey key, EntryKind kind, std::u16string_view text);
 
-    // A child entry that takes `child`, whose `name` is its key, and which keeps that name until it goes, or somebody
-    // calls OwnKey. Throws bad_alloc; then `child` is still the caller's.
-    static NodeEntry* MakeChild(const String& name, uint8_t keyHash, ResTreeNode* child);
+    // A child entry that takes `child`, whose name in `texts` is its key, and which keeps that name until it goes, or
+    // somebody calls OwnKey. Throws bad_alloc; then `child` is still the caller's.
+    static NodeEntry* MakeChild(const NameAndType& texts, uint8_t keyHash, ResTreeNode* child);
     // The same with a key that isn't the name of `child`. Throws bad_alloc; then `key` is as it was, too.
     static NodeEntry* MakeChild(String&& key, ResTreeNode* child);
 
@@ -120,61 +122,46 @@ class NodeEntry {
     bool textMarked = false;
 };
 
-// A packed entry has its units in the same block, behind the lengths: a tree has more of these than of anything else,
-// and two Strings of their own took twice the memory.
 struct NodeEntry::TextShape : NodeEntry {
-    struct Lengths {
-        uint32_t key;
-        uint32_t text;
-    };
     struct Strings {
         String key;
         String text;
     };
 
-    TextShape(HashedKey key, EntryKind kind, std::u16string_view text);
-
-    static size_t SizeFor(size_t keyLength, size_t textLength) {
-        return sizeof(TextShape) + (keyLength + textLength) * sizeof(char16_t);
-    }
-    char16_t* Units() { return reinterpret_cast<char16_t*>(this + 1); }
-    const char16_t* Units() const { return reinterpret_cast<const char16_t*>(this + 1); }
+    TextShape(HashedKey key, EntryKind kind, std::u16string_view text)
+        : NodeEntry(key.hash, kind, Shape::Packed), packed(key.text, text) {}
 
     union {
-        Lengths lengths;
+        TextPair packed;   // The last field: the texts stand behind it.
         Strings* strings;  // Of an Unpacked one.
     };
 };
 
 struct NodeEntry::ChildShape : NodeEntry {
-    ChildShape(const String* name, uint8_t keyHash, ResTreeNode* child)
-        : NodeEntry(keyHash, ChildEntry, Shape::Child), child(child), name(name) {}
+    ChildShape(const NameAndType* texts, uint8_t keyHash, ResTreeNode* child)
+        : NodeEntry(keyHash, ChildEntry, Shape::Child), child(child), texts(texts) {}
 
     ResTreeNode* child;
     union {
-        const String* name;
+        const NameAndType* texts;
         String* ownKey;  // Of a KeyedChild.
     };
 };
 
 inline std::u16string_view NodeEntry::Key() const {
     if (shape == Shape::Packed) {
-        const auto& entry = static_cast<const TextShape&>(*this);
-        return {entry.Units(), entry.lengths.key};
+        return static_cast<const TextShape*>(this)->packed.First();
     }
     if (shape == Shape::Unpacked) {
         return static_cast<const TextShape*>(this)->strings->key.View();
     }
     const auto& entry = static_cast<const ChildShape&>(*this);
-    return (shape == Shape::Child ? *entry.name : *entry.ownKey).View();
+    return shape == Shape::Child ? entry.texts->Name() : entry.ownKey->View();
 }
 
 inline std::u16string_view NodeEntry::Payload() const {
     const auto& entry = static_cast<const TextShape&>(*this);
-    if (shape == Shape::Packed) {
-        return {entry.Units() + entry.lengths.key, entry.lengths.text};
-    }
-    return entry.strings->text.View();
+    return shape == Shape::Packed ? entry.packed.Second() : entry.strings->text.View();
 }
 
 inline ResTreeNode* NodeEntry::ChildPayload() const {

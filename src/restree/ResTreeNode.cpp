@@ -33,7 +33,7 @@ constexpr TypeRelation builtInRelations[] = {
 }  // namespace
 
 ResTreeNode::ResTreeNode(std::u16string_view name, std::u16string_view type, bool ordered)
-    : name(name), type(type), parent(nullptr), entries(ordered) {
+    : texts(name, type), parent(nullptr), entries(ordered) {
     auto table = std::make_unique<TypeTable>();
     for (const TypeRelation& relation : builtInRelations) {
         table->AddTypeRelation(relation.type, relation.base);
@@ -41,18 +41,18 @@ ResTreeNode::ResTreeNode(std::u16string_view name, std::u16string_view type, boo
     GetAttachments().typeTable = std::move(table);
 }
 
-ResTreeNode::ResTreeNode(String&& name, String&& type, bool ordered, ResTreeNode* parent)
-    : name(std::move(name)), type(std::move(type)), parent(parent), entries(ordered) {}
+ResTreeNode::ResTreeNode(NameAndType&& texts, bool ordered, ResTreeNode* parent)
+    : texts(std::move(texts)), parent(parent), entries(ordered) {}
 
 ResTreeNode::ResTreeNode(std::u16string_view name, std::u16string_view type, bool ordered, const TypeTable* sourceTable)
-    : name(name), type(type), parent(nullptr), entries(ordered) {
+    : texts(name, type), parent(nullptr), entries(ordered) {
     if (sourceTable != nullptr) {
         GetAttachments().typeTable = sourceTable->Copy();
     }
 }
 
 // Any further field costs a tree 8 bytes a node.
-static_assert(sizeof(void*) != 8 || sizeof(ResTreeNode) == 96);
+static_assert(sizeof(void*) != 8 || sizeof(ResTreeNode) == 56);
 
 void* ResTreeNode::operator new(size_t size) {
     if (void* memory = qn::dsc::osdep::TaskMemAlloc(size)) {
@@ -218,48 +218,50 @@ ResTreeNode::Added ResTreeNode::AddText(HashedKey key, std::u16string_view text,
 
 ResTreeNode::Added ResTreeNode::AddChildEntry(std::u16string_view key, std::u16string_view childType, bool childOrdered,
                                               ResTreeNode*& child, const String* before) {
-    return AddChildAt(PositionBefore(before), key, String(key), String(childType), childOrdered, child);
+    const EntryPosition position = PositionBefore(before);
+    return AddChildAt(position, key, NameAndType(key, childType), childOrdered, child);
 }
 
-// Here and below `hashed` is that of `key`, which is moved from.
-ResTreeNode::Added ResTreeNode::AddChildAt(EntryPosition position, HashedKey hashed, String&& key, String&& childType,
+ResTreeNode::Added ResTreeNode::AddChildAt(EntryPosition position, HashedKey key, NameAndType&& childTexts,
                                            bool childOrdered, ResTreeNode*& child) {
     if (!IsOrdered()) {
-        const EntryList::Place place = entries.FindPlace(hashed);
+        const EntryList::Place place = entries.FindPlace(key);
         if (place.entry != nullptr) {
             child = place.entry->Child();
             return {place.entry, false};
         }
         position = place.position;
     }
-    return MakeChildAt(position, hashed, std::move(key), std::move(childType), childOrdered, child);
+    return MakeChildAt(position, key.hash, std::move(childTexts), childOrdered, child);
 }
 
-ResTreeNode::Added ResTreeNode::MakeChildAt(EntryPosition position, HashedKey hashed, String&& key, String&& childType,
+ResTreeNode::Added ResTreeNode::MakeChildAt(EntryPosition position, uint8_t keyHash, NameAndType&& childTexts,
                                             bool childOrdered, ResTreeNode*& child) {
-    auto made = std::make_unique<ResTreeNode>(std::move(key), std::move(childType), childOrdered, this);
-    NodeEntry* entry = NodeEntry::MakeChild(made->name, hashed.hash, made.get());
+    auto made = std::make_unique<ResTreeNode>(std::move(childTexts), childOrdered, this);
+    NodeEntry* entry = NodeEntry::MakeChild(made->texts, keyHash, made.get());
     child = made.release();
     return Store(position, entry, ChildAdded);
 }
 
 // RemoveIfMismatched and AddChildEntry in one, with one search where one is enough.
-ResTreeNode::Added ResTreeNode::ReplaceChild(bool unconditional, HashedKey hashed, String&& key, String&& childType,
+ResTreeNode::Added ResTreeNode::ReplaceChild(bool unconditional, NameAndType&& childTexts, uint8_t keyHash,
                                              bool childOrdered, ResTreeNode*& child, const String* before) {
+    const HashedKey key(childTexts.Name(), keyHash);
     if (unconditional || IsOrdered() || before != nullptr) {
-        RemoveIfMismatched(unconditional, hashed, childType.View(), childOrdered);
+        RemoveIfMismatched(unconditional, key, childTexts.Type(), childOrdered);
     } else {
-        const EntryList::Place place = entries.FindPlace(hashed);
+        const EntryList::Place place = entries.FindPlace(key);
         if (place.entry == nullptr) {
-            return MakeChildAt(place.position, hashed, std::move(key), std::move(childType), childOrdered, child);
+            return MakeChildAt(place.position, keyHash, std::move(childTexts), childOrdered, child);
         }
-        if (IsChildOfKind(*place.entry, childType.View(), childOrdered)) {
+        if (IsChildOfKind(*place.entry, childTexts.Type(), childOrdered)) {
             child = place.entry->Child();
             return {place.entry, false};
         }
         RemoveEntry(place.entry);
     }
-    return AddChildAt(PositionBefore(before), hashed, std::move(key), std::move(childType), childOrdered, child);
+    const EntryPosition position = PositionBefore(before);
+    return AddChildAt(position, key, std::move(childTexts), childOrdered, child);
 }
 
 // Where an unordered node takes an entry with this key: in front of the one that has it, if there is one.
@@ -285,8 +287,8 @@ EntryIterator ResTreeNode::InsertEntry(EntryIterator position, std::u16string_vi
 EntryIterator ResTreeNode::InsertEntry(EntryIterator position, std::u16string_view key,
                                        std::unique_ptr<ResTreeNode> child) {
     const EntryPosition place = IsOrdered() ? position.Position() : PlaceInFront(key);
-    NodeEntry* entry = qn::dsc::HasSameUnits(key, child->name.View())
-                           ? NodeEntry::MakeChild(child->name, HashKey(key), child.get())
+    NodeEntry* entry = qn::dsc::HasSameUnits(key, child->GetName())
+                           ? NodeEntry::MakeChild(child->texts, HashKey(key), child.get())
                            : NodeEntry::MakeChild(String(key), child.get());
     try {
         entries.Insert(place, entry);
@@ -331,15 +333,15 @@ bool ResTreeNode::RenameEntry(std::u16string_view oldKey, std::u16string_view ne
 
 bool ResTreeNode::Rename(std::u16string_view newName) {
     const ReleaseScope scope;
-    String assigned(newName);
+    NameAndType renamed(newName, GetType());
     if (parent != nullptr) {
         // Of equal names in an ordered node the first is renamed, which need not be that of this node.
         OwnKeyInParent();
-        if (!parent->RenameEntry(name.View(), newName)) {
+        if (!parent->RenameEntry(GetName(), newName)) {
             return false;
         }
     }
-    name.Swap(assigned);
+    texts = std::move(renamed);
     Raise(NodeNameChanged);
     if (parent != nullptr) {
         parent->Raise(ChildNameChanged);
@@ -347,16 +349,16 @@ bool ResTreeNode::Rename(std::u16string_view newName) {
     return true;
 }
 
-void ResTreeNode::TakeName(String&& newName) {
+void ResTreeNode::TakeTexts(NameAndType&& newTexts) {
     if (parent != nullptr) {
         OwnKeyInParent();
     }
-    name = std::move(newName);
+    texts = std::move(newTexts);
 }
 
 // Ahead of a change of the name that isn't one of the entry's key.
 void ResTreeNode::OwnKeyInParent() {
-    NodeEntry* own = parent->FindRaw(name.View());
+    NodeEntry* own = parent->FindRaw(GetName());
     if (own == nullptr || own->Child() != this) {
         own = nullptr;
         parent->entries.VisitUnordered([&](NodeEntry* entry) { own = entry->Child() == this ? entry : own; });
@@ -388,7 +390,7 @@ void ResTreeNode::RemoveIfMismatched(bool unconditional, HashedKey entryName, st
 // Whether the entry is a child of just this type and order.
 bool ResTreeNode::IsChildOfKind(const NodeEntry& entry, std::u16string_view entryType, bool entryOrdered) {
     const ResTreeNode* child = entry.Child();
-    return child != nullptr && child->IsOrdered() == entryOrdered && Compare(child->type.View(), entryType) == 0;
+    return child != nullptr && child->IsOrdered() == entryOrdered && Compare(child->GetType(), entryType) == 0;
 }
 
 // --- Types ---
@@ -407,11 +409,11 @@ const TypeTable* ResTreeNode::NearestTypeTable() const {
 }
 
 bool ResTreeNode::IsA(std::u16string_view typeName) const {
-    if (Compare(typeName, type.View()) == 0) {
+    if (Compare(typeName, GetType()) == 0) {
         return true;
     }
     const TypeTable* table = NearestTypeTable();
-    const TypeRecord* record = table == nullptr ? nullptr : table->Find(type.View());
+    const TypeRecord* record = table == nullptr ? nullptr : table->Find(GetType());
     return record != nullptr && record->IsA(typeName);
 }
 
@@ -441,9 +443,9 @@ void AppendBaseNames(const TypeRecord& record, std::vector<String>& list) {
 }  // namespace
 
 void ResTreeNode::GetProtocols(std::vector<String>& list) {
-    list.push_back(type);
+    list.emplace_back(GetType());
     const TypeTable* table = NearestTypeTable();
-    if (const TypeRecord* record = table == nullptr ? nullptr : table->Find(type.View())) {
+    if (const TypeRecord* record = table == nullptr ? nullptr : table->Find(GetType())) {
         AppendBaseNames(*record, list);
     }
     SplitList(GetPropertyOrEmpty(protocolsKey), u',', list, true);

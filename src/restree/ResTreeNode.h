@@ -18,6 +18,7 @@
 #include "restree/ChangeFlags.h"
 #include "restree/EntryIterator.h"
 #include "restree/EntryList.h"
+#include "restree/NameAndType.h"
 #include "restree/NodeEntry.h"
 #include "restree/ResTreeNodeChangeObserver.h"
 #include "restree/Reservation.h"
@@ -46,7 +47,7 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     ResTreeNode(std::u16string_view name, std::u16string_view type, bool ordered);
 
     // A child of `parent`, which doesn't hold it yet.
-    ResTreeNode(String&& name, String&& type, bool ordered, ResTreeNode* parent);
+    ResTreeNode(NameAndType&& texts, bool ordered, ResTreeNode* parent);
 
     // A detached node with a copy of `sourceTable`, or with no table if that is null.
     ResTreeNode(std::u16string_view name, std::u16string_view type, bool ordered, const TypeTable* sourceTable);
@@ -67,8 +68,9 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
 
     // --- Reading ---
 
-    const String& GetName() const { return name; }
-    const String& GetType() const { return type; }
+    // Good until the node gets another name or type.
+    std::u16string_view GetName() const { return texts.Name(); }
+    std::u16string_view GetType() const { return texts.Type(); }
     ResTreeNode* GetParent() const { return parent; }
 
     // Whether the node, or one above it, has left its tree since the outermost ReleaseScope began, which alone still
@@ -361,11 +363,11 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     EntryPosition PositionBefore(const String* before);
     EntryPosition PlaceInFront(std::u16string_view key) const;
     Added AddText(HashedKey key, std::u16string_view text, EntryKind kind, uint32_t change, const String* before);
-    Added AddChildAt(EntryPosition position, HashedKey hashed, String&& key, String&& childType, bool childOrdered,
+    Added AddChildAt(EntryPosition position, HashedKey hashed, NameAndType&& childTexts, bool childOrdered,
                      ResTreeNode*& child);
-    Added ReplaceChild(bool unconditional, HashedKey hashed, String&& key, String&& childType, bool childOrdered,
-                       ResTreeNode*& child, const String* before);
-    Added MakeChildAt(EntryPosition position, HashedKey hashed, String&& key, String&& childType, bool childOrdered,
+    Added ReplaceChild(bool unconditional, NameAndType&& childTexts, uint8_t keyHash, bool childOrdered, ResTreeNode*& child,
+                       const String* before);
+    Added MakeChildAt(EntryPosition position, uint8_t keyHash, NameAndType&& childTexts, bool childOrdered,
                       ResTreeNode*& child);
     static bool IsChildOfKind(const NodeEntry& entry, std::u16string_view entryType, bool entryOrdered);
     ResTreeNode* PrepareClone(EntryPosition position, HashedKey key, ResTreeNode& source, bool overwrite,
@@ -410,8 +412,8 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     int32_t LoadIncludedFile(const NarrowString& path, bool asChild, ResTreeNode** node, const LoadChain& includer);
     int32_t LoadFile(const NarrowString& path, bool asChild, ResTreeNode** node, const LoadChain& chain);
     void TakeOrder(bool ordered);
-    // Changes the name, and not the key of the node's entry.
-    void TakeName(String&& newName);
+    // Changes name and type, and not the key of the node's entry.
+    void TakeTexts(NameAndType&& newTexts);
     void OwnKeyInParent();
     // Have to hear of each entry that comes in, and of each new key. A node above one with deferred contents knows of
     // them, so that who copies need not look for them.
@@ -425,8 +427,7 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     bool HasDeferredContents() const;
     bool TakeDeferredPaths(std::vector<String>& paths);
 
-    String name;
-    String type;
+    NameAndType texts;
     ResTreeNode* parent;  // Null for a root and a detached clone.
     [[no_unique_address]] EntryList entries;
     // In the byte that the list leaves free at its end:

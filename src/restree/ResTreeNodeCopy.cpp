@@ -160,7 +160,7 @@ ResTreeNode* ResTreeNode::PrepareClone(EntryPosition position, HashedKey key, Re
                 // One less for the entry that is about to go, and one less as well if it then stays.
                 --index;
             }
-            RemoveIfMismatched(!overwrite, key, source.type.View(), source.IsOrdered());
+            RemoveIfMismatched(!overwrite, key, source.GetType(), source.IsOrdered());
             position = isThatEntry ? EntryList::End() : entries.AtIndex(index);
         } else if (!overwrite && HasDeferredContents()) {
             // What comes in now may bring what is to be removed.
@@ -170,15 +170,12 @@ ResTreeNode* ResTreeNode::PrepareClone(EntryPosition position, HashedKey key, Re
         }
     }
     ResTreeNode* child = nullptr;
-    String childName(key.text);
-    String childType(source.type);
-    const HashedKey hashed(childName.View(), key.hash);
-    entry =
-        IsOrdered()
-            ? AddChildAt(position, hashed, std::move(childName), std::move(childType), source.IsOrdered(), child).entry
-            : ReplaceChild(!overwrite, hashed, std::move(childName), std::move(childType), source.IsOrdered(), child,
-                           nullptr)
-                  .entry;
+    // Ahead of what may change the source.
+    NameAndType childTexts(key.text, source.GetType());
+    const HashedKey childKey(childTexts.Name(), key.hash);
+    entry = IsOrdered()
+                ? AddChildAt(position, childKey, std::move(childTexts), source.IsOrdered(), child).entry
+                : ReplaceChild(!overwrite, std::move(childTexts), key.hash, source.IsOrdered(), child, nullptr).entry;
     return StillHolds(entry) ? child : nullptr;
 }
 
@@ -223,7 +220,7 @@ NodeEntry* ResTreeNode::CloneExpandedBehind(const NodeEntry* behind, std::u16str
 }
 
 std::unique_ptr<ResTreeNode> ResTreeNode::Clone() {
-    auto clone = std::make_unique<ResTreeNode>(name.View(), type.View(), IsOrdered(), GetTypeTable());
+    auto clone = std::make_unique<ResTreeNode>(GetName(), GetType(), IsOrdered(), GetTypeTable());
     clone->MergeFrom(*this, false);
     return clone;
 }

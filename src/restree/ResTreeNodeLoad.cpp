@@ -53,7 +53,7 @@ ResTreeNode* StandingChild(const ResTreeNode& parent, ResTreeNode* child) {
         return child;
     }
     if (!parent.IsOrdered()) {
-        const NodeEntry* entry = parent.FindRaw(child->GetName().View());
+        const NodeEntry* entry = parent.FindRaw(child->GetName());
         return entry != nullptr && entry->Child() == child ? child : nullptr;
     }
     for (ConstEntryIterator entry = parent.Begin(); !entry.IsEnd(); ++entry) {
@@ -108,7 +108,7 @@ int32_t ResTreeNode::LoadFile(const NarrowString& path, bool asChild, ResTreeNod
         if (!file.OpenForReading(path)) {
             return generalFailure;
         }
-        ParseStack stack(*this, asChild ? type : String(), chain);
+        ParseStack stack(*this, asChild ? String(GetType()) : String(), chain);
         if (!stack.HasParser()) {
             return generalFailure;
         }
@@ -133,7 +133,7 @@ int32_t ResTreeNode::LoadResourceText(const String& text, bool asChild, ResTreeN
         }
         const std::unique_ptr<char[]> bytes(qn::dsc::WideToUtf8(text.CStr(), text.End()));
         const LoadChain chain(nullptr, nullptr);
-        ParseStack stack(*this, asChild ? type : String(), chain);
+        ParseStack stack(*this, asChild ? String(GetType()) : String(), chain);
         if (!stack.HasParser()) {
             return generalFailure;
         }

@@ -177,7 +177,7 @@ class ClimbingPath {
 String ResTreeNode::GetPath() const {
     ClimbingPath plain;
     const ResTreeNode* top = this;
-    while (top->parent != nullptr && plain.Prepend(top->name.View())) {
+    while (top->parent != nullptr && plain.Prepend(top->GetName())) {
         top = top->parent;
     }
     if (top->parent == nullptr && plain.BeginsWithAName()) {
@@ -185,7 +185,7 @@ String ResTreeNode::GetPath() const {
     }
     GrowingPath path;
     for (const ResTreeNode* node : WayFromRoot(this)) {
-        path.Append(node->name.View());
+        path.Append(node->GetName());
     }
     return path.Take();
 }
@@ -196,7 +196,7 @@ String ResTreeNode::GetDisplayPath() {
     for (ResTreeNode* node : WayFromRoot(this)) {
         const auto displayName = node->GetProperty(displayNameKey);
         if (!displayName) {
-            path.Append(node->name.View());
+            path.Append(node->GetName());
         } else if (!displayName->empty()) {
             path.Append(*displayName);
         }
@@ -208,7 +208,7 @@ String ResTreeNode::GetEntryDisplayPath(EntryIterator iterator, const String& pa
     const ReleaseScope scope;
     ResTreeNode* node = ResolveEntry(iterator);
     return node == nullptr ? String()
-                           : JoinDisplayPath(parentDisplayPath, node->name, node->GetProperty(displayNameKey));
+                           : JoinDisplayPath(parentDisplayPath, node->GetName(), node->GetProperty(displayNameKey));
 }
 
 }  // namespace zkhw

@@ -4,6 +4,7 @@
 #include <vector>
 
 #include "hostbridge/XmlEscape.h"
+#include "qn/dsc/osdep/Compare.h"
 #include "restree/ReleaseScope.h"
 #include "restree/ResTreeNode.h"
 #include "restree/TextList.h"
@@ -13,6 +14,7 @@ namespace zkhw {
 namespace {
 
 using namespace std::string_view_literals;
+using qn::dsc::osdep::Equal;
 
 constexpr uint32_t blanksPerLevel = 3;
 
@@ -71,12 +73,12 @@ void AppendOpenTag(const ResTreeNode& node, String& out, Indent indent) {
     BeginLine(out, indent);
     out.Append(u"<"sv);
     out.Append(node.GetType());
-    if (!(node.GetName() == node.GetType())) {
+    if (!Equal(node.GetName(), node.GetType())) {
         out.Append(u" name=\""sv);
-        AppendXmlEscaped(out, node.GetName().View(), true);
+        AppendXmlEscaped(out, node.GetName(), true);
         out.Append(u"\""sv);
     }
-    if (node.IsOrdered() && !EndsWith(node.GetType().View(), u"List")) {
+    if (node.IsOrdered() && !EndsWith(node.GetType(), u"List")) {
         out.Append(u" ordered=\"true\""sv);
     }
     out.Append(u">"sv);

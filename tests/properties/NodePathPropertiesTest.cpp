@@ -19,7 +19,7 @@ using qn::dsc::osdep::Equal;
 bool IsShownByItsPath(ResTreeNode& node) {
     for (ResTreeNode* step = &node; step->GetParent() != nullptr; step = step->GetParent()) {
         ResTreeNode& parent = *step->GetParent();
-        const std::u16string_view name = step->GetName().View();
+        const std::u16string_view name = step->GetName();
         const NodeEntry* entry = parent.FindRaw(name);
         if (entry == nullptr || entry->Child() != step || Equal(name, u".") || Equal(name, u"..") ||
             (parent.GetParent() == nullptr && Equal(name, u""))) {
@@ -53,7 +53,7 @@ bool IsShownFrom(const ResTreeNode& base, ResTreeNode& target) {
     if (!IsBelow(target, base)) {
         return true;
     }
-    const std::u16string_view name = FirstStep(target, base).GetName().View();
+    const std::u16string_view name = FirstStep(target, base).GetName();
     return !name.empty() && name.find_first_of(u"/\\") == std::u16string_view::npos && name.substr(0, 2) != u"#{";
 }
 

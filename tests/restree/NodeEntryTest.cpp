@@ -41,7 +41,8 @@ INSTANTIATE_TEST_SUITE_P(BothForms, TextForms, ::testing::Bool(),
 
 TEST_P(TextForms, KeepsKeyAndTextApart) {
     const std::u16string many(70'000, u'x');
-    for (const std::u16string_view key : {u""sv, u"k"sv, u"a\0b"sv, u"\uD800"sv, std::u16string_view(many)}) {
+    const char16_t loneSurrogate = 0xD800;
+    for (const std::u16string_view key : {u""sv, u"k"sv, u"a\0b"sv, std::u16string_view(&loneSurrogate, 1), std::u16string_view(many)}) {
         for (const std::u16string_view text : {u""sv, u"t"sv, u"c\0d\0"sv, u"\u00E4\u65E5"sv, std::u16string_view(many)}) {
             const OwnedEntry entry = Make(key, text);
             EXPECT_EQ(entry->Key(), key);
@@ -175,14 +176,14 @@ TEST(NodeEntry, LinkHasAPathAndNoText) {
 
 TEST(NodeEntry, ChildHasItsNodesNameAsKeyUntilItOwnsOne) {
     ResTreeNode node(u"Name", u"T", false);
-    String name(u"Name");
-    const OwnedEntry entry(NodeEntry::MakeChild(name, HashKey(u"Name"), &node));
-    EXPECT_EQ(entry->Key().data(), name.CStr());
+    NameAndType texts(u"Name", u"T");
+    const OwnedEntry entry(NodeEntry::MakeChild(texts, HashKey(u"Name"), &node));
+    EXPECT_EQ(entry->Key().data(), texts.Name().data());
     EXPECT_EQ(entry->Child(), &node);
     EXPECT_FALSE(entry->Text());
     EXPECT_FALSE(entry->LinkPath());
     entry->OwnKey();
-    name.Assign(u"Else");
+    texts = NameAndType(u"Else", u"T");
     EXPECT_EQ(entry->Key(), u"Name");
     EXPECT_EQ(entry->TakeChild(), &node);
     EXPECT_EQ(entry->Child(), nullptr);

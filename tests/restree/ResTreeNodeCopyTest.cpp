@@ -474,7 +474,7 @@ TEST_P(KinMerge, NodeMergedWithItselfStaysAsItIs) {
             const std::string before = DumpTree(*node);
             node->MergeFrom(*node, overwrite);
             EXPECT_EQ(DumpTree(*node), before);
-            root->RemoveEntryByName(node->GetName().View());
+            root->RemoveEntryByName(node->GetName());
         }
     }
 }

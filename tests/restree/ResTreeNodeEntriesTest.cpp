@@ -573,10 +573,10 @@ TEST(ResTreeNode, ManyChildrenAreRenamedOneByOne) {
             children.push_back(AddChild(*root, (u"k" + std::u16string(number.begin(), number.end())).c_str()));
         }
         for (ResTreeNode* child : children) {
-            ASSERT_TRUE(child->Rename(u"n" + std::u16string(child->GetName().View().substr(1))));
+            ASSERT_TRUE(child->Rename(u"n" + std::u16string(child->GetName().substr(1))));
         }
         for (ResTreeNode* child : children) {
-            ASSERT_EQ(root->Lookup(child->GetName().View(), nullptr), child);
+            ASSERT_EQ(root->Lookup(child->GetName(), nullptr), child);
         }
         EXPECT_TRUE(root->FindEntry(u"k7").IsEnd());
     }

@@ -29,7 +29,7 @@ std::string Printable(std::u16string_view text) {
 }
 
 std::string Heading(const ResTreeNode& node) {
-    return Printable(node.GetName().View()) + ":" + Printable(node.GetType().View()) + (node.IsOrdered() ? " ordered" : "");
+    return Printable(node.GetName()) + ":" + Printable(node.GetType()) + (node.IsOrdered() ? " ordered" : "");
 }
 
 std::string Line(const NodeEntry& entry, const ResTreeNode& holder) {
@@ -43,7 +43,7 @@ std::string Line(const NodeEntry& entry, const ResTreeNode& holder) {
             return key + "->" + Printable(*entry.LinkPath());
         case ChildEntry: {
             const ResTreeNode& child = *entry.Child();
-            const std::string keyPart = Printable(child.GetName().View()) == key ? "" : key + "=>";
+            const std::string keyPart = Printable(child.GetName()) == key ? "" : key + "=>";
             return keyPart + Heading(child) + (child.GetParent() == &holder ? "" : " !parent");
         }
         case EmptyEntry:
