@@ -45,8 +45,7 @@ void FillInFront(benchmark::State& state) {
         ResTreeNode node(u"n", u"N", true);
         for (size_t i = 0; i < keys.size(); ++i) {
             const String before(keys[i == 0 ? 0 : i - 1]);
-            benchmark::DoNotOptimize(
-                node.AddTextEntry(keys[i], u"value", zkhw::TextEntry, &before).entry);
+            benchmark::DoNotOptimize(node.AddTextEntry(keys[i], u"value", zkhw::TextEntry, &before).entry);
         }
     }
     state.SetItemsProcessed(state.iterations() * state.range(0));

@@ -180,8 +180,9 @@ void SameEntries(ResTreeNode& scanned, ResTreeNode& grown, bool isTop) {
 
 void SameKept(const ResTreeNode& scanned, ResTreeNode& stub, bool mayLoad) {
     for (auto entry = scanned.Begin(); entry != scanned.End(); ++entry) {
-        const bool isKept = scanned.IsA(u"Target") ? IsKept(entry.Key())
-                                                   : Equal(entry.Key(), u"Protocols") || Equal(entry.Key(), u"FPGA_XMLSource");
+        const bool isKept = scanned.IsA(u"Target")
+                                ? IsKept(entry.Key())
+                                : Equal(entry.Key(), u"Protocols") || Equal(entry.Key(), u"FPGA_XMLSource");
         if (isKept) {
             const NodeEntry* kept = scanned.FindRaw(entry.Key());
             const NodeEntry* found = mayLoad ? stub.Find(entry.Key()) : stub.FindRaw(entry.Key());

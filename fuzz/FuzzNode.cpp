@@ -141,8 +141,7 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
             default: {
                 const auto value = node.GetProperty(key);
                 fuzz::Require(value.has_value() == model.Has(key), "what one finds, the other finds");
-                fuzz::Require(!value || *value == model.items[model.Find(key)].second,
-                              "the first of a key is found");
+                fuzz::Require(!value || *value == model.items[model.Find(key)].second, "the first of a key is found");
             }
         }
     }

@@ -107,7 +107,8 @@ void ElementReader::AppendTagToXmlValue() {
     value.Append(u">");
 }
 
-void ElementReader::BeginXmlValue(const String& entryName, std::string_view nextName, const char* const* nextAttributes) {
+void ElementReader::BeginXmlValue(const String& entryName, std::string_view nextName,
+                                  const char* const* nextAttributes) {
     frame.position = node.AddTextEntry(entryName.View(), {}, TextEntry, Before()).entry;
     frame.xmlDepth = 1;
     // The tag that told of the content is the first one inside the value. Without content nothing stays pending.
@@ -260,8 +261,7 @@ void ElementReader::MakeOrdinaryValue(std::u16string_view text, bool isReference
 void ElementReader::StoreText(std::u16string_view text, EntryKind kind) {
     const ResTreeNode::Added added = node.AddTextEntry(frame.pendingName.Text(), text, kind, Before());
     frame.position = added.entry;
-    if (!added.isNew && frame.mergeExisting && node.SetEntryText(added.entry, text) &&
-        kind == LocalizedTextEntry) {
+    if (!added.isNew && frame.mergeExisting && node.SetEntryText(added.entry, text) && kind == LocalizedTextEntry) {
         added.entry->SetTextKind(LocalizedTextEntry);
     }
 }

@@ -24,7 +24,8 @@ void* Allocate(size_t size) {
 // --- Texts and links ---
 
 NodeEntry* NodeEntry::MakeText(HashedKey key, EntryKind kind, std::u16string_view text) {
-    static_assert(sizeof(void*) != 8 || (sizeof(TextShape) == sizeof(NodeEntry) + sizeof(TextPair) && sizeof(ChildShape) == 24));
+    static_assert(sizeof(void*) != 8 ||
+                  (sizeof(TextShape) == sizeof(NodeEntry) + sizeof(TextPair) && sizeof(ChildShape) == 24));
     const size_t size = sizeof(NodeEntry) + TextPair::SizeFor(key.text, text);
     return new (Allocate(size)) TextShape(key, kind, text);
 }
@@ -39,7 +40,13 @@ void NodeEntry::Unpack(std::u16string_view text) {
 void NodeEntry::SetText(std::u16string_view text) {
     auto& entry = static_cast<TextShape&>(*this);
     if (shape == Shape::Unpacked) {
-        entry.strings->text.Assign(text);
+        String& own = entry.strings->text;
+        if (text.data() == own.CStr()) {
+            // Assign would leave all of it.
+            own.Erase(static_cast<uint32_t>(text.size()), String::npos, false);
+        } else {
+            own.Assign(text);
+        }
     } else if (!entry.packed.AssignSecond(text)) {
         Unpack(text);
     }

@@ -52,9 +52,7 @@ class NodeEntry {
     bool IsText() const { return kind == TextEntry || kind == LocalizedTextEntry; }
 
     // The value of a text entry of either kind; none for any other. Good until the text or the key is changed.
-    std::optional<std::u16string_view> Text() const {
-        return IsText() ? std::optional(Payload()) : std::nullopt;
-    }
+    std::optional<std::u16string_view> Text() const { return IsText() ? std::optional(Payload()) : std::nullopt; }
 
     // Assigns the text of a text entry; `text` may be a part of the entry's own. Throws bad_alloc, and OutOfRange for
     // a text that no String can hold; then nothing has changed.

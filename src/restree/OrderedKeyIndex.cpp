@@ -77,8 +77,7 @@ bool OrderedKeyIndex::StandsBefore(const NodeEntry& left, const NodeEntry& right
 // The slot of the key, or the empty one where it belongs.
 size_t OrderedKeyIndex::FindSlot(uint32_t hash, std::u16string_view key) const {
     size_t slot = HomeOf(hash);
-    while (slots[slot].entry != nullptr &&
-           (slots[slot].hash != hash || Compare(slots[slot].entry->Key(), key) != 0)) {
+    while (slots[slot].entry != nullptr && (slots[slot].hash != hash || Compare(slots[slot].entry->Key(), key) != 0)) {
         slot = (slot + 1) & (slots.size() - 1);
     }
     return slot;

@@ -61,9 +61,9 @@ class InstanceParameters : public Parameters {
     int32_t index;
 };
 
-// Appends `text` with every "#{name}" that has a parameter replaced by its value, in one pass. An unknown one stays, without
-// the blanks inside its braces; a "#{" that isn't closed stays with all that follows. `from` is what FindVariable gave,
-// for who has it.
+// Appends `text` with every "#{name}" that has a parameter replaced by its value, in one pass. An unknown one stays,
+// without the blanks inside its braces; a "#{" that isn't closed stays with all that follows. `from` is what
+// FindVariable gave, for who has it.
 void ExpandVariables(std::u16string_view text, const Parameters& parameters, TextBuilder& result, size_t from = 0);
 
 // The offset of the first "#{"; npos if there is nothing to expand.

@@ -365,8 +365,8 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     Added AddText(HashedKey key, std::u16string_view text, EntryKind kind, uint32_t change, const String* before);
     Added AddChildAt(EntryPosition position, HashedKey hashed, NameAndType&& childTexts, bool childOrdered,
                      ResTreeNode*& child);
-    Added ReplaceChild(bool unconditional, NameAndType&& childTexts, uint8_t keyHash, bool childOrdered, ResTreeNode*& child,
-                       const String* before);
+    Added ReplaceChild(bool unconditional, NameAndType&& childTexts, uint8_t keyHash, bool childOrdered,
+                       ResTreeNode*& child, const String* before);
     Added MakeChildAt(EntryPosition position, uint8_t keyHash, NameAndType&& childTexts, bool childOrdered,
                       ResTreeNode*& child);
     static bool IsChildOfKind(const NodeEntry& entry, std::u16string_view entryType, bool entryOrdered);

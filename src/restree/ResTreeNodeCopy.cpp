@@ -72,8 +72,8 @@ void ResTreeNode::MergeWalk::Run() {
             MergeLink(level, *entry);
         } else if (ResTreeNode* sourceChild = entry->Child(); sourceChild != nullptr && sourceChild != top) {
             NodeEntry* placed = nullptr;
-            if (ResTreeNode* child = level.target->PrepareClone(
-                    EntryList::End(), {entry->Key(), entry->KeyHash()}, *sourceChild, overwrite, placed)) {
+            if (ResTreeNode* child = level.target->PrepareClone(EntryList::End(), {entry->Key(), entry->KeyHash()},
+                                                                *sourceChild, overwrite, placed)) {
                 Enter(*child, *sourceChild);
             }
         }

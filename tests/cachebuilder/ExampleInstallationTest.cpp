@@ -167,9 +167,7 @@ TEST(ExampleInstallation, LeavesNoParameterOpenOnABoard) {
             EXPECT_EQ(Findings(*entry->Child(),
                                [](ResTreeNode&, NodeEntry& inner) {
                                    const auto text = inner.Text();
-                                   return text && text->find(u"#{") != std::u16string_view::npos
-                                              ? Utf8(*text)
-                                              : "";
+                                   return text && text->find(u"#{") != std::u16string_view::npos ? Utf8(*text) : "";
                                }),
                       nothing);
         }

@@ -42,8 +42,10 @@ INSTANTIATE_TEST_SUITE_P(BothForms, TextForms, ::testing::Bool(),
 TEST_P(TextForms, KeepsKeyAndTextApart) {
     const std::u16string many(70'000, u'x');
     const char16_t loneSurrogate = 0xD800;
-    for (const std::u16string_view key : {u""sv, u"k"sv, u"a\0b"sv, std::u16string_view(&loneSurrogate, 1), std::u16string_view(many)}) {
-        for (const std::u16string_view text : {u""sv, u"t"sv, u"c\0d\0"sv, u"\u00E4\u65E5"sv, std::u16string_view(many)}) {
+    for (const std::u16string_view key :
+         {u""sv, u"k"sv, u"a\0b"sv, std::u16string_view(&loneSurrogate, 1), std::u16string_view(many)}) {
+        for (const std::u16string_view text :
+             {u""sv, u"t"sv, u"c\0d\0"sv, u"\u00E4\u65E5"sv, std::u16string_view(many)}) {
             const OwnedEntry entry = Make(key, text);
             EXPECT_EQ(entry->Key(), key);
             EXPECT_EQ(entry->Text(), text);
