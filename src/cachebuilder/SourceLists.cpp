@@ -1,6 +1,5 @@
 #include "cachebuilder/SourceLists.h"
 
-#include "qn/dsc/FindUnit.h"
 #include "restree/ResTreeNode.h"
 #include "restree/TextList.h"
 
@@ -41,30 +40,28 @@ void SourceLists::Add(ResTreeNode& node, const String& file) {
         node.SetProperty(sourceKey, file.View());
         return;
     }
-    const auto source = entry->Text();
-    if (!source) {
+    if (!entry->IsText()) {
         return;
     }
     List& list = lists[&node];
     // A file may have written the entry itself since.
-    if (!qn::dsc::HasSameUnits(list.text.View(), *source)) {
+    if (list.entry != entry || !entry->IsTextMarked()) {
         list.pieces.clear();
-        AddPieces(*source, list.pieces);
-        list.text.Assign(*source);
+        AddPieces(*entry->Text(), list.pieces);
+        list.entry = entry;
+        entry->MarkText();
     }
     if (list.pieces.contains(ToUpper(file.View()))) {
         return;
     }
-    if (EndsInEscape(list.text.View())) {
-        list.text = {};
-    } else {
-        AddPieces(file.View(), list.pieces);
-        list.text.Append(u",");
-        list.text.Append(file);
-    }
     String& text = entry->EditText();
+    const bool joinsTheLast = EndsInEscape(text.View());
     text.Append(u",");
     text.Append(file);
+    if (!joinsTheLast) {
+        AddPieces(file.View(), list.pieces);
+        entry->MarkText();
+    }
     node.Raise(PropertyChanged);
 }
 

@@ -8,10 +8,12 @@
 
 namespace zkhw {
 
+class NodeEntry;
 class ResTreeNode;
 
 // Keeps the entry "FPGA_XMLSource" of nodes that are put together from several files: a comma list of the files. Holds
-// on to what the lists contain, so that the cost of many files for one node grows with their number.
+// on to what the lists contain, and marks the texts that it has written, so that each further file for a node costs as
+// much as its own name.
 class SourceLists {
   public:
     // Appends `file` to the node's list, unless one of its pieces is the same file name but for the case of ASCII
@@ -20,8 +22,8 @@ class SourceLists {
 
   private:
     struct List {
-        qn::dsc::String text;                       // The entry as it was left.
-        std::unordered_set<std::u16string> pieces;  // Of `text`, in upper case.
+        const NodeEntry* entry = nullptr;           // Only compared.
+        std::unordered_set<std::u16string> pieces;  // Of the entry's text, in upper case, as long as that is marked.
     };
 
     std::unordered_map<const ResTreeNode*, List> lists;

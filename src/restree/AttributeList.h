@@ -31,8 +31,6 @@ class AttributeList {
     void Assign(const char* const* attributes);
     void Clear();
 
-    bool IsEmpty() const { return items.empty(); }
-
     bool Has(AttributeName name) const { return ((present >> static_cast<uint32_t>(name)) & 1U) != 0; }
 
     // The value of an attribute that is there.

@@ -42,7 +42,6 @@ class EntryPieces {
     EntryPieces(const EntryPieces&) = delete;
     EntryPieces& operator=(const EntryPieces&) = delete;
 
-    bool IsEmpty() const { return pieces.empty(); }
     EntryPosition Begin() const { return pieces.empty() ? EntryPosition{} : EntryPosition{0, 0}; }
     EntryPosition Last() const;
     EntryPosition Next(EntryPosition position) const;

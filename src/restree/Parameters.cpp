@@ -1,11 +1,10 @@
 #include "restree/Parameters.h"
 
-#include <vector>
-
 #include "qn/dsc/FindUnit.h"
 #include "qn/dsc/osdep/Compare.h"
 #include "qn/dsc/osdep/IntegerToString.h"
 #include "restree/EntryWalk.h"
+#include "restree/LevelStack.h"
 #include "restree/ReleaseScope.h"
 #include "restree/ResTreeNode.h"
 #include "restree/TextList.h"
@@ -97,18 +96,14 @@ void ResTreeNode::ApplyParameters(const Parameters& parameters) {
         EntryWalk walk;
     };
     const ReleaseScope scope;
-    // The outermost level stands apart, since most copies have no other and need no memory then.
-    Level outermost{this, {}};
-    std::vector<Level> inner;
+    LevelStack<Level> levels;
     EnsureDeferredLoaded();
-    while (true) {
-        Level& level = inner.empty() ? outermost : inner.back();
+    levels.Push({this, {}});
+    while (!levels.IsEmpty()) {
+        Level& level = levels.Top();
         NodeEntry* entry = level.walk.Next(level.node->entries);
         if (entry == nullptr) {
-            if (inner.empty()) {
-                return;
-            }
-            inner.pop_back();
+            levels.Pop();
         } else if (const auto text = entry->Text()) {
             if (const size_t open = FindVariable(*text); open != std::u16string_view::npos) {
                 TextBuilder expanded;
@@ -117,7 +112,7 @@ void ResTreeNode::ApplyParameters(const Parameters& parameters) {
             }
         } else if (ResTreeNode* child = entry->Child()) {
             child->EnsureDeferredLoaded();
-            inner.push_back({child, {}});
+            levels.Push({child, {}});
         }
     }
 }
