@@ -23,7 +23,9 @@ bool IsExcludedBy(std::u16string_view exclusionProperty, ResTreeNode& node) {
 }
 
 String DisplayPathBelow(const String& parentDisplayPath, ResTreeNode& node) {
-    return JoinDisplayPath(parentDisplayPath, node.GetName(), node.GetProperty(u"DisplayName"));
+    // First, since it may load, and so change the name.
+    const auto displayName = node.GetProperty(u"DisplayName");
+    return JoinDisplayPath(parentDisplayPath, node.GetName(), displayName);
 }
 
 // The node's path as text, made when it is first asked for.

@@ -337,7 +337,9 @@ bool ResTreeNode::Rename(std::u16string_view newName) {
     if (parent != nullptr) {
         // Of equal names in an ordered node the first is renamed, which need not be that of this node.
         OwnKeyInParent();
-        if (!parent->RenameEntry(GetName(), newName)) {
+        // A load on the way may rename the node.
+        const String oldName(GetName());
+        if (!parent->RenameEntry(oldName.View(), newName)) {
             return false;
         }
     }

@@ -150,6 +150,9 @@ void ResTreeNode::MergeExpanded(ResTreeNode& source, bool overwrite, const Param
 // the place or an observer has removed the child already.
 ResTreeNode* ResTreeNode::PrepareClone(EntryPosition position, HashedKey key, ResTreeNode& source, bool overwrite,
                                        NodeEntry*& entry) {
+    // Ahead of what is removed and loaded, which may change the source.
+    NameAndType childTexts(key.text, source.GetType());
+    key.text = childTexts.Name();
     if (IsOrdered()) {
         if (const NodeEntry* found = FindRaw(key)) {
             const EntryPosition foundPosition = entries.Locate(found);
@@ -160,7 +163,7 @@ ResTreeNode* ResTreeNode::PrepareClone(EntryPosition position, HashedKey key, Re
                 // One less for the entry that is about to go, and one less as well if it then stays.
                 --index;
             }
-            RemoveIfMismatched(!overwrite, key, source.GetType(), source.IsOrdered());
+            RemoveIfMismatched(!overwrite, key, childTexts.Type(), source.IsOrdered());
             position = isThatEntry ? EntryList::End() : entries.AtIndex(index);
         } else if (!overwrite && HasDeferredContents()) {
             // What comes in now may bring what is to be removed.
@@ -170,11 +173,8 @@ ResTreeNode* ResTreeNode::PrepareClone(EntryPosition position, HashedKey key, Re
         }
     }
     ResTreeNode* child = nullptr;
-    // Ahead of what may change the source.
-    NameAndType childTexts(key.text, source.GetType());
-    const HashedKey childKey(childTexts.Name(), key.hash);
     entry = IsOrdered()
-                ? AddChildAt(position, childKey, std::move(childTexts), source.IsOrdered(), child).entry
+                ? AddChildAt(position, key, std::move(childTexts), source.IsOrdered(), child).entry
                 : ReplaceChild(!overwrite, std::move(childTexts), key.hash, source.IsOrdered(), child, nullptr).entry;
     return StillHolds(entry) ? child : nullptr;
 }

@@ -207,8 +207,12 @@ String ResTreeNode::GetDisplayPath() {
 String ResTreeNode::GetEntryDisplayPath(EntryIterator iterator, const String& parentDisplayPath) {
     const ReleaseScope scope;
     ResTreeNode* node = ResolveEntry(iterator);
-    return node == nullptr ? String()
-                           : JoinDisplayPath(parentDisplayPath, node->GetName(), node->GetProperty(displayNameKey));
+    if (node == nullptr) {
+        return String();
+    }
+    // First, since it may load, and so change the name.
+    const auto displayName = node->GetProperty(displayNameKey);
+    return JoinDisplayPath(parentDisplayPath, node->GetName(), displayName);
 }
 
 }  // namespace zkhw
