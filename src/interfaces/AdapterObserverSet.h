@@ -36,7 +36,6 @@ class AdapterObserverSet {
     using Members = std::set<ResTreeNodeObserverAdapter*, ByKey>;
 
   public:
-
     // The member with this key, or null.
     ResTreeNodeObserverAdapter* Find(const Key& key) const;
 

@@ -103,6 +103,16 @@ TEST(BoundaryTaskMemory, BlocksAreAlignedAndOfTheirOwn) {
     CoTaskMemFree(second);
 }
 
+TEST(BoundaryTaskMemory, EmptyBlocksAreAlignedTo16Bytes) {
+    // Two in a row, since one of any two neighbours of 8 bytes is aligned.
+    for (void* const block :
+         {CoTaskMemAlloc(0), CoTaskMemAlloc(0), CoTaskMemRealloc(nullptr, 0), CoTaskMemRealloc(nullptr, 0)}) {
+        ASSERT_NE(block, nullptr);
+        EXPECT_EQ(reinterpret_cast<uintptr_t>(block) % 16, 0U);
+        CoTaskMemFree(block);
+    }
+}
+
 TEST(BoundaryTaskMemory, BlocksOfEverySizeAreAlignedTo16Bytes) {
     std::vector<void*> blocks;
     for (size_t size = 1; size <= 200; ++size) {

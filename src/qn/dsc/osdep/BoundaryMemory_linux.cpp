@@ -24,7 +24,8 @@ struct StringHead {
     uint32_t byteLength;  // Without the NUL unit.
 };
 
-// Task memory aligns to 16 bytes only what is a multiple of them. 0 for a size that can't be rounded up.
+// Task memory aligns to 16 bytes only what is a multiple of them, and no empty block. 0 for a size that can't be rounded
+// up.
 constexpr size_t RoundUp(size_t size) {
     return (size + 15) & ~size_t{15};
 }
@@ -40,11 +41,14 @@ StringHead* HeadOf(BSTR string) {
 }  // namespace
 
 void* CoTaskMemAlloc(size_t size) {
-    const size_t rounded = RoundUp(size);
+    const size_t rounded = RoundUp(size == 0 ? 1 : size);
     return rounded < size ? nullptr : TaskMemAlloc(rounded);
 }
 
 void* CoTaskMemRealloc(void* block, size_t size) {
+    if (block == nullptr) {
+        return CoTaskMemAlloc(size);
+    }
     const size_t rounded = RoundUp(size);
     return rounded < size ? nullptr : TaskMemRealloc(block, rounded);
 }
