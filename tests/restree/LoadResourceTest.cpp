@@ -50,6 +50,16 @@ TEST(LoadResourceText, GivesTheChildThatWasThere) {
     EXPECT_EQ(node, before);
 }
 
+TEST(LoadResourceText, GivesTheNewChildOfAnOrderedNode) {
+    ResTreeNode root(u"Root", u"Root", true);
+    for (int count = 0; count < 3; ++count) {
+        ResTreeNode* node = nullptr;
+        EXPECT_EQ(root.LoadResourceText(u"<A name='x'/>", true, &node), 0);
+        EXPECT_EQ(root.Entries().Size(), static_cast<uint32_t>(count) + 1);
+        EXPECT_EQ(node, root.Entries().At(root.Entries().Last())->Child());
+    }
+}
+
 TEST(LoadResourceText, GivesTheFirstOfSeveralInstances) {
     auto root = MakeRoot();
     ResTreeNode* node = nullptr;

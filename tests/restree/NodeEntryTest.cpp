@@ -7,6 +7,7 @@
 
 #include <gtest/gtest.h>
 
+#include "qn/dsc/exception/Exception.h"
 #include "restree/ResTreeNode.h"
 #include "support/AllocationFaultScope.h"
 
@@ -156,6 +157,24 @@ TEST(NodeEntry, EditTextOfAPackedEntryWithoutMemoryLeavesIt) {
     }
     EXPECT_EQ(entry->Text(), u"text");
     EXPECT_EQ(entry->EditText().View(), u"text");
+}
+
+TEST(NodeEntry, TextThatNoStringCanHoldIsRefused) {
+    if constexpr (sizeof(size_t) > sizeof(uint32_t)) {
+        // Its units are never looked at.
+        const std::u16string_view tooLong(u"x", size_t{String::npos} + 1);
+        EXPECT_THROW(NodeEntry::MakeText(u"Key", TextEntry, tooLong), qn::dsc::exception::OutOfRange);
+        EXPECT_THROW(NodeEntry::MakeText(HashedKey(tooLong, 1), TextEntry, u"text"), qn::dsc::exception::OutOfRange);
+        EXPECT_THROW(NameAndType(u"Name", tooLong), qn::dsc::exception::OutOfRange);
+        for (const bool unpacked : {false, true}) {
+            const OwnedEntry entry = MakeText(u"Key", u"text");
+            if (unpacked) {
+                entry->EditText();
+            }
+            EXPECT_THROW(entry->SetText(tooLong), qn::dsc::exception::OutOfRange);
+            EXPECT_EQ(entry->Text(), u"text");
+        }
+    }
 }
 
 TEST(NodeEntry, LocalizedTextIsAText) {

@@ -1,10 +1,13 @@
 #include "restree/ResTreeNode.h"
 
+#include <memory>
+#include <new>
 #include <string>
 #include <vector>
 
 #include <gtest/gtest.h>
 
+#include "support/AllocationFaultScope.h"
 #include "support/ExactText.h"
 #include "support/TreeDump.h"
 #include "support/TreeMaking.h"
@@ -206,6 +209,34 @@ TEST(ResTreeNode, InsertEntryTakesANode) {
     EXPECT_EQ(root->ResolveEntry(stored), child);
     EXPECT_EQ(child->GetParent(), root.get());
     EXPECT_EQ(DumpTree(*root), "Root:Root ordered\n  Key=>Own:T\n");
+}
+
+TEST(ResTreeNode, InsertEntryWithoutMemoryChangesNothing) {
+    const auto root = MakeRootNode(true);
+    for (const bool isChild : {false, true}) {
+        for (int i = 0; i < 100; ++i) {
+            const std::string before = DumpTree(*root);
+            uint64_t failures = 0;
+            for (bool failed = true; failed;) {
+                failed = false;
+                auto child = std::make_unique<ResTreeNode>(u"N", u"T", false, noTable);
+                try {
+                    const support::AllocationFaultScope fault(failures + 1);
+                    if (isChild) {
+                        root->InsertEntry(root->End(), u"N", std::move(child));
+                    } else {
+                        root->InsertEntry(root->End(), u"K", TextEntry, u"text");
+                    }
+                } catch (const std::bad_alloc&) {
+                    failed = true;
+                    ++failures;
+                    ASSERT_EQ(DumpTree(*root), before);
+                }
+            }
+            EXPECT_GE(failures, 1u);
+            EXPECT_EQ(DumpTree(*root), before + (isChild ? "  N:T\n" : "  K=text\n"));
+        }
+    }
 }
 
 TEST(ResTreeNode, InsertEntrySortsInAnUnorderedNodeWhateverThePosition) {

@@ -121,5 +121,25 @@ TEST(ReservationsWithoutMemory, KeepManyOwners) {
     }
 }
 
+TEST(ReservationsWithoutMemory, KeepWhatIsHeldWhileTheTextCannotBeMade) {
+    const auto root = MakeRootNode();
+    root->ReserveOne(u"a", ReserveRead);
+    root->RemoveEntryByName(u"ZKHWReservation");
+    uint64_t failures = 0;
+    while (ReservationText(*root) == "(none)") {
+        ASSERT_LT(failures, 1000u);
+        try {
+            const support::AllocationFaultScope faults(failures + 1);
+            root->RefreshReservationProperty();
+        } catch (const std::bad_alloc&) {
+            ++failures;
+            EXPECT_EQ(ReservationText(*root), "(none)") << failures;
+            EXPECT_EQ(root->GetReservations().size(), 1u) << failures;
+        }
+    }
+    EXPECT_GT(failures, 0u);
+    EXPECT_EQ(ReservationText(*root), "a:=r");
+}
+
 }  // namespace
 }  // namespace zkhw

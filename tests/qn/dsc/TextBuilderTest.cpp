@@ -78,5 +78,26 @@ TEST(TextBuilder, WidensAscii) {
     }
 }
 
+TEST(TextBuilder, DecodesUtf8) {
+    for (size_t length = 0; length <= 300; length += length < 40 ? 1 : 20) {
+        TextBuilder builder;
+        builder.Append(u'<');
+        EXPECT_TRUE(builder.AppendUtf8(std::string(length, 'a')));
+        EXPECT_TRUE(builder.AppendUtf8(std::string(length, 'b') + "\xC3\xA4\xE6\x97\xA5"));
+        builder.Append(u'>');
+        EXPECT_EQ(builder.View(),
+                  u'<' + std::u16string(length, u'a') + std::u16string(length, u'b') + u"\u00E4\u65E5>");
+    }
+}
+
+TEST(TextBuilder, StaysAsItIsBesideBytesThatAreNoText) {
+    TextBuilder builder;
+    builder.Append(u"before");
+    for (const char* bytes : {"\xFF", "\xC3", "a\xF0\x9F\x98\x80", "\xC0\x80", "text that is long enough\x80"}) {
+        EXPECT_FALSE(builder.AppendUtf8(bytes));
+        EXPECT_EQ(builder.View(), u"before");
+    }
+}
+
 }  // namespace
 }  // namespace qn::dsc

@@ -24,8 +24,8 @@ struct StringHead {
     uint32_t byteLength;  // Without the NUL unit.
 };
 
-// Task memory aligns to 16 bytes only what is a multiple of them, and no empty block. 0 for a size that can't be rounded
-// up.
+// Task memory aligns to 16 bytes only what is a multiple of them, and no empty block. 0 for a size that can't be
+// rounded up.
 constexpr size_t RoundUp(size_t size) {
     return (size + 15) & ~size_t{15};
 }
