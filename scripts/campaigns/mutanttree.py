@@ -95,7 +95,8 @@ class Build:
         targets = ["zkfpga"]
         while True:
             done = subprocess.run(["ninja", "-C", self.folder, "-k", "0", "-j", str(jobs), *targets],
-                                  capture_output=True, text=True, check=False, env={**os.environ, "LC_ALL": "C"})
+                                  stdout=subprocess.PIPE, stderr=subprocess.STDOUT, text=True, check=False,
+                                  env={**os.environ, "LC_ALL": "C"})
             self.log.write_text(done.stdout, encoding="utf-8")
             if done.returncode == 0:
                 if targets == self.programs:
