@@ -17,6 +17,7 @@ import time
 PROGRAMS = ["qn_dsc_tests", "qn_dsc_call_tests", "hostbridge_tests", "restree_tests", "restree_memory_tests",
             "interfaces_tests", "interfaces_failure_tests", "cachebuilder_tests", "cachebuilder_failure_tests",
             "library_tests", "allocations_tests", "library_first_use_tests", "property_tests", "misuse_tests"]
+SHORT_PROGRAMS = ["restree_tests", "restree_memory_tests", "property_tests"]
 NEAREST = {"qn": "qn_dsc", "hostbridge": "hostbridge", "restree": "restree", "interfaces": "interfaces",
            "cachebuilder": "cachebuilder"}
 # Tests that take longer, in seconds of the processor, are asked last.
