@@ -122,10 +122,9 @@ std::u16string Tree::DisplayPathOf(Node& node) {
         return u"/";
     }
     const Entry* display = Find(node, u"DisplayName");
-    const String text(display == nullptr ? u"" : std::u16string_view(display->text));
     const bool isGiven = display != nullptr && IsText(*display);
-    return Plain(
-        zkhw::JoinDisplayPath(String(DisplayPathOf(*node.parent)), String(node.name), isGiven ? &text : nullptr));
+    const auto shown = isGiven ? std::optional<std::u16string_view>(display->text) : std::nullopt;
+    return Plain(zkhw::JoinDisplayPath(String(DisplayPathOf(*node.parent)), String(node.name), shown));
 }
 
 bool Tree::Supports(Node& node, std::u16string_view type) {

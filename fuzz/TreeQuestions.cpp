@@ -105,9 +105,8 @@ void CollectDescendants(Node& node, std::u16string_view type, std::vector<Node*>
 
 std::u16string JoinDisplay(const std::u16string& parent, Node& node) {
     const Entry* display = Property(node, u"DisplayName");
-    const String text(display == nullptr ? u"" : std::u16string_view(display->text));
-    return std::u16string(
-        zkhw::JoinDisplayPath(String(parent), String(node.name), display == nullptr ? nullptr : &text).View());
+    const auto shown = display == nullptr ? std::nullopt : std::optional<std::u16string_view>(display->text);
+    return std::u16string(zkhw::JoinDisplayPath(String(parent), String(node.name), shown).View());
 }
 
 std::u16string Join(const std::u16string& parent, const std::u16string& name) {

@@ -27,7 +27,7 @@ TWO = f"{BELOW}/two/two_resource.xml"
 PARTS = f"{BELOW}/more/parts_resource.xml"  # "more" is a link to a folder elsewhere.
 
 # "One" takes two of the kept properties from an included file that is longer than a block: the first stands in its
-# first block, the second in its second.
+# first block, the second in its second. "Two" has its family, and so its menus, from a prototype.
 FILES = {
     "Zarvik.exe": b"MZ",
     HOSTS: b'<FPGAHostSet><HostA>1</HostA></FPGAHostSet>',
@@ -38,7 +38,8 @@ FILES = {
          b'<Pin names="P[i=0..1]"><Label>#{name} #{i}</Label></Pin><:Link name="L">P1</:Link></Target>',
     PINS: b"<Pins><DeviceIDs>1,2</DeviceIDs><Filler>" + b"x" * BLOCK +
           b"</Filler><FPGAItemSubType>Board</FPGAItemSubType></Pins>",
-    TWO: b'<Target name="Two"><FPGACompilation><DeviceFamily>spartan6</DeviceFamily></FPGACompilation></Target>',
+    TWO: b'<Target name="Two"><Family><DeviceFamily>spartan6</DeviceFamily></Family>'
+         b'<FPGACompilation prototype="Family"><x/></FPGACompilation></Target>',
     "Elsewhere/parts_resource.xml": b'<Parts><Part name="P"><Size>3</Size></Part></Parts>',
     "Menus/V5/a.menu": b"a" * (BLOCK + 100),
     "Menus/V5/deep/b.menu": b"menu b",
