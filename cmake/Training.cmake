@@ -51,9 +51,14 @@ add_custom_command(
   VERBATIM)
 add_custom_target(zkfpga_train DEPENDS ${training_stamp})
 
-# What the run didn't reach is compiled as it would be without it.
+# What the run didn't reach is compiled as it would be without it. The objects hold what optimisation at link time needs
+# beside their code: programs with the property ZKFPGA_LINK_TIME_OPTIMIZATION are made from the one, all others, which
+# are many and of no hurry, from the other. At link time a program is one piece that could have data of other libraries
+# copied into itself, and would export them then; -mno-direct-extern-access leaves them where they are.
 get_target_property(trained_sources zkfpga SOURCES)
 set_source_files_properties(${trained_sources} TARGET_DIRECTORY zkfpga PROPERTIES
-  COMPILE_OPTIONS "-O3;-fprofile-use;-fprofile-partial-training;-Wno-missing-profile"
+  COMPILE_OPTIONS "-O3;-flto;-ffat-lto-objects;-fprofile-use;-fprofile-partial-training;-Wno-missing-profile"
   OBJECT_DEPENDS ${training_stamp})
 add_dependencies(zkfpga zkfpga_train)
+target_link_options(zkfpga INTERFACE
+  "$<IF:$<BOOL:$<TARGET_PROPERTY:ZKFPGA_LINK_TIME_OPTIMIZATION>>,-flto=auto;-mno-direct-extern-access,-fno-lto>")
