@@ -54,7 +54,7 @@ void SourceLists::Add(ResTreeNode& node, const String& file) {
     if (list.pieces.contains(ToUpper(file.View()))) {
         return;
     }
-    String& text = entry->EditText();
+    String& text = node.EditEntryText(*entry);
     const bool joinsTheLast = EndsInEscape(text.View());
     text.Append(u",");
     text.Append(file);

@@ -93,7 +93,7 @@ void ElementReader::AppendTagToXmlValue() {
     if (!frame.position->IsText()) {
         return;
     }
-    String& value = frame.position->EditText();
+    String& value = node.EditEntryText(*frame.position);
     ++frame.xmlDepth;
     value.Append(u"<");
     value.Append(frame.pendingName.Text());
@@ -240,9 +240,12 @@ void ElementReader::ReadValueText(bool isPath, TextBuilder& value) {
 
 void ElementReader::MakeOrdinaryValue(std::u16string_view text, bool isReferenceList) {
     TextBuilder expanded;
+    // What is done to the text behind the expansion brings in none.
+    bool holdsVariables = false;
     if (const size_t open = FindVariable(text); open != std::u16string_view::npos) {
         ExpandVariables(text, CollectParameters(stack), expanded, open);
         text = expanded.View();
+        holdsVariables = FindVariable(text) != std::u16string_view::npos;
     }
     String rebased = String::WithoutBuffer();
     if (isReferenceList) {
@@ -252,14 +255,15 @@ void ElementReader::MakeOrdinaryValue(std::u16string_view text, bool isReference
         text = rebased.View();
     }
     if (Attributes().IsTrue(AttributeName::Localize)) {
-        StoreText(LocalizeText(text).View(), LocalizedTextEntry);
+        StoreText(LocalizeText(text).View(), LocalizedTextEntry, holdsVariables);
     } else {
-        StoreText(text, TextEntry);
+        StoreText(text, TextEntry, holdsVariables);
     }
 }
 
-void ElementReader::StoreText(std::u16string_view text, EntryKind kind) {
-    const ResTreeNode::Added added = node.AddTextEntry(frame.pendingName.Text(), text, kind, Before());
+void ElementReader::StoreText(std::u16string_view text, EntryKind kind, bool holdsVariables) {
+    const ResTreeNode::Added added =
+        node.AddText(frame.pendingName.Text(), text, kind, PropertyAdded, Before(), holdsVariables);
     frame.position = added.entry;
     if (!added.isNew && frame.mergeExisting && node.SetEntryText(added.entry, text) && kind == LocalizedTextEntry) {
         added.entry->SetTextKind(LocalizedTextEntry);

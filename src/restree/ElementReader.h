@@ -36,7 +36,7 @@ class ElementReader {
     void MakeValue(String&& entryName);
     void ReadValueText(bool isPath, TextBuilder& value);
     void MakeOrdinaryValue(std::u16string_view text, bool isReferenceList);
-    void StoreText(std::u16string_view text, EntryKind kind);
+    void StoreText(std::u16string_view text, EntryKind kind, bool holdsVariables);
     void MakeLink(String&& entryName, std::u16string_view text);
     void Include(const String& text);
     void IncludeFile(const String& text);

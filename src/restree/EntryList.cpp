@@ -306,6 +306,32 @@ void EntryList::RemoveFromIndex(const NodeEntry* entry) noexcept {
     }
 }
 
+void EntryList::NoteVariables(const NodeEntry* entry) noexcept {
+    if (!IsLong()) {
+        return;
+    }
+    if (entry == nullptr) {
+        longForm->pieces.SetAllMayHoldVariables();
+    } else {
+        longForm->pieces.SetMayHoldVariables(entry);
+    }
+}
+
+EntryPosition EntryList::SkipWithoutVariables(EntryPosition position) const {
+    if (IsLong()) {
+        while (!position.IsEnd() && !longForm->pieces.MayHoldVariables(position.piece)) {
+            position = longForm->pieces.NextPiece(position.piece);
+        }
+    }
+    return position;
+}
+
+void EntryList::ForgetVariables(EntryPosition position) noexcept {
+    if (IsLong()) {
+        longForm->pieces.SetMayHoldVariables(position.piece, false);
+    }
+}
+
 void EntryList::DropIndex() noexcept {
     if (IsLong()) {
         longForm->index.reset();

@@ -102,6 +102,18 @@ class EntryList {
     // behind NodeEntry::OwnKey.
     void AssignKey(NodeEntry* entry, String&& key) noexcept;
 
+    // Where "#{" may stand in the texts of the entries, or below them: a long list notes it for each of its pieces, so
+    // that a walk over many entries finds the few that have any.
+
+    // Notes it for the piece of an entry of this list, and for all if that is null.
+    void NoteVariables(const NodeEntry* entry) noexcept;
+    // Whether it makes a difference which entry is given to NoteVariables.
+    bool TellsVariablesApart() const { return IsLong(); }
+    // `position`, or where the next piece begins that may hold any. The end if there is none.
+    EntryPosition SkipWithoutVariables(EntryPosition position) const;
+    // Ends the note for the piece that `position` is in.
+    void ForgetVariables(EntryPosition position) noexcept;
+
     // Forgets the index of the keys. Worth doing ahead of a removal of very many entries.
     void DropIndex() noexcept;
 

@@ -29,10 +29,7 @@ EntryPosition EntryPieces::Next(EntryPosition position) const {
     if (++position.slot < pieces[position.piece]->count) {
         return position;
     }
-    if (++position.piece < pieces.size()) {
-        return {position.piece, 0};
-    }
-    return {};
+    return NextPiece(position.piece);
 }
 
 uint32_t EntryPieces::IndexOf(EntryPosition position) const {
@@ -133,6 +130,12 @@ EntryPosition EntryPieces::Insert(EntryPosition position, NodeEntry* entry) {
     return position;
 }
 
+void EntryPieces::SetAllMayHoldVariables() {
+    for (EntryPiece* piece : pieces) {
+        piece->mayHoldVariables = true;
+    }
+}
+
 EntryPosition EntryPieces::Erase(EntryPosition position) noexcept {
     EntryPiece* piece = pieces[position.piece];
     if (marksEntries) {
@@ -152,7 +155,7 @@ EntryPosition EntryPieces::Erase(EntryPosition position) noexcept {
     if (position.slot < piece->count) {
         return position;
     }
-    return position.piece + 1 < pieces.size() ? EntryPosition{position.piece + 1, 0} : EntryPosition{};
+    return NextPiece(position.piece);
 }
 
 }  // namespace zkhw

@@ -31,6 +31,8 @@ struct EntryPiece {
     uint32_t ordinal = 0;  // Index of this piece in its sequence.
     uint32_t number = 0;   // By which its entries know it, from 1; it stays while pieces come and go before this one.
     uint32_t count = 0;    // 1 to capacity: an empty piece is dropped.
+    // Whether what a list has noted of its entries may hold in this piece (EntryList.h).
+    bool mayHoldVariables = true;
     NodeEntry* items[capacity];
 };
 
@@ -45,6 +47,10 @@ class EntryPieces {
     EntryPosition Begin() const { return pieces.empty() ? EntryPosition{} : EntryPosition{0, 0}; }
     EntryPosition Last() const;
     EntryPosition Next(EntryPosition position) const;
+    // Where the piece behind that at `piece` begins; the end if that is the last.
+    EntryPosition NextPiece(uint32_t piece) const {
+        return piece + 1 < pieces.size() ? EntryPosition{piece + 1, 0} : EntryPosition{};
+    }
     NodeEntry* At(EntryPosition position) const { return pieces[position.piece]->items[position.slot]; }
     bool IsValid(EntryPosition position) const {
         return position.piece < pieces.size() && position.slot < pieces[position.piece]->count;
@@ -69,6 +75,13 @@ class EntryPieces {
 
     // Takes the entry out; gives the position of the one that followed it.
     EntryPosition Erase(EntryPosition position) noexcept;
+
+    // What is noted of each piece; of a new one, and of one that was split off, that it may hold variables. By the
+    // piece's place, and by an entry of this marking sequence.
+    bool MayHoldVariables(uint32_t piece) const { return pieces[piece]->mayHoldVariables; }
+    void SetMayHoldVariables(uint32_t piece, bool mayHold) { pieces[piece]->mayHoldVariables = mayHold; }
+    void SetMayHoldVariables(const NodeEntry* entry) { numbered[entry->pieceNumber - 1]->mayHoldVariables = true; }
+    void SetAllMayHoldVariables();
 
   private:
     EntryPiece* AddPiece(uint32_t ordinal);

@@ -55,7 +55,8 @@ class NodeEntry {
     std::optional<std::u16string_view> Text() const { return IsText() ? std::optional(Payload()) : std::nullopt; }
 
     // Assigns the text of a text entry; `text` may be a part of the entry's own. Throws bad_alloc, and OutOfRange for
-    // a text that no String can hold; then nothing has changed.
+    // a text that no String can hold; then nothing has changed. A node has to hear of what is written into its texts
+    // (ResTreeNode::NoteVariables); the same holds for EditText.
     void SetText(std::u16string_view text);
 
     // The text of a text entry in a form that can be changed in place, and grows in linear time. It costs memory, so

@@ -3,10 +3,6 @@
 #include "qn/dsc/FindUnit.h"
 #include "qn/dsc/osdep/Compare.h"
 #include "qn/dsc/osdep/IntegerToString.h"
-#include "restree/EntryWalk.h"
-#include "restree/LevelStack.h"
-#include "restree/ReleaseScope.h"
-#include "restree/ResTreeNode.h"
 #include "restree/TextList.h"
 
 namespace zkhw {
@@ -86,39 +82,6 @@ void ExpandVariables(std::u16string_view text, const Parameters& parameters, Tex
         open = FindOpenMark(text, done);
     }
     result.Append(text.substr(done));
-}
-
-// --- Expansion in a subtree ---
-
-void ResTreeNode::ApplyParameters(const Parameters& parameters) {
-    struct Level {
-        ResTreeNode* node;
-        EntryWalk walk;
-    };
-    const ReleaseScope scope;
-    LevelStack<Level> levels;
-    EnsureDeferredLoaded();
-    levels.Push({this, {}});
-    while (!levels.IsEmpty()) {
-        Level& level = levels.Top();
-        NodeEntry* entry = level.walk.Next(level.node->entries);
-        if (entry == nullptr) {
-            levels.Pop();
-        } else if (const auto text = entry->Text()) {
-            if (const size_t open = FindVariable(*text); open != std::u16string_view::npos) {
-                TextBuilder expanded;
-                ExpandVariables(*text, parameters, expanded, open);
-                level.node->SetEntryText(entry, expanded.View());
-            }
-        } else if (ResTreeNode* child = entry->Child()) {
-            child->EnsureDeferredLoaded();
-            levels.Push({child, {}});
-        }
-    }
-}
-
-void ResTreeNode::ApplyInstance(std::u16string_view instanceName, std::u16string_view variable, int32_t index) {
-    ApplyParameters(InstanceParameters(instanceName, variable, index));
 }
 
 }  // namespace zkhw

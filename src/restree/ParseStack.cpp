@@ -113,7 +113,7 @@ void ParseStack::FinishElement(const char* name) {
     }
     if (frame->position != nullptr) {
         if (frame->position->IsText() && frame->xmlDepth > 1) {
-            String& value = frame->position->EditText();
+            String& value = frame->node->EditEntryText(*frame->position);
             value.Append(u"</");
             value.Append(Widen(name));
             value.Append(u">");

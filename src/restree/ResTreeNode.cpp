@@ -7,6 +7,7 @@
 #include "qn/dsc/osdep/Compare.h"
 #include "qn/dsc/osdep/TaskMemory.h"
 #include "restree/NodeAttachments.h"
+#include "restree/Parameters.h"
 #include "restree/ReleaseScope.h"
 #include "restree/TextList.h"
 
@@ -154,6 +155,9 @@ bool ResTreeNode::SetEntryText(NodeEntry* entry, std::u16string_view value) {
         return false;
     }
     entry->SetText(value);
+    if (FindVariable(value) != std::u16string_view::npos) {
+        NoteVariables(entry);
+    }
     RaiseTextChange(*entry);
     return true;
 }
@@ -181,7 +185,7 @@ EntryPosition ResTreeNode::PositionBefore(const String* before) {
     return entry == nullptr ? EntryList::End() : entries.Locate(entry);
 }
 
-ResTreeNode::Added ResTreeNode::Store(EntryPosition position, NodeEntry* entry, uint32_t change) {
+ResTreeNode::Added ResTreeNode::Store(EntryPosition position, NodeEntry* entry, uint32_t change, bool holdsVariables) {
     try {
         entries.Insert(position, entry);
     } catch (...) {
@@ -190,21 +194,25 @@ ResTreeNode::Added ResTreeNode::Store(EntryPosition position, NodeEntry* entry, 
         throw;
     }
     NoteKey(*entry);
+    if (holdsVariables) {
+        NoteVariables(entry);
+    }
     Raise(change);
     return {entry, true};
 }
 
 ResTreeNode::Added ResTreeNode::AddTextEntry(std::u16string_view key, std::u16string_view value, EntryKind kind,
                                              const String* before) {
-    return AddText(key, value, kind, PropertyAdded, before);
+    const bool holdsVariables = FindVariable(value) != std::u16string_view::npos;
+    return AddText(key, value, kind, PropertyAdded, before, holdsVariables);
 }
 
 ResTreeNode::Added ResTreeNode::AddLinkEntry(std::u16string_view key, std::u16string_view path, const String* before) {
-    return AddText(key, path, LinkEntry, ChildAdded, before);
+    return AddText(key, path, LinkEntry, ChildAdded, before, false);
 }
 
 ResTreeNode::Added ResTreeNode::AddText(HashedKey key, std::u16string_view text, EntryKind kind, uint32_t change,
-                                        const String* before) {
+                                        const String* before, bool holdsVariables) {
     EntryPosition position = PositionBefore(before);
     if (!IsOrdered()) {
         const EntryList::Place place = entries.FindPlace(key);
@@ -213,7 +221,7 @@ ResTreeNode::Added ResTreeNode::AddText(HashedKey key, std::u16string_view text,
         }
         position = place.position;
     }
-    return Store(position, NodeEntry::MakeText(key, kind, text), change);
+    return Store(position, NodeEntry::MakeText(key, kind, text), change, holdsVariables);
 }
 
 ResTreeNode::Added ResTreeNode::AddChildEntry(std::u16string_view key, std::u16string_view childType, bool childOrdered,
@@ -240,7 +248,7 @@ ResTreeNode::Added ResTreeNode::MakeChildAt(EntryPosition position, uint8_t keyH
     auto made = std::make_unique<ResTreeNode>(std::move(childTexts), childOrdered, this);
     NodeEntry* entry = NodeEntry::MakeChild(made->texts, keyHash, made.get());
     child = made.release();
-    return Store(position, entry, ChildAdded);
+    return Store(position, entry, ChildAdded, false);
 }
 
 // RemoveIfMismatched and AddChildEntry in one, with one search where one is enough.
@@ -281,6 +289,9 @@ EntryIterator ResTreeNode::InsertEntry(EntryIterator position, std::u16string_vi
         throw;
     }
     NoteKey(*entry);
+    if (entry->IsText() && FindVariable(text) != std::u16string_view::npos) {
+        NoteVariables(entry);
+    }
     return {entries, entries.Locate(entry)};
 }
 
@@ -298,6 +309,9 @@ EntryIterator ResTreeNode::InsertEntry(EntryIterator position, std::u16string_vi
     }
     child->parent = this;
     NoteKey(*entry);
+    if (child->mayHoldVariables) {
+        NoteVariables(entry);
+    }
     if (child.release()->mayBeDeferred) {
         NoteDeferredContents();
     }
@@ -328,6 +342,9 @@ bool ResTreeNode::RenameEntry(std::u16string_view oldKey, std::u16string_view ne
     entries.Insert(place.position, entry);
     lost.pop_back();
     NoteKey(*entry);
+    if (mayHoldVariables) {
+        entries.NoteVariables(entry);
+    }
     return true;
 }
 

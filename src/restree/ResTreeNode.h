@@ -126,6 +126,12 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     bool SetEntryText(EntryIterator iterator, std::u16string_view value);
     bool SetEntryText(NodeEntry* entry, std::u16string_view value);
 
+    // The text of a text entry of this node, for changes in place (NodeEntry::EditText), which raise nothing.
+    String& EditEntryText(NodeEntry& entry) {
+        NoteVariables(&entry);
+        return entry.EditText();
+    }
+
     // Add an entry in front of `before`, or at the end if that is null or not to be found. An unordered node that has
     // the key already makes nothing and gives what is there; an ordered node always makes a new entry. Looking for
     // `before` may load: the other texts must outlive that.
@@ -342,7 +348,7 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     // if at least one was read. Failures are silent, but for the reports of a file that isn't well formed.
     bool EnsureDeferredLoaded();
 
-    // Expands "#{name}" in all texts of the subtree, after deferred loads.
+    // Expands "#{name}" in all texts of the subtree, after deferred loads. Takes no time for a subtree without "#{".
     void ApplyParameters(const Parameters& parameters);
 
     // ApplyParameters with "name" and, unless `variable` is empty, the loop variable.
@@ -355,14 +361,17 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     friend class ReservationWalk;
     static constexpr HashedKey deferredPathKey{u":DeferredLoadPath"};
     struct Attachments;
+    struct ExpansionWalk;
     struct MergeWalk;
 
     Attachments& GetAttachments();
-    Added Store(EntryPosition position, NodeEntry* entry, uint32_t change);
+    Added Store(EntryPosition position, NodeEntry* entry, uint32_t change, bool holdsVariables);
     void RaiseTextChange(const NodeEntry& entry);
     EntryPosition PositionBefore(const String* before);
     EntryPosition PlaceInFront(std::u16string_view key) const;
-    Added AddText(HashedKey key, std::u16string_view text, EntryKind kind, uint32_t change, const String* before);
+    // AddTextEntry or AddLinkEntry, for who knows whether there is "#{" in the text.
+    Added AddText(HashedKey key, std::u16string_view text, EntryKind kind, uint32_t change, const String* before,
+                  bool holdsVariables);
     Added AddChildAt(EntryPosition position, HashedKey hashed, NameAndType&& childTexts, bool childOrdered,
                      ResTreeNode*& child);
     Added ReplaceChild(bool unconditional, NameAndType&& childTexts, uint8_t keyHash, bool childOrdered,
@@ -424,6 +433,11 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     }
     void NoteUnusualKey(const NodeEntry& entry);
     void NoteDeferredContents();
+
+    // "#{" may stand in the text of `entry`, or below it; null stands for any entry. Has to be called for each text
+    // that has one, as long as it stands in this node. Mostly one test.
+    void NoteVariables(const NodeEntry* entry) noexcept;
+    const NodeEntry* EntryOfChild(const ResTreeNode& child) const noexcept;
     bool HasDeferredContents() const;
     bool TakeDeferredPaths(std::vector<String>& paths);
 
@@ -434,6 +448,7 @@ class ResTreeNode : public ResTreeNodeChangeObserver {
     bool isDefunct : 1 = false;                // Torn down; only the memory is left (ReleaseScope).
     bool isKept : 1 = false;                   // Has left its tree, whole or torn down, and is kept by a ReleaseScope.
     bool mayBeDeferred : 1 = false;            // Here or below there is, or has been, an entry ":DeferredLoadPath".
+    bool mayHoldVariables : 1 = false;         // Here or below "#{" may stand in a text.
     std::unique_ptr<Attachments> attachments;  // What few nodes have: a type table, observers.
     uint32_t pendingChanges = 0;               // Raised and not yet delivered: ChangeFlags, and what a host adds.
     uint32_t suspendCount = 0;                 // Nonzero while delivery is held back.

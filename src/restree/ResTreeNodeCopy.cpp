@@ -50,7 +50,7 @@ struct ResTreeNode::MergeWalk {
         }
     }
     void MergeText(Level& level, const NodeEntry& entry);
-    void StoreText(Level& level, const NodeEntry& entry, std::u16string_view text);
+    void StoreText(Level& level, const NodeEntry& entry, std::u16string_view text, bool holdsVariables);
     void MergeLink(Level& level, const NodeEntry& entry);
 
     const ReleaseScope scope;
@@ -82,30 +82,32 @@ void ResTreeNode::MergeWalk::Run() {
 
 void ResTreeNode::MergeWalk::MergeText(Level& level, const NodeEntry& entry) {
     const std::u16string_view text = *entry.Text();
-    const size_t open = parameters == nullptr ? std::u16string_view::npos : FindVariable(text);
-    if (open == std::u16string_view::npos) {
-        StoreText(level, entry, text);
+    const size_t open = level.source->mayHoldVariables ? FindVariable(text) : std::u16string_view::npos;
+    const bool holdsVariables = open != std::u16string_view::npos;
+    if (parameters == nullptr || !holdsVariables) {
+        StoreText(level, entry, text, holdsVariables);
         return;
     }
     TextBuilder expanded;
     ExpandVariables(text, *parameters, expanded, open);
-    StoreText(level, entry, expanded.View());
+    StoreText(level, entry, expanded.View(), FindVariable(expanded.View()) != std::u16string_view::npos);
     if (level.target == top) {
         // Nobody hears of nodes that are just being made, but the node that holds the new one may gather its changes.
         top->RaiseTextChange(entry);
     }
 }
 
-void ResTreeNode::MergeWalk::StoreText(Level& level, const NodeEntry& entry, std::u16string_view text) {
+void ResTreeNode::MergeWalk::StoreText(Level& level, const NodeEntry& entry, std::u16string_view text,
+                                       bool holdsVariables) {
     ResTreeNode& target = *level.target;
     const HashedKey key(entry.Key(), entry.KeyHash());
     if (level.copiedInOrder == target.entries.Size()) {
         // The search would end at the end.
         ++level.copiedInOrder;
-        target.Store(EntryList::End(), NodeEntry::MakeText(key, entry.Kind(), text), PropertyAdded);
+        target.Store(EntryList::End(), NodeEntry::MakeText(key, entry.Kind(), text), PropertyAdded, holdsVariables);
         return;
     }
-    const Added added = target.AddText(key, text, entry.Kind(), PropertyAdded, nullptr);
+    const Added added = target.AddText(key, text, entry.Kind(), PropertyAdded, nullptr, holdsVariables);
     if (!added.isNew && overwrite) {
         target.SetEntryText(added.entry, text);
     }

@@ -183,7 +183,7 @@ void ResTreeNode::ReportParseError(const ParseStack& stack, const NarrowString* 
         AddTextEntry(parseErrorsKey, report.View(), TextEntry);
     } else if (entry->IsText()) {
         // In place: with many reports a copy of them all for each would take quadratic time.
-        entry->EditText().Append(report);
+        EditEntryText(*entry).Append(report);
         Raise(PropertyChanged);
     }
 }

@@ -154,6 +154,7 @@ void ResTreeNode::MirrorReservations() {
         list->NoteWritten(*AddTextEntry(reservationKey, list->Text().View(), TextEntry).entry);
     } else if (entry->IsText()) {
         list->WriteTo(*entry);
+        NoteVariables(entry);  // An owner may have any name.
         Raise(PropertyChanged);
     }
 }
