@@ -9,6 +9,7 @@
 #include "FuzzInput.h"
 #include "TreeLaws.h"
 #include "qn/dsc/osdep/Compare.h"
+#include "restree/Parameters.h"
 #include "restree/ResTreeNode.h"
 
 namespace {
@@ -70,6 +71,16 @@ class Model {
         }
     }
 
+    // A value that asks for a parameter is "#{...}" and nothing else.
+    void Expand(const std::u16string& parameter) {
+        for (auto& item : items) {
+            std::u16string& value = item.second;
+            if (value.starts_with(u"#{") && Compare(value.substr(2, value.size() - 3), parameter) == 0) {
+                value = u"expanded";
+            }
+        }
+    }
+
     std::vector<std::pair<std::u16string, std::u16string>> items;
     const bool ordered;
 };
@@ -80,6 +91,12 @@ std::u16string ShortKey(uint8_t number) {
         key.push_back(static_cast<char16_t>(u'0' + number % 10));
     }
     return key;
+}
+
+void Expand(ResTreeNode& node, const std::u16string& parameter) {
+    zkhw::ParameterMap values;
+    values.emplace(parameter, u"expanded");
+    node.ApplyParameters(zkhw::MapParameters(std::move(values)));
 }
 
 void Same(ResTreeNode& node, const Model& model) {
@@ -104,6 +121,17 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
         const uint8_t operation = input.TakeByte();
         const std::u16string key = ShortKey(input.TakeByte());
         const std::u16string other = ShortKey(input.TakeByte());
+        if (operation >= 0xE0) {
+            if (operation % 2 == 0) {
+                const std::u16string value = u"#{" + other + u"}";
+                node.SetProperty(key, value);
+                model.Set(key, value);
+            } else {
+                Expand(node, key);
+                model.Expand(key);
+            }
+            continue;
+        }
         switch (operation % 7) {
             case 0: {
                 const bool isNew = node.AddTextEntry(key, other, zkhw::TextEntry).isNew;

@@ -123,7 +123,7 @@ class Installation:
         self.tool = self.root / BELOW / "Utilities" / TOOL_NAME
         self.host = self.root / "browse"  # Where a host's program goes, for those who want one.
         self.tool.parent.mkdir()
-        shutil.copy(FindTool(), self.tool)
+        CopyProgram(FindTool(), self.tool)
         self.Reset()
 
     def __enter__(self):
@@ -178,6 +178,12 @@ class Installation:
     def Run(self, before=(), **options):
         """Runs the tool, behind the command `before`, and gives its end: "exit 5", "SIGTRAP"."""
         return Run([*before, str(self.tool)], **options)
+
+
+def CopyProgram(source, target):
+    """By a process of its own: what another thread starts meanwhile would inherit a file that is open here for writing,
+    and as long as anybody has it open so the copy can't be run."""
+    subprocess.run(["cp", source, target], check=True)
 
 
 def NoCoreFiles():

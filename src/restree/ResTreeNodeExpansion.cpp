@@ -113,21 +113,21 @@ void ResTreeNode::ExpansionWalk::Leave() {
 
 // Null at the end.
 NodeEntry* ResTreeNode::ExpansionWalk::Next(Level& level) {
-    EntryList& entries = level.node->entries;
+    EntryList& list = level.node->entries;
     const EntryPosition previous = level.position;
     const bool isFirst = level.last == nullptr;
-    level.position = isFirst ? entries.Begin() : entries.Following(previous, level.last);
+    level.position = isFirst ? list.Begin() : list.Following(previous, level.last);
     if (IsUndisturbed(level)) {
         if (!isFirst && level.position.piece != previous.piece) {
             if (!level.pieceKeepsVariables) {
-                entries.ForgetVariables(previous);
+                list.ForgetVariables(previous);
             }
             level.keepsVariables |= level.pieceKeepsVariables;
             level.pieceKeepsVariables = false;
         }
-        level.position = entries.SkipWithoutVariables(level.position);
+        level.position = list.SkipWithoutVariables(level.position);
     }
-    level.last = level.position.IsEnd() ? nullptr : entries.At(level.position);
+    level.last = level.position.IsEnd() ? nullptr : list.At(level.position);
     return level.last;
 }
 

@@ -27,12 +27,12 @@ namespace {
 // What is asked before memory comes back isn't turned into anything until then.
 class Question {
   public:
-    Question(void* module, const char* path) : path(path), widePath(path) {
-        void* const address = qn::dsc::osdep::FindInModule(module, "HostNewHandleClear");
-        decltype(&::HostNewHandleClear) newHandle = nullptr;
-        std::memcpy(&newHandle, &address, sizeof newHandle);
-        handle = newHandle(sizeof(int32_t));
+    Question(void* module, const char* path) : module(module), path(path), widePath(path) {
+        handle = Find<decltype(&::HostNewHandleClear)>("HostNewHandleClear")(sizeof(int32_t));
     }
+    Question(const Question&) = delete;
+    Question& operator=(const Question&) = delete;
+    ~Question() { Find<decltype(&::HostDisposeHandle)>("HostDisposeHandle")(handle); }
 
     void AskByName() { result = FPGAResTree_GetProperty("", path, "", handle, &found); }
 
@@ -65,6 +65,15 @@ class Question {
     }
 
   private:
+    template <typename Function>
+    Function Find(const char* name) const {
+        void* const address = qn::dsc::osdep::FindInModule(module, name);
+        Function function = nullptr;
+        std::memcpy(&function, &address, sizeof function);
+        return function;
+    }
+
+    void* module;
     const char* path;
     qn::dsc::String widePath;
     ZkStringHandle handle;
