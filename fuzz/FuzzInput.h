@@ -2,6 +2,7 @@
 
 // What the fuzz targets share: the input taken apart into numbers and texts, and the end of a run that broke a law.
 
+#include <algorithm>
 #include <cstddef>
 #include <cstdint>
 #include <cstdio>
@@ -37,14 +38,9 @@ class Input {
 
     // The bytes up to the next line feed, which is dropped, or to the end of the input.
     std::string TakeLine() {
-        std::string line;
-        while (!IsEmpty()) {
-            const uint8_t byte = TakeByte();
-            if (byte == '\n') {
-                break;
-            }
-            line.push_back(static_cast<char>(byte));
-        }
+        const uint8_t* const lineEnd = std::find(cursor, end, uint8_t{'\n'});
+        std::string line(cursor, lineEnd);
+        cursor = lineEnd == end ? end : lineEnd + 1;
         return line;
     }
 
