@@ -2,10 +2,12 @@
 
 #include <benchmark/benchmark.h>
 
+#include <string>
 #include <string_view>
 #include <utility>
 
 #include "restree/Parameters.h"
+#include "restree/ResTreeNode.h"
 
 namespace {
 
@@ -41,5 +43,23 @@ void ExpandFromAMap(benchmark::State& state) {
     }
 }
 BENCHMARK(ExpandFromAMap);
+
+// A node of so many nodes, of which one has a text to expand: what each of many includes asks for. Time must hardly
+// grow with the size.
+void ExpandOneOfMany(benchmark::State& state) {
+    zkhw::ResTreeNode root(u"Root", u"Root", true);
+    zkhw::ResTreeNode* child = nullptr;
+    for (int64_t i = 0; i < state.range(0); ++i) {
+        const std::string name = "Line" + std::to_string(i);
+        root.AddChildEntry(std::u16string(name.begin(), name.end()), u"Line", false, child);
+        child->SetProperty(u"Label", i % 100 == 0 ? u"#{name}" : u"label");
+    }
+    root.ApplyInstance(u"name", u"", 0);
+    for (auto round : state) {
+        child->SetProperty(u"Label", u"#{name} of port 17");
+        root.ApplyInstance(u"name", u"", 0);
+    }
+}
+BENCHMARK(ExpandOneOfMany)->Arg(100)->Arg(10000)->Arg(100000);
 
 }  // namespace
