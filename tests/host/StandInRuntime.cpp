@@ -157,6 +157,8 @@ EXPORTED void HostGetLanguageName(unsigned char* buffer) {
     const std::string& language = standInRuntime.language;
     buffer[0] = static_cast<unsigned char>(language.size());
     std::memcpy(buffer + 1, language.data(), buffer[0]);
+    const std::string& further = standInRuntime.behindTheLanguage;
+    std::memcpy(buffer + 1 + buffer[0], further.data(), std::min<size_t>(further.size(), 255U - buffer[0]));
 }
 
 EXPORTED HRESULT QueryInterfaceForZKRefNum(uint32_t refNum, GUID interfaceId, void** result) {

@@ -46,6 +46,7 @@ struct StandInRuntime {
 
     // Answers. A special directory that isn't set fails with code 7.
     std::string language = "English";
+    std::string behindTheLanguage;  // What else is put into the buffer of the name.
     std::map<int32_t, std::string> specialDirectories;
     std::map<int32_t, std::string> errorTexts;
     ErrorText errorTextAnswer = ErrorText::AsKnown;

@@ -46,6 +46,15 @@ TEST(ResourceLanguage, NameMayHave255Bytes) {
     EXPECT_IN_CHILD([] { return LanguageOfHost(std::string(255, 'x')) == "eng"; });
 }
 
+TEST(ResourceLanguage, WhatStandsBehindTheNameDoesNotCount) {
+    EXPECT_IN_CHILD([] {
+        StandInRuntime& runtime = LoadStandInRuntime();
+        runtime.language = "Japanese";
+        runtime.behindTheLanguage = "Chinese";
+        return ExactText(GetResourceLanguage()) == "jpn";
+    });
+}
+
 TEST(ResourceLanguage, IsAskedForOnce) {
     EXPECT_IN_CHILD([] {
         StandInRuntime& runtime = LoadStandInRuntime();

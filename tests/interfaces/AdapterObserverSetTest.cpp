@@ -234,6 +234,19 @@ TEST_F(AdapterObserverSetTest, UnadviseWithAllOnesEndsAllIdsOfTheObserverAtTheNo
     EXPECT_EQ(other.Take(), "other: PropertyAdded #7\n");
 }
 
+TEST_F(AdapterObserverSetTest, UnadviseWithAllOnesFindsEachOfTwoObservers) {
+    const View view = tree.At(u"a");
+    for (const bool otherFirst : {false, true}) {
+        view->Advise(&observer, all, 7);
+        view->Advise(&other, all, 7);
+        EXPECT_EQ(view->Unadvise(otherFirst ? &other : &observer, all, 0), S_OK);
+        EXPECT_EQ(observer.References(), otherFirst ? 1 : 0);
+        EXPECT_EQ(other.References(), otherFirst ? 0 : 1);
+        EXPECT_EQ(view->Unadvise(otherFirst ? &observer : &other, all, 0), S_OK);
+        EXPECT_EQ(observer.References() + other.References(), 0);
+    }
+}
+
 TEST_F(AdapterObserverSetTest, UnadviseOfTheSubtreeAtTheRootEndsTheObserverEverywhere) {
     for (const char16_t* path : {u"a", u"a/b", u"c", u"/"}) {
         tree.At(path)->Advise(&observer, all, 7);

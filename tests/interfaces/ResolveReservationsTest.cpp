@@ -79,6 +79,13 @@ TEST_F(ResolveReservations, SortsItemsByWhetherTheyCanBeUsed) {
     EXPECT_EQ(locator.asked, (std::vector<std::u16string>{idB, idC, idA}));
 }
 
+TEST_F(ResolveReservations, AllOfTheIdIsAskedFor) {
+    const char16_t* const id = u"{01234567-89AB-CDEF-FEDC-BA9876543210}";
+    n->ReserveOne(id, 1);
+    EXPECT_EQ(Resolve(*n), "S_OK [] []");
+    EXPECT_EQ(locator.asked, std::vector<std::u16string>{id});
+}
+
 TEST_F(ResolveReservations, APositiveResultIsNoSuccessEither) {
     locator.answers[idA].result = S_FALSE;
     n->ReserveOne(idA, 1);

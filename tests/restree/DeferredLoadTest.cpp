@@ -326,6 +326,23 @@ TEST_F(DependantsOfALoad, AreAppendedToWhatIsThere) {
     EXPECT_EQ(dependants, (std::vector<ResTreeNode*>{w, &At(*root, u"a/s/X"), &At(*root, u"a/s/Z")}));
 }
 
+TEST_F(DependantsOfALoad, ThoseThatALoadBringsAreReservedWithoutTheNode) {
+    w->SetProperty(u"Reserves", u"../a/s/Z");
+    EXPECT_TRUE(w->ReserveDependants(u"owner", ReserveWrite));
+    EXPECT_EQ(At(*root, u"a/s/Z").GetReservations().size(), 1U);
+    EXPECT_TRUE(w->GetReservations().empty());
+}
+
+TEST_F(DependantsOfALoad, ANewDependantAloneIsSomethingNew) {
+    w->SetProperty(u"Reserves", u"../a/s/X");
+    EXPECT_TRUE(w->AddObserver(&observer, ReservationChanged, 7));
+    EXPECT_FALSE(w->AddObserver(&observer, ReservationChanged, 7));
+    w->SetProperty(u"Reserves", u"../a/s/X,../a/s/Z");
+    EXPECT_TRUE(w->AddObserver(&observer, ReservationChanged, 7));
+    w->SetProperty(u"Reserves", u"../a/s/X,../a/s/Z");
+    EXPECT_FALSE(w->AddObserver(&observer, ReservationChanged, 7));
+}
+
 TEST_F(DependantsOfALoad, OnlyThoseThatStandAreWatched) {
     w->SetProperty(u"Reserves", u"../a/s/X,../a/s/Z");
     EXPECT_TRUE(w->AddObserver(&observer, ReservationChanged, 7));

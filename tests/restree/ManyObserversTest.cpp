@@ -91,6 +91,28 @@ TEST(ManyObservers, AnyContextStandsForTheFirstOfThem) {
     root->RemoveObserver(&other, -1, false);
 }
 
+TEST(ManyObservers, AnyContextPassesOverThoseThatHaveJustGone) {
+    for (const int count : {3, 1000}) {
+        ContextObserver observer;
+        ContextObserver other;
+        const auto root = MakeRootNode();
+        root->AddObserver(&other, NodeNameChanged, 3);
+        for (int i = 0; i < count; ++i) {
+            root->AddObserver(&observer, NodeNameChanged, 10 + i);
+        }
+        // While notices are under way what goes is only marked, and stands first in the index all the same.
+        observer.reaction = [&](ResTreeNode& node, int32_t) {
+            EXPECT_TRUE(node.RemoveObserver(&observer, 10, false));
+            EXPECT_FALSE(node.AddObserver(&observer, PropertyChanged, -1));
+            EXPECT_TRUE(node.RemoveObserver(&observer, -1, false));
+        };
+        root->Raise(NodeNameChanged);
+        EXPECT_EQ(observer.heard, std::vector<int32_t>{10});
+        EXPECT_FALSE(root->RemoveObserver(&observer, -1, false));
+        root->RemoveObserver(&other, -1, false);
+    }
+}
+
 TEST(ManyObservers, GoOneByOneInAnyOrder) {
     std::vector<ContextObserver> observers(many);
     for (const bool jumps : {false, true}) {

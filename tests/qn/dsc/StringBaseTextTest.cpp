@@ -224,6 +224,14 @@ TEST(StringBaseFind, FindsTheFirstText) {
     EXPECT_EQ(text.Find(u"cd", 6), none);
 }
 
+TEST(StringBaseFind, BeginsAtTheFrontUnlessTold) {
+    const String text(u"abab");
+    EXPECT_EQ(text.Find(u"ab"), 0U);
+    EXPECT_EQ(text.Find(u"ab"sv), 0U);
+    EXPECT_EQ(text.Find(String(u"ab")), 0U);
+    EXPECT_EQ(text.Find(u'a'), 0U);
+}
+
 TEST(StringBaseFind, DoesNotFoldCase) {
     EXPECT_EQ(String(u"abc").Find(u"B", 0), none);
     EXPECT_EQ(String(u"abc").Find(u'B', 0), none);

@@ -257,6 +257,17 @@ TEST(StringFromUtf8, IntoAStringFollowsTheRuleOfAssignment) {
     EXPECT_EQ(text.Capacity(), 18U);
 }
 
+TEST(StringFromUtf8, EndsInANul) {
+    String text(u"0123456789");
+    for (const std::string bytes :
+         {"five5", "f\xC3\xBCnf5", "\xE2\x82\xAC\xE2\x82\xAC", "longer than it was", "\xC3\xBC and longer still"}) {
+        ASSERT_TRUE(String::TryFromUtf8(bytes.data(), static_cast<uint32_t>(bytes.size()), text));
+        EXPECT_EQ(text.CStr()[text.Length()], u'\0') << bytes;
+        const String fresh = String::FromUtf8(bytes.data(), static_cast<uint32_t>(bytes.size()));
+        EXPECT_EQ(fresh.CStr()[fresh.Length()], u'\0') << bytes;
+    }
+}
+
 TEST(StringFromUtf8, IntoAStringWithoutBuffer) {
     String text = String::WithoutBuffer();
     ASSERT_TRUE(String::TryFromUtf8("", 0, text));
