@@ -46,6 +46,19 @@ TEST_F(DeferredLoad, FiresOnALookupThatMissesAlone) {
     EXPECT_EQ(OpenedFiles(), 1u);
 }
 
+TEST_F(DeferredLoad, CopyThatMayMergeIntoWhatStandsDoesNotAskForIt) {
+    Write("board.xml", "<B><N name='n'><V>1</V></N></B>");
+    for (const bool overwrite : {true, false}) {
+        ResTreeNode* ordered = nullptr;
+        root->AddChildEntry(overwrite ? u"merged" : u"replaced", u"T", true, ordered);
+        Defer(*ordered, u"board.xml");
+        ResTreeNode source(u"S", u"N", false);
+        ResTreeNode* child = nullptr;
+        ordered->CloneSubtreeInto(ordered->End(), u"n", source, overwrite, child);
+        EXPECT_EQ(ordered->FindRaw(u":DeferredLoadPath") != nullptr, overwrite);
+    }
+}
+
 TEST_F(DeferredLoad, ReadsTheFilesOnce) {
     Write("board.xml", "<B><V>1</V></B>");
     ResTreeNode& stub = Stub();
@@ -330,6 +343,14 @@ TEST_F(DependantsOfALoad, ThoseThatALoadBringsAreReservedWithoutTheNode) {
     w->SetProperty(u"Reserves", u"../a/s/Z");
     EXPECT_TRUE(w->ReserveDependants(u"owner", ReserveWrite));
     EXPECT_EQ(At(*root, u"a/s/Z").GetReservations().size(), 1U);
+    EXPECT_TRUE(w->GetReservations().empty());
+}
+
+TEST_F(DependantsOfALoad, NodeMayHaveToBeLoadedForItsDependants) {
+    Write("reserving.xml", "<W><Reserves>../a</Reserves></W>");
+    Defer(*w, u"reserving.xml");
+    EXPECT_TRUE(w->ReserveDependants(u"owner", ReserveWrite));
+    EXPECT_EQ(At(*root, u"a").GetReservations().size(), 1U);
     EXPECT_TRUE(w->GetReservations().empty());
 }
 

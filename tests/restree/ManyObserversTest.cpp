@@ -100,7 +100,7 @@ TEST(ManyObservers, AnyContextPassesOverThoseThatHaveJustGone) {
         for (int i = 0; i < count; ++i) {
             root->AddObserver(&observer, NodeNameChanged, 10 + i);
         }
-        // While notices are under way what goes is only marked, and stands first in the index all the same.
+        // While notices are under way what goes is only marked.
         observer.reaction = [&](ResTreeNode& node, int32_t) {
             EXPECT_TRUE(node.RemoveObserver(&observer, 10, false));
             EXPECT_FALSE(node.AddObserver(&observer, PropertyChanged, -1));
