@@ -31,7 +31,7 @@ struct EntryPiece {
     uint32_t ordinal = 0;  // Index of this piece in its sequence.
     uint32_t number = 0;   // By which its entries know it, from 1; it stays while pieces come and go before this one.
     uint32_t count = 0;    // 1 to capacity: an empty piece is dropped.
-    // Whether what a list has noted of its entries may hold in this piece (EntryList.h).
+    // Whether "#{" may stand in the texts of its entries, or below them, as far as is noted (EntryList.h).
     bool mayHoldVariables = true;
     NodeEntry* items[capacity];
 };
